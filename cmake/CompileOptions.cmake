@@ -1,0 +1,29 @@
+# What every target of this project is compiled with.
+
+set(CMAKE_CXX_STANDARD 20)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_CXX_VISIBILITY_PRESET hidden)
+set(CMAKE_VISIBILITY_INLINES_HIDDEN ON)
+set(CMAKE_POSITION_INDEPENDENT_CODE ON)
+set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
+
+# Products are rounded one by one, so that every machine gets the same bits.
+add_compile_options(-ffp-contract=off)
+add_compile_options(-Wall -Wextra -Wpedantic -Wconversion -Wsign-conversion -Wshadow
+                    -Wnon-virtual-dtor -Woverloaded-virtual -Wcast-qual -Werror)
+
+# Boost: headers only.
+add_compile_definitions(BOOST_ALL_NO_LIB BOOST_DLL_USE_STD_FS)
+
+set(VELTA_SANITIZE "" CACHE STRING "Sanitizers, as -fsanitize= takes them")
+if(VELTA_SANITIZE)
+  add_compile_options(-fsanitize=${VELTA_SANITIZE} -fno-sanitize-recover=all
+                      -fno-omit-frame-pointer)
+  add_link_options(-fsanitize=${VELTA_SANITIZE})
+endif()
+
+find_program(CCACHE ccache)
+if(CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
+  set(CMAKE_CXX_COMPILER_LAUNCHER ${CCACHE})
+endif()

@@ -1,0 +1,179 @@
+#pragma once
+
+#include <cstdint>
+
+#include "orxutils/dll_func_loader.h"
+#include "orxutils/orx_string.h"
+#include "velta/datum_data.h"
+#include "velta/export.h"
+#include "velta/projection_data.h"
+#include "velta/result_codes.h"
+#include "velta/rtcm_messages.h"
+
+namespace orx {
+class TCSInFileKey;
+class TGenericRegistryKey;
+}  // namespace orx
+
+namespace orx::cs::velta {
+
+/// Turns received transformation messages into entries of the shared RTCM datum and projection
+/// files. A projection belongs to the datum that the same object ingested before it.
+///
+/// Construction, destruction and ingestion must not run in two threads at the same time; the
+/// shared files themselves are guarded by their own mutexes.
+class RTCMDataSupport {
+ public:
+  /// \param datumPath directory of the datum files, ending in a separator; taken as it is. Null:
+  ///     the user's geodetic directory and "/datums/rtcmdata/".
+  /// \param projectionPath the same for projection files; null: "/projections/rtcmdata/".
+  /// Loads the sibling library if it can; makes no directory.
+  VELTA_EXPORT explicit RTCMDataSupport(const wchar_t* datumPath = nullptr,
+                                        const wchar_t* projectionPath = nullptr);
+
+  RTCMDataSupport(const RTCMDataSupport&) = delete;
+
+  /// Unloads the sibling library for the whole process; the next operation that needs it loads
+  /// it again.
+  VELTA_EXPORT ~RTCMDataSupport();
+
+  /// Copies everything but the datum's `ellipsoidName` and what the assignment of
+  /// `ProjectionData` leaves out.
+  VELTA_EXPORT RTCMDataSupport& operator=(const RTCMDataSupport& other);
+
+  /// Loader of the sibling library for datum files; empty until first loaded.
+  VELTA_EXPORT static TDLLFuncWrapper DLLdatum;
+  /// Loader of the sibling library for projection files; empty until first loaded.
+  VELTA_EXPORT static TDLLFuncWrapper DLLprojection;
+  /// Shared datum file worked on last; owned by the sibling library.
+  VELTA_EXPORT static TCSInFileKey* GFFDatumFile;
+  /// Shared projection file worked on last; owned by the sibling library.
+  VELTA_EXPORT static TCSInFileKey* GFFProjectionFile;
+
+  /// Loads the sibling library for datum files if it is not loaded.
+  /// \return 0, kNoSiblingLibrary, or the loader's status
+  VELTA_EXPORT static ResultCode GetDatumTransformationDLL();
+  /// Loads the sibling library for projection files if it is not loaded.
+  /// \return 0, kNoSiblingLibrary, or the loader's status
+  VELTA_EXPORT static ResultCode GetPrjTransformationDLL();
+
+  /// Obtains the shared tree of a datum file. The tree's mutex is not held on return: lock
+  /// `(*file)->GetMutex()` before touching the tree, and give the file back when done.
+  /// \param fileName full path including ".dff"
+  /// \param file receives the tree, which stays the sibling library's
+  /// \return 0, kNoSiblingLibrary, the loader's status, or the sibling library's code
+  VELTA_EXPORT static ResultCode GetUnlockedPtrDatumGFF(const COrxStringT<wchar_t>& fileName,
+                                                        TCSInFileKey** file);
+  /// Gives a datum file back to the sibling library. Never fails.
+  VELTA_EXPORT static void ReleasePtrDatumGFF(const COrxStringT<wchar_t>& fileName);
+
+  /// As GetUnlockedPtrDatumGFF, for a projection file (".prj").
+  VELTA_EXPORT static ResultCode GetUnlockedPtrProjectionGFF(const COrxStringT<wchar_t>& fileName,
+                                                             TCSInFileKey** file);
+  /// Gives a projection file back to the sibling library. Never fails.
+  VELTA_EXPORT static void ReleasePtrProjectionGFF(const COrxStringT<wchar_t>& fileName);
+
+  VELTA_EXPORT COrxStringT<wchar_t> GetDatumPath() const;
+  VELTA_EXPORT COrxStringT<wchar_t> GetProjectionPath() const;
+  /// Region of the last datum message's tectonic plate; empty before the first.
+  VELTA_EXPORT COrxStringT<wchar_t> GetRegionName();
+  VELTA_EXPORT COrxStringT<wchar_t> GetSourceDatumName() const;
+  VELTA_EXPORT COrxStringT<wchar_t> GetTargetDatumName() const;
+  /// The current datum's source ellipsoid; the reference lives as long as the object.
+  VELTA_EXPORT projmath::Ellipsoid& GetDatumSourceEllipsoid();
+  /// The current datum's target ellipsoid; the reference lives as long as the object.
+  VELTA_EXPORT projmath::Ellipsoid& GetDatumTargetEllipsoid();
+  /// Names the current datum's ellipsoid as the caller's catalogue does. The name stays until the
+  /// next call, also across datums.
+  VELTA_EXPORT void SetDatumEllipsoidName(const COrxStringT<wchar_t>& name);
+  /// Fills the summary of the current datum.
+  /// \return true when the datum's ellipsoid has been named; the summary is filled either way
+  VELTA_EXPORT bool GetCustomDatumData(CustomDatumData& summary);
+  /// Fills the summary of the current projection.
+  /// \return true when a projection has been parsed; the summary is filled either way
+  VELTA_EXPORT bool GetCustomProjectionData(CustomProjectionData& summary);
+
+  /// Ingests a message set: its datum message, then the projection that its flags ask for. The
+  /// set's pointers and flags are kept; the records are only read during the call.
+  /// \return 0, kNoDatumMessage, kMissing1023, kNoDatumName, kMissingProjectionPart, or a code of
+  ///     ParseDatumMessages or ParseProjectionMessages
+  VELTA_EXPORT ResultCode ParseRTCMMEssages(MsgUtilized& messages);
+
+  /// Tells which further messages belong to a datum message. Forgets the set that the object
+  /// holds.
+  /// \return the flags; the reference lives as long as the object, the next call of this or of
+  ///     ParseRTCMMEssages overwrites what it refers to
+  VELTA_EXPORT UtilizedMsgInfo& GetUtilizedMessageInfo(RtcmBasicTransformMessage& message);
+
+  /// Makes a 1021 the current datum and adds it to the datum file of its target datum.
+  /// \param grid the 1023 that belongs to it, or null
+  /// \return 0 (also when the entry was there), kMissing1023, kBadComputationIndicator,
+  ///     kNoDirectory, kDatumFileTrouble, kEntryNotWritten, kNoSiblingLibrary, or the sibling
+  ///     library's code
+  VELTA_EXPORT ResultCode ParseDatumMessages(const Rtcm1021& message, const Rtcm1023* grid);
+  /// As for a 1021, with the rotation point of a 1022.
+  VELTA_EXPORT ResultCode ParseDatumMessages(const Rtcm1022& message, const Rtcm1023* grid);
+
+  /// Adds the object's current datum to the shared datum file `GFFDatumFile`, unless an entry of
+  /// its name is there, and saves the file. The caller holds the file's mutex.
+  /// \return 0, kNotTheCurrentDescription, kDatumFileTrouble or kEntryNotWritten
+  VELTA_EXPORT ResultCode AddDatumToGFF(DatumData& datum);
+
+  /// Makes a 1025 the current projection and adds it to the projection file of the current datum.
+  /// \param grid the 1024 that belongs to it, or null
+  /// \return 0 (also when the entry was there), kNoDatumName, kUnsupportedProjection,
+  ///     kNoDirectory, kProjectionFileTrouble, kEntryNotWritten, kNoSiblingLibrary, or the sibling
+  ///     library's code
+  VELTA_EXPORT ResultCode ParseProjectionMessages(const Rtcm1025& message, const Rtcm1024* grid);
+  /// Refuses: changes nothing and returns kUnsupportedProjection.
+  VELTA_EXPORT ResultCode ParseProjectionMessages(const Rtcm1026& message, const Rtcm1024* grid);
+  /// As for a 1025, for the oblique Mercator, rectified or not.
+  VELTA_EXPORT ResultCode ParseProjectionMessages(const Rtcm1027& message, const Rtcm1024* grid);
+
+  /// Adds the object's current projection to the shared projection file `GFFProjectionFile`,
+  /// unless an entry of its name is there, and saves the file. The caller holds the file's mutex.
+  /// \return 0, kNotTheCurrentDescription, kProjectionFileTrouble or kEntryNotWritten
+  VELTA_EXPORT ResultCode AddProjectionToGFF(ProjectionData& projection);
+
+  /// Copies every entry of the datum file `source` into the shared datum file `target` and saves
+  /// it. An entry that both hold gets the source's values; nothing is deleted. Holds the target's
+  /// mutex meanwhile, and gives the target back whatever the outcome.
+  /// \return 0, kDatumFileTrouble, kNoSiblingLibrary, or the sibling library's code
+  VELTA_EXPORT static ResultCode MergeRTCMDatumfiles(const COrxStringT<wchar_t>& target,
+                                                     const COrxStringT<wchar_t>& source);
+  /// As MergeRTCMDatumfiles, for projection files, with kProjectionFileTrouble.
+  VELTA_EXPORT static ResultCode MergeRTCMProjectionfiles(const COrxStringT<wchar_t>& target,
+                                                          const COrxStringT<wchar_t>& source);
+
+ private:
+  COrxStringT<wchar_t> SetRegionNameByPlateNumber(std::uint32_t plateNumber);
+
+  ResultCode InitDatumGFF(DatumData& datum);
+  ResultCode CreateNewDatumGFF(const COrxStringT<wchar_t>& path, DatumData& datum);
+  ResultCode InitWithExistedDatumGFF(const COrxStringT<wchar_t>& path);
+  ResultCode InitDatumRegKey(TGenericRegistryKey& entry, DatumData& datum);
+
+  ResultCode InitProjectionGFF(ProjectionData& projection);
+  ResultCode CreateNewPrjGFF(const COrxStringT<wchar_t>& path, ProjectionData& projection);
+  ResultCode InitWithExistedPrjGFF(const COrxStringT<wchar_t>& path);
+  ResultCode InitPrjRegKey(TGenericRegistryKey& entry, ProjectionData& projection);
+
+  static ResultCode _MergeRTCMDatumfiles(const COrxStringT<wchar_t>& target,
+                                         const COrxStringT<wchar_t>& source);
+  static ResultCode MergeRTCMDatumfiles(TGenericRegistryKey& target, TGenericRegistryKey& source);
+  static ResultCode _MergeRTCMProjectionfiles(const COrxStringT<wchar_t>& target,
+                                              const COrxStringT<wchar_t>& source);
+  static ResultCode MergeRTCMProjectionfiles(TGenericRegistryKey& target,
+                                             TGenericRegistryKey& source);
+
+  COrxStringT<wchar_t> datumPath;
+  COrxStringT<wchar_t> projectionPath;
+  DatumData datum;
+  ProjectionData projection;
+  MsgUtilized msgUtilized;
+  COrxStringT<wchar_t> datumEntryName;
+  COrxStringT<wchar_t> projectionEntryName;
+  COrxStringT<wchar_t> regionName;
+};
+
+}  // namespace orx::cs::velta

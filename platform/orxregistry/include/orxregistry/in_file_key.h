@@ -1,0 +1,95 @@
+#pragma once
+
+#include <boost/thread/recursive_mutex.hpp>
+#include <cstdint>
+#include <memory>
+
+#include "orxregistry/export.h"
+#include "orxregistry/registry_key.h"
+#include "orxutils/orx_string.h"
+
+namespace orx {
+
+class KeyTree;
+
+/// Error states of a tree.
+enum RegistryError : std::uint32_t {
+  kRegistryOk = 0,
+  kCannotBeOpened = 1,
+  kNotARegistryFile = 2,
+  kDamaged = 3
+};
+
+/// The only registry version there is.
+inline constexpr unsigned kRegistryVersion = 512;
+
+/// A registry tree.
+class ORXREGISTRY_EXPORT TInKey {
+ public:
+  TInKey(const TInKey&) = delete;
+  TInKey& operator=(const TInKey&) = delete;
+  virtual ~TInKey();
+
+  /// A RegistryError: kRegistryOk when the tree was made or loaded without error. A damaged tree
+  /// presents its keys up to the damage.
+  std::uint32_t GetErrorState() const;
+
+ protected:
+  explicit TInKey(std::shared_ptr<KeyTree> tree);
+
+  std::shared_ptr<KeyTree> tree_;
+
+ private:
+  friend class TGenericRegistryKeyPtr;
+};
+
+/// A registry tree that is kept in a file.
+class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
+ public:
+  /// Makes a new tree or loads a file; GetErrorState() tells how that went.
+  /// \param fileName the file; may be empty for a new tree
+  /// \param description text that a new file carries; may be null
+  /// \param stringLookup null
+  /// \param openExisting true: load the file
+  /// \param flags 97; no meaning here
+  TInFileKey(const COrxStringT<wchar_t>& fileName, const wchar_t* description,
+             const void* stringLookup, bool openExisting, unsigned flags);
+  ~TInFileKey() override;
+
+  /// Appends what changed since the last save to the tree's own file, or writes the file afresh
+  /// when more than half of it is superseded. Durable when it returns true. When it returns
+  /// false, what was durable stays loadable and the tree keeps its changes for another try.
+  /// \param flag no meaning here
+  /// \param registryVersion kRegistryVersion
+  bool Save(bool flag, unsigned registryVersion);
+
+  /// Writes the whole tree to a new file, whole or not at all; durable when it returns true. A
+  /// file that exists is not replaced: false. The tree's own file stays what it was.
+  bool Save(const COrxStringT<wchar_t>& fileName, bool flag, unsigned registryVersion);
+
+ protected:
+  /// True when the tree has changes that no save has made durable.
+  bool HasUnsavedChanges() const;
+  /// True when the file is not, or no longer, what was read or saved last.
+  bool HasFileChanged() const;
+  /// Reads the file again, forgetting unsaved changes. Keys obtained before keep the old tree.
+  void Reload();
+
+ private:
+  COrxStringT<wchar_t> fileName_;
+};
+
+/// A registry file that is shared between users in one process.
+class ORXREGISTRY_EXPORT TCSInFileKey : public TInFileKey {
+ public:
+  using TInFileKey::TInFileKey;
+  ~TCSInFileKey() override;
+
+  /// Hold it around every use of the tree.
+  boost::recursive_mutex& GetMutex() { return mutex_; }
+
+ private:
+  boost::recursive_mutex mutex_;
+};
+
+}  // namespace orx

@@ -1,0 +1,85 @@
+#include "orxregistry/in_file_key.h"
+
+#include <filesystem>
+#include <optional>
+#include <system_error>
+#include <utility>
+
+#include "key_tree.h"
+#include "segment_file.h"
+
+namespace orx {
+namespace {
+
+/// \return nothing when the name is no path of this system
+std::optional<std::filesystem::path> ToPath(const COrxStringT<wchar_t>& name) {
+  try {
+    return std::filesystem::path(name);
+  } catch (const std::system_error&) {
+    return std::nullopt;
+  }
+}
+
+std::shared_ptr<KeyTree> Load(const COrxStringT<wchar_t>& fileName) {
+  const std::optional<std::filesystem::path> path = ToPath(fileName);
+  FileContent content;
+  content.error = kCannotBeOpened;
+  if (path) content = ReadRegistryFile(*path);
+  return std::make_shared<KeyTree>(std::move(content));
+}
+
+}  // namespace
+
+TInKey::TInKey(std::shared_ptr<KeyTree> tree) : tree_(std::move(tree)) {}
+
+TInKey::~TInKey() = default;
+
+std::uint32_t TInKey::GetErrorState() const { return tree_->error; }
+
+TInFileKey::TInFileKey(const COrxStringT<wchar_t>& fileName, const wchar_t* description,
+                       const void* /*stringLookup*/, bool openExisting, unsigned /*flags*/)
+    : TInKey(openExisting ? Load(fileName)
+                          : std::make_shared<KeyTree>(ToUtf16(description ? description : L""))),
+      fileName_(fileName) {}
+
+TInFileKey::~TInFileKey() = default;
+
+bool TInFileKey::Save(bool /*flag*/, unsigned registryVersion) {
+  const std::optional<std::filesystem::path> path = ToPath(fileName_);
+  if (!path || registryVersion != kRegistryVersion || tree_->error != kRegistryOk) return false;
+  const AppendResult result =
+      AppendSegment(*path, tree_->position, tree_->WriteUnsaved(), tree_->superseded());
+  if (result == AppendResult::kFailed) return false;
+  tree_->MarkSaved();
+  // What others appended is in the file and not in this tree.
+  if (result == AppendResult::kBehindOthers) tree_->position.stamp = os::FileStamp();
+  return true;
+}
+
+bool TInFileKey::Save(const COrxStringT<wchar_t>& fileName, bool /*flag*/,
+                      unsigned registryVersion) {
+  const std::optional<std::filesystem::path> path = ToPath(fileName);
+  if (!path || registryVersion != kRegistryVersion || tree_->error != kRegistryOk) return false;
+  const record::Buffer tree = tree_->WriteAll();
+  if (tree_->error != kRegistryOk) return false;
+  return PublishFile(*path, MakeRegistryFile(tree_->description, tree), false).has_value();
+}
+
+bool TInFileKey::HasUnsavedChanges() const { return tree_->has_unsaved(); }
+
+bool TInFileKey::HasFileChanged() const {
+  const std::optional<std::filesystem::path> path = ToPath(fileName_);
+  const std::optional<os::FileStamp> stamp = path ? os::StampOf(*path) : std::nullopt;
+  return !stamp || *stamp != tree_->position.stamp;
+}
+
+void TInFileKey::Reload() { tree_ = Load(fileName_); }
+
+TCSInFileKey::~TCSInFileKey() = default;
+
+TGenericRegistryKeyPtr::TGenericRegistryKeyPtr(const TInKey& tree)
+    : root_(tree.tree_, &tree.tree_->root()) {}
+
+TGenericRegistryKeyPtr::operator TGenericRegistryKeyImpPtr() const { return root_; }
+
+}  // namespace orx

@@ -1,0 +1,192 @@
+#include "key_tree.h"
+
+#include <algorithm>
+#include <cstring>
+#include <limits>
+
+namespace orx {
+namespace {
+
+constexpr std::size_t kMaxNameBytes = std::numeric_limits<std::uint16_t>::max() * sizeof(char16_t);
+
+bool IsSame(const record::Value& a, const record::Value& b) {
+  return a.type == b.type && a.elementSize == b.elementSize && a.dimension == b.dimension &&
+         a.dataSize == b.dataSize && std::memcmp(a.data, b.data, a.dataSize) == 0;
+}
+
+void AppendRecord(record::Buffer& to, ValueRecord value) {
+  to.insert(to.end(), value, value + record::ValueRecordSize(record::ValueAt(value)));
+}
+
+}  // namespace
+
+KeyTree::KeyTree(std::u16string text)
+    : description(std::move(text)), root_(Make<Key>(*this, nullptr, record::Name(), 0)) {}
+
+KeyTree::KeyTree(FileContent content)
+    : error(content.error),
+      description(std::move(content.description)),
+      position{content.stamp, content.end, content.superseded},
+      file_(std::move(content.memory)),
+      root_(Make<Key>(*this, nullptr, record::Name(), 0)) {
+  for (record::Bytes segment : content.segments) {
+    const std::optional<record::Key> tree = record::TakeKey(segment);
+    if (!tree || !segment.empty()) {
+      error = kDamaged;
+      return;
+    }
+    AddLayer(*root_, *tree);
+  }
+}
+
+void KeyTree::AddLayer(Key& key, const record::Key& bytes) {
+  auto* const layer = Make<Key::Layer>(Key::Layer{bytes.values, bytes.keys, nullptr});
+  (key.lastLayer_ ? key.lastLayer_->next : key.firstLayer_) = layer;
+  key.lastLayer_ = layer;
+}
+
+KeyTree::Content& KeyTree::Visit(Key& key) {
+  if (!key.content_) key.content_ = Make<Content>(&memory_);
+  // Laying the same layer over a key twice is the same as once, so a layer goes only when all of
+  // it is done, whatever interrupts this.
+  for (const Key::Layer* layer = key.firstLayer_; layer; layer = layer->next) {
+    if (!TakeApart(key, *key.content_, *layer)) error = kDamaged;
+  }
+  key.firstLayer_ = key.lastLayer_ = nullptr;
+  return *key.content_;
+}
+
+bool KeyTree::TakeApart(Key& key, Content& content, const Key::Layer& layer) {
+  record::Bytes bytes = layer.values;
+  while (!bytes.empty()) {
+    const ValueRecord start = bytes.data();
+    const std::optional<record::Value> value = record::TakeValue(bytes);
+    if (!value) return false;
+    const std::size_t place = content.values.Find(value->name);
+    if (place == content.values.items().size()) {
+      content.values.Append(start);
+    } else {
+      content.values.Replace(place, start);
+    }
+  }
+  bytes = layer.keys;
+  while (!bytes.empty()) {
+    const std::optional<record::Key> found = record::TakeKey(bytes);
+    if (!found || key.depth == record::kMaxDepth) return false;
+    const std::size_t place = content.keys.Find(found->name);
+    if (place == content.keys.items().size()) {
+      content.keys.Append(Make<Key>(*this, &key, found->name, found->dimension));
+    }
+    AddLayer(*content.keys.items()[place], *found);
+  }
+  return true;
+}
+
+KeyTree::Key* KeyTree::FindKey(Key& key, const record::Name& name) {
+  const auto& keys = Visit(key).keys;
+  const std::size_t place = keys.Find(name);
+  return place == keys.items().size() ? nullptr : keys.items()[place];
+}
+
+ValueRecord KeyTree::FindValue(Key& key, const record::Name& name) {
+  const auto& values = Visit(key).values;
+  const std::size_t place = values.Find(name);
+  return place == values.items().size() ? nullptr : values.items()[place];
+}
+
+KeyTree::Key* KeyTree::OpenKey(Key& key, const record::Name& name, std::uint8_t dimension) {
+  if (Key* const found = FindKey(key, name)) return found;
+  if (key.depth == record::kMaxDepth || name.bytes > kMaxNameBytes) return nullptr;
+  auto* const units = static_cast<unsigned char*>(memory_.allocate(name.bytes, 1));
+  std::copy_n(name.units, name.bytes, units);
+  auto* const made = Make<Key>(*this, &key, record::Name{units, name.bytes}, dimension);
+  MarkUnsaved(*made);
+  Visit(key).keys.Append(made);
+  return made;
+}
+
+bool KeyTree::SetValue(Key& key, const record::Value& value) {
+  if (!record::IsConsistent(value)) return false;
+  auto& values = Visit(key).values;
+  const std::size_t place = values.Find(value.name);
+  const bool replaces = place < values.items().size();
+  const ValueRecord replaced = replaces ? values.items()[place] : nullptr;
+  if (replaces && IsSame(record::ValueAt(replaced), value)) return true;
+
+  Unsaved& unsaved = MarkUnsaved(key);
+  record::Buffer bytes;
+  record::AppendValue(bytes, value);
+  auto* const made = static_cast<unsigned char*>(memory_.allocate(bytes.size(), 1));
+  std::copy(bytes.begin(), bytes.end(), made);
+  if (!replaces) {
+    unsaved.values.push_back(made);
+    values.Append(made);
+    return true;
+  }
+  const auto pending = std::find(unsaved.values.begin(), unsaved.values.end(), replaced);
+  if (pending != unsaved.values.end()) {
+    *pending = made;
+  } else {
+    unsaved.values.push_back(made);
+    superseded_ += record::ValueRecordSize(record::ValueAt(replaced));
+  }
+  values.Replace(place, made);
+  return true;
+}
+
+void KeyTree::DeepCopy(Key& to, Key& from) {
+  if (&to == &from) return;
+  KeyTree& source = *from.tree;
+  for (const ValueRecord value : source.Values(from)) SetValue(to, record::ValueAt(value));
+  // A key laid over one of its own sub-keys grows while it is walked: only what it held counts.
+  const std::size_t count = source.Keys(from).size();
+  for (std::size_t i = 0; i < count; ++i) {
+    Key* const key = source.Keys(from)[i];
+    if (Key* const copy = OpenKey(to, key->name, key->dimension)) DeepCopy(*copy, *key);
+  }
+}
+
+KeyTree::Unsaved& KeyTree::MarkUnsaved(Key& key) {
+  changed_ = true;
+  const auto [entry, isNew] = unsaved_.try_emplace(&key);
+  Unsaved& unsaved = entry->second;
+  if (isNew && key.parent) MarkUnsaved(*key.parent).keys.push_back(&key);
+  return unsaved;
+}
+
+record::Buffer KeyTree::WriteUnsaved() {
+  record::Buffer bytes;
+  if (changed_) WriteUnsaved(bytes, *root_);
+  return bytes;
+}
+
+void KeyTree::WriteUnsaved(record::Buffer& to, const Key& key) {
+  record::KeyWriter writer(to, key.dimension, key.name);
+  const Unsaved& unsaved = unsaved_[&key];
+  for (const ValueRecord value : unsaved.values) AppendRecord(to, value);
+  writer.EndValues();
+  for (const Key* const sub : unsaved.keys) WriteUnsaved(to, *sub);
+  writer.Close();
+}
+
+record::Buffer KeyTree::WriteAll() {
+  record::Buffer bytes;
+  WriteAll(bytes, *root_);
+  return bytes;
+}
+
+void KeyTree::WriteAll(record::Buffer& to, Key& key) {
+  record::KeyWriter writer(to, key.dimension, key.name);
+  for (const ValueRecord value : Values(key)) AppendRecord(to, value);
+  writer.EndValues();
+  for (Key* const sub : Keys(key)) WriteAll(to, *sub);
+  writer.Close();
+}
+
+void KeyTree::MarkSaved() {
+  changed_ = false;
+  superseded_ = 0;
+  unsaved_.clear();
+}
+
+}  // namespace orx

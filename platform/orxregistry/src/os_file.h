@@ -1,0 +1,77 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <filesystem>
+#include <optional>
+
+/// The few operations on files that the registry is built on, one implementation for each
+/// operating system. Every failure is reported by the result; nothing throws.
+namespace orx::os {
+
+/// Tells a file, and a state of it, from others.
+struct FileStamp {
+  std::uint64_t device = 0;
+  std::uint64_t file = 0;
+  std::uint64_t size = 0;      ///< bytes
+  std::int64_t modified = -1;  ///< time of the last change, in units of the system's own
+
+  bool operator==(const FileStamp&) const = default;
+  bool IsSameFile(const FileStamp& other) const {
+    return device == other.device && file == other.file;
+  }
+};
+
+/// An open file, closed (and unlocked) by its destructor.
+class File {
+ public:
+  /// \return nothing when the file cannot be opened
+  static std::optional<File> OpenToRead(const std::filesystem::path& path);
+
+  /// Opens a file to change it and holds it against every other that opens it this way, in this
+  /// process or in others, until closed. Waits for its turn.
+  /// \param create make the file when it does not exist
+  /// \return nothing when the file cannot be opened or locked
+  static std::optional<File> OpenLocked(const std::filesystem::path& path, bool create);
+
+  File(File&& other) noexcept : handle_(other.handle_) { other.handle_ = kNone; }
+  File(const File&) = delete;
+  File& operator=(const File&) = delete;
+  ~File();
+
+  std::optional<FileStamp> Stamp() const;
+
+  /// Reads from the file's place `offset`, all that is asked for or up to the end of the file.
+  /// \return number of bytes read, or nothing on an error
+  std::optional<std::size_t> Read(std::uint64_t offset, unsigned char* to, std::size_t size) const;
+
+  bool Write(std::uint64_t offset, const unsigned char* from, std::size_t size);
+  bool Truncate(std::uint64_t size);
+
+  /// Makes what was written durable, the file's size included.
+  bool Flush();
+
+ private:
+#ifdef _WIN32
+  using Handle = void*;
+  static constexpr Handle kNone = nullptr;
+#else
+  using Handle = int;
+  static constexpr Handle kNone = -1;
+#endif
+
+  explicit File(Handle handle) : handle_(handle) {}
+
+  Handle handle_;
+};
+
+/// \return nothing when there is no such file
+std::optional<FileStamp> StampOf(const std::filesystem::path& path);
+
+/// Gives a file another name in the same directory and makes the change of the directory durable.
+/// \param replace false: fails when there is a file of that name
+bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace);
+
+void Remove(const std::filesystem::path& path);
+
+}  // namespace orx::os

@@ -1,0 +1,131 @@
+#include <fcntl.h>
+#include <sys/file.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdio>
+
+#include "os_file.h"
+
+namespace orx::os {
+namespace {
+
+constexpr mode_t kNewFileMode = 0666;
+
+template <class Call>
+auto Retry(Call call) {
+  auto result = call();
+  while (result < 0 && errno == EINTR) result = call();
+  return result;
+}
+
+FileStamp ToStamp(const struct stat& status) {
+  constexpr std::int64_t kNanoseconds = 1'000'000'000;
+  FileStamp stamp;
+  stamp.device = status.st_dev;
+  stamp.file = status.st_ino;
+  stamp.size = static_cast<std::uint64_t>(status.st_size);
+  stamp.modified = status.st_mtim.tv_sec * kNanoseconds + status.st_mtim.tv_nsec;
+  return stamp;
+}
+
+bool FlushDirectory(const std::filesystem::path& directory) {
+  const char* const name = directory.empty() ? "." : directory.c_str();
+  const int handle = Retry([&] { return open(name, O_RDONLY | O_DIRECTORY | O_CLOEXEC); });
+  if (handle < 0) return false;
+  const bool flushed = Retry([&] { return fsync(handle); }) == 0;
+  close(handle);
+  return flushed;
+}
+
+bool RenameToNewName(const char* from, const char* to) {
+  if (renameat2(AT_FDCWD, from, AT_FDCWD, to, RENAME_NOREPLACE) == 0) return true;
+  if (errno != EINVAL && errno != ENOSYS) return false;
+  // A file system that cannot rename so: a second link fails when the name is taken.
+  if (link(from, to) != 0) return false;
+  unlink(from);
+  return true;
+}
+
+}  // namespace
+
+std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
+  const int handle = Retry([&] { return open(path.c_str(), O_RDONLY | O_CLOEXEC); });
+  if (handle < 0) return std::nullopt;
+  return File(handle);
+}
+
+std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool create) {
+  const int flags = O_RDWR | O_CLOEXEC | (create ? O_CREAT : 0);
+  for (;;) {
+    const int handle = Retry([&] { return open(path.c_str(), flags, kNewFileMode); });
+    if (handle < 0) return std::nullopt;
+    File file(handle);
+    if (Retry([&] { return flock(handle, LOCK_EX); }) != 0) return std::nullopt;
+    // While this waited, the file may have been replaced by another of the same name.
+    const std::optional<FileStamp> opened = file.Stamp();
+    const std::optional<FileStamp> named = StampOf(path);
+    if (!opened || (!named && !create)) return std::nullopt;
+    if (named && opened->IsSameFile(*named)) return file;
+  }
+}
+
+File::~File() {
+  if (handle_ != kNone) close(handle_);
+}
+
+std::optional<FileStamp> File::Stamp() const {
+  struct stat status;
+  if (fstat(handle_, &status) != 0) return std::nullopt;
+  return ToStamp(status);
+}
+
+std::optional<std::size_t> File::Read(std::uint64_t offset, unsigned char* to,
+                                      std::size_t size) const {
+  std::size_t done = 0;
+  while (done < size) {
+    const ssize_t count = Retry(
+        [&] { return pread(handle_, to + done, size - done, static_cast<off_t>(offset + done)); });
+    if (count < 0) return std::nullopt;
+    if (count == 0) break;
+    done += static_cast<std::size_t>(count);
+  }
+  return done;
+}
+
+bool File::Write(std::uint64_t offset, const unsigned char* from, std::size_t size) {
+  std::size_t done = 0;
+  while (done < size) {
+    const ssize_t count = Retry([&] {
+      return pwrite(handle_, from + done, size - done, static_cast<off_t>(offset + done));
+    });
+    if (count <= 0) return false;
+    done += static_cast<std::size_t>(count);
+  }
+  return true;
+}
+
+bool File::Truncate(std::uint64_t size) {
+  return Retry([&] { return ftruncate(handle_, static_cast<off_t>(size)); }) == 0;
+}
+
+bool File::Flush() {
+  return Retry([&] { return fdatasync(handle_); }) == 0;
+}
+
+std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
+  struct stat status;
+  if (stat(path.c_str(), &status) != 0) return std::nullopt;
+  return ToStamp(status);
+}
+
+bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
+  const bool renamed = replace ? std::rename(from.c_str(), to.c_str()) == 0
+                               : RenameToNewName(from.c_str(), to.c_str());
+  return renamed && FlushDirectory(to.parent_path());
+}
+
+void Remove(const std::filesystem::path& path) { unlink(path.c_str()); }
+
+}  // namespace orx::os

@@ -1,0 +1,125 @@
+#include "orxregistry/registry_key.h"
+
+#include <cstring>
+#include <utility>
+
+#include "key_tree.h"
+
+namespace orx {
+namespace {
+
+/// A key of the tree that `relative` belongs to, keeping that tree alive.
+TGenericRegistryKeyImpPtr Share(const TGenericRegistryKeyImpPtr& relative,
+                                TGenericRegistryKeyImp* key) {
+  return key ? TGenericRegistryKeyImpPtr(relative, key) : nullptr;
+}
+
+COrxStringT<wchar_t> ToWide(const record::Name& name) {
+  std::u16string text(name.bytes / sizeof(char16_t), u'\0');
+  std::memcpy(text.data(), name.units, name.bytes);
+  return FromUtf16(text);
+}
+
+ValueRecord Find(const TGenericRegistryKeyImpPtr& key, std::wstring_view name) {
+  return key ? key->tree->FindValue(*key, LookupName(name).Get()) : nullptr;
+}
+
+}  // namespace
+
+TGenericRegistryKey::TGenericRegistryKey(TGenericRegistryKeyImpPtr imp) : imp_(std::move(imp)) {}
+
+TGenericRegistryKey::TGenericRegistryKey(const TGenericRegistryKey& parent, std::wstring_view name,
+                                         std::uint8_t dimension, bool create) {
+  if (parent.IsNull()) return;
+  KeyTree& tree = *parent.imp_->tree;
+  const LookupName sought(name);
+  imp_ = Share(parent.imp_, create ? tree.OpenKey(*parent.imp_, sought.Get(), dimension)
+                                   : tree.FindKey(*parent.imp_, sought.Get()));
+}
+
+COrxStringT<wchar_t> TGenericRegistryKey::GetName() const {
+  return imp_ ? ToWide(imp_->name) : COrxStringT<wchar_t>();
+}
+
+std::uint8_t TGenericRegistryKey::GetKeyDim() const {
+  return imp_ ? imp_->dimension : std::uint8_t{0};
+}
+
+bool TGenericRegistryKey::HasKey(std::wstring_view name) const {
+  return imp_ && imp_->tree->FindKey(*imp_, LookupName(name).Get());
+}
+
+void TGenericRegistryKey::DeepCopy(const TGenericRegistryKey& source) {
+  if (imp_ && source.imp_) imp_->tree->DeepCopy(*imp_, *source.imp_);
+}
+
+int TGenericRegistryKey::AddValue(std::wstring_view name, const bin_value& value,
+                                  std::uint8_t dimension, bool /*flag*/) {
+  const void* const data = value.GetData();
+  if (!imp_ || !data) return 0;
+  const LookupName target(name);
+  record::Value stored;
+  stored.type = value.GetType();
+  stored.elementSize = value.GetSize();
+  stored.dimension = dimension;
+  stored.name = target.Get();
+  stored.data = static_cast<const unsigned char*>(data);
+  stored.dataSize = value.GetByteSize();
+  return imp_->tree->SetValue(*imp_, stored) ? 1 : 0;
+}
+
+int TGenericRegistryKey::HasValue(std::wstring_view name) const { return Find(imp_, name) ? 1 : 0; }
+
+std::uint32_t TGenericRegistryKey::GetValueType(std::wstring_view name) const {
+  const ValueRecord found = Find(imp_, name);
+  return found ? record::ValueAt(found).type : std::uint32_t{kNoValue};
+}
+
+std::uint32_t TGenericRegistryKey::GetValueSize(std::wstring_view name) const {
+  const ValueRecord found = Find(imp_, name);
+  return found ? record::ValueAt(found).dataSize : 0;
+}
+
+std::uint8_t TGenericRegistryKey::GetValueDim(std::wstring_view name) const {
+  const ValueRecord found = Find(imp_, name);
+  return found ? record::ValueAt(found).dimension : std::uint8_t{0};
+}
+
+bool TGenericRegistryKey::GetValue(std::wstring_view name, bin_value& value, int index,
+                                   bool copy) const {
+  const ValueRecord found = Find(imp_, name);
+  if (!found || index != 0) return false;
+  const record::Value stored = record::ValueAt(found);
+  const ValueDescriptor descriptor{stored.type, stored.elementSize, stored.dimension};
+  return value.SetFromDescriptor(descriptor, stored.data, copy) == 0;
+}
+
+std::vector<COrxStringT<wchar_t>> TGenericRegistryKey::GetValueNames() const {
+  std::vector<COrxStringT<wchar_t>> names;
+  if (!imp_) return names;
+  for (const ValueRecord value : imp_->tree->Values(*imp_)) names.push_back(ToWide(NameOf(value)));
+  return names;
+}
+
+TGenRegKeyIterator::TGenRegKeyIterator(const TGenericRegistryKey& key) : parent_(key.imp_) {}
+
+TGenRegKeyIterator::operator bool() const {
+  return parent_ && next_ < parent_->tree->Keys(*parent_).size();
+}
+
+TGenericRegistryKeyImpPtr TGenRegKeyIterator::operator++(int) {
+  return *this ? Share(parent_, parent_->tree->Keys(*parent_)[next_++]) : nullptr;
+}
+
+template <>
+COrxStringT<wchar_t> GetRegValue(const TGenericRegistryKey& key, std::wstring_view name,
+                                 const COrxStringT<wchar_t>& fallback, int index) {
+  const ValueRecord found = index == 0 ? Find(key.imp_, name) : nullptr;
+  if (!found) return fallback;
+  const record::Value stored = record::ValueAt(found);
+  if (stored.type != kWideString || stored.elementSize != 0) return fallback;
+  const COrxStringT<wchar_t> text = ToWide({stored.data, stored.dataSize});
+  return text.substr(0, text.find(L'\0'));
+}
+
+}  // namespace orx

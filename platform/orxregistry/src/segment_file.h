@@ -1,0 +1,63 @@
+#pragma once
+
+#include <cstdint>
+#include <filesystem>
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "orxregistry/in_file_key.h"
+#include "os_file.h"
+#include "record_format.h"
+
+/// A registry file as bytes: a header and a sequence of checked segments, each holding the record
+/// of one key tree's root. See docs/gff-format.md.
+namespace orx {
+
+/// A file read into memory and what was found in it.
+struct FileContent {
+  RegistryError error = kRegistryOk;
+  std::unique_ptr<unsigned char[]> memory;
+  std::u16string description;
+  std::vector<record::Bytes> segments;  ///< the key trees in order, in `memory`
+  std::uint64_t end = 0;                ///< where the last whole segment ends
+  std::uint64_t superseded = 0;         ///< bytes of values that later segments replace
+  os::FileStamp stamp;                  ///< of the file when it was read
+};
+
+/// Reads and checks a file. A last segment that is not whole is a save that never finished and is
+/// left out; anything else that is wrong is damage, and the segments in front of it are given.
+FileContent ReadRegistryFile(const std::filesystem::path& path);
+
+/// The bytes of a whole file that holds one segment.
+record::Buffer MakeRegistryFile(const std::u16string& description, const record::Buffer& tree);
+
+/// Writes a file beside its place, makes it durable and gives it its name.
+/// \param replace false: fails when there is a file of that name
+/// \return the stamp of the file; nothing when it did not come to be
+std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path,
+                                         const record::Buffer& bytes, bool replace);
+
+/// What a tree knows of its file: where the next segment goes.
+struct FilePosition {
+  os::FileStamp stamp;
+  std::uint64_t end = 0;
+  std::uint64_t superseded = 0;
+};
+
+/// How an append ended.
+enum class AppendResult {
+  kFailed,       ///< what was durable still is, and nothing else is in the file
+  kAppended,     ///< durable; `position` is that of the new end
+  kBehindOthers  ///< durable, behind segments that somebody else appended since `position`
+};
+
+/// Appends a segment durably, or writes the file afresh when more than half of it is superseded.
+/// \param position where the file was last seen to end; moved on success
+/// \param tree record of the root with what is new; empty when there is nothing to write
+/// \param superseded bytes of values in the file that `tree` replaces
+AppendResult AppendSegment(const std::filesystem::path& path, FilePosition& position,
+                           const record::Buffer& tree, std::uint64_t superseded);
+
+}  // namespace orx

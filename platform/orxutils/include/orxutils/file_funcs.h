@@ -1,0 +1,19 @@
+#pragma once
+
+#include "orxutils/export.h"
+#include "orxutils/orx_string.h"
+
+/// Questions to the file system. Nothing here throws for a name that the system does not take.
+namespace orx::FileFuncs {
+
+/// True when a file (not a directory) of that name exists.
+ORXUTILS_EXPORT bool isFileExists(const COrxStringT<wchar_t>& name);
+
+/// True when a directory of that name exists.
+ORXUTILS_EXPORT bool isDirExists(const COrxStringT<wchar_t>& name);
+
+/// Makes a directory with all missing parents.
+/// \return true when the directory exists afterwards
+ORXUTILS_EXPORT bool createDirectoryTree(const COrxStringT<wchar_t>& name);
+
+}  // namespace orx::FileFuncs

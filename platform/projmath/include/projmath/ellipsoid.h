@@ -1,0 +1,33 @@
+#pragma once
+
+#include <cstdint>
+
+#include "projmath/export.h"
+
+namespace orx::cs::projmath {
+
+/// An ellipsoid of revolution, defined by its semi-major axis and a second value, WGS 84 unless
+/// set otherwise.
+struct Ellipsoid {
+  /// What `second` means.
+  enum Kind : std::uint8_t { kInverseFlattening = 0, kSemiMinorAxis = 2 };
+
+  double a = 6378137.0;           ///< semi-major axis, metres
+  double second = 298.257223563;  ///< second defining value, see `kind`
+  std::uint8_t kind = kInverseFlattening;
+
+  double semiMinorAxis = 0.0;        ///< b, metres; derived
+  double flattening = 0.0;           ///< f = (a - b) / a; derived
+  double eccentricitySquared = 0.0;  ///< e^2 = f (2 - f); derived
+
+  /// An ellipsoid given by its two axes in metres, completed.
+  PROJMATH_EXPORT static Ellipsoid FromAxes(double a, double b);
+  /// An ellipsoid given by its semi-major axis in metres and its inverse flattening, completed.
+  PROJMATH_EXPORT static Ellipsoid FromInverseFlattening(double a, double inverseFlattening);
+
+  /// Completes the derived values from the defining ones, which stay as they are.
+  /// \param byAxes true: `second` is the semi-minor axis; false: the inverse flattening
+  PROJMATH_EXPORT void SetEllipsoid(bool byAxes);
+};
+
+}  // namespace orx::cs::projmath

@@ -1,0 +1,29 @@
+#include "projmath/ellipsoid.h"
+
+namespace orx::cs::projmath {
+
+Ellipsoid Ellipsoid::FromAxes(double a, double b) {
+  Ellipsoid ellipsoid;
+  ellipsoid.a = a;
+  ellipsoid.second = b;
+  ellipsoid.kind = kSemiMinorAxis;
+  ellipsoid.SetEllipsoid(true);
+  return ellipsoid;
+}
+
+Ellipsoid Ellipsoid::FromInverseFlattening(double a, double inverseFlattening) {
+  Ellipsoid ellipsoid;
+  ellipsoid.a = a;
+  ellipsoid.second = inverseFlattening;
+  ellipsoid.kind = kInverseFlattening;
+  ellipsoid.SetEllipsoid(false);
+  return ellipsoid;
+}
+
+void Ellipsoid::SetEllipsoid(bool byAxes) {
+  semiMinorAxis = byAxes ? second : a - a / second;
+  flattening = (a - semiMinorAxis) / a;
+  eccentricitySquared = flattening * (2.0 - flattening);
+}
+
+}  // namespace orx::cs::projmath

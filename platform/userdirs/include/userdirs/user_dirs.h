@@ -1,0 +1,13 @@
+#pragma once
+
+#include "orxutils/orx_string.h"
+#include "userdirs/export.h"
+
+namespace orx {
+
+/// The user's geodetic data directory, without a trailing separator: the environment variable
+/// ORX_USER_GEO_DIR if it is set, else "orx/geodata" below %LOCALAPPDATA% (Windows) or below
+/// $XDG_DATA_HOME or ~/.local/share (elsewhere).
+USERDIRS_EXPORT COrxStringT<wchar_t> GetUserGeoDir();
+
+}  // namespace orx
