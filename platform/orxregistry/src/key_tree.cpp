@@ -21,93 +21,125 @@ void AppendRecord(record::Buffer& to, ValueRecord value) {
 }  // namespace
 
 KeyTree::KeyTree(std::u16string text)
-    : description(std::move(text)), root_(Make<Key>(*this, nullptr, record::Name(), 0)) {}
+    : description(std::move(text)),
+      root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {}
 
 KeyTree::KeyTree(FileContent content)
     : error(content.error),
       description(std::move(content.description)),
       position{content.stamp, content.end, content.superseded},
       file_(std::move(content.memory)),
-      root_(Make<Key>(*this, nullptr, record::Name(), 0)) {
+      root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {
   for (record::Bytes segment : content.segments) {
-    const std::optional<record::Key> tree = record::TakeKey(segment);
-    if (!tree || !segment.empty()) {
+    const unsigned char* const start = segment.data();
+    if (!record::TakeKey(segment) || !segment.empty()) {
       error = kDamaged;
       return;
     }
-    AddLayer(*root_, *tree);
+    AddLayer(*root_, start);
   }
 }
 
-void KeyTree::AddLayer(Key& key, const record::Key& bytes) {
-  auto* const layer = Make<Key::Layer>(Key::Layer{bytes.values, bytes.keys, nullptr});
-  (key.lastLayer_ ? key.lastLayer_->next : key.firstLayer_) = layer;
-  key.lastLayer_ = layer;
+const unsigned char* KeyTree::MakeRecord(const record::Name& name, std::uint8_t dimension) {
+  record::Buffer bytes;
+  record::KeyWriter(bytes, dimension, name).Close();
+  auto* const made = static_cast<unsigned char*>(memory_.allocate(bytes.size(), 1));
+  std::copy(bytes.begin(), bytes.end(), made);
+  return made;
 }
 
-KeyTree::Content& KeyTree::Visit(Key& key) {
-  if (!key.content_) key.content_ = Make<Content>(&memory_);
-  // Laying the same layer over a key twice is the same as once, so a layer goes only when all of
-  // it is done, whatever interrupts this.
-  for (const Key::Layer* layer = key.firstLayer_; layer; layer = layer->next) {
-    if (!TakeApart(key, *key.content_, *layer)) error = kDamaged;
-  }
-  key.firstLayer_ = key.lastLayer_ = nullptr;
-  return *key.content_;
+void KeyTree::AddLayer(Key& key, const unsigned char* record) {
+  auto* const layer = Make<Key::Layer>(Key::Layer{record, nullptr});
+  (key.last_ ? key.last_ : &key.first_)->next = layer;
+  key.last_ = layer;
 }
 
-bool KeyTree::TakeApart(Key& key, Content& content, const Key::Layer& layer) {
-  record::Bytes bytes = layer.values;
-  while (!bytes.empty()) {
-    const ValueRecord start = bytes.data();
-    const std::optional<record::Value> value = record::TakeValue(bytes);
-    if (!value) return false;
-    const std::size_t place = content.values.Find(value->name);
-    if (place == content.values.items().size()) {
-      content.values.Append(start);
-    } else {
-      content.values.Replace(place, start);
+// Taking a layer apart twice is the same as once, so a list counts as whole only when all of it is
+// done, whatever interrupts that.
+
+NamedList<ValueRecord>& KeyTree::TakeValues(Key& key) {
+  if (!key.values_) key.values_ = Make<NamedList<ValueRecord>>(&memory_);
+  if (key.valuesAreWhole_) return *key.values_;
+  for (const Key::Layer* layer = &key.first_; layer; layer = layer->next) {
+    record::Bytes bytes = record::KeyAt(layer->record).values;
+    while (!bytes.empty()) {
+      const ValueRecord start = bytes.data();
+      const std::optional<record::Value> value = record::TakeValue(bytes);
+      if (!value) {
+        error = kDamaged;
+        break;
+      }
+      key.values_->Put(value->name, start);
     }
   }
-  bytes = layer.keys;
-  while (!bytes.empty()) {
-    const std::optional<record::Key> found = record::TakeKey(bytes);
-    if (!found || key.depth == record::kMaxDepth) return false;
-    const std::size_t place = content.keys.Find(found->name);
-    if (place == content.keys.items().size()) {
-      content.keys.Append(Make<Key>(*this, &key, found->name, found->dimension));
+  key.valuesAreWhole_ = true;
+  return *key.values_;
+}
+
+NamedList<KeyTree::Key*>& KeyTree::TakeKeys(Key& key) {
+  if (!key.keys_) key.keys_ = Make<NamedList<Key*>>(&memory_);
+  if (key.keysAreWhole_) return *key.keys_;
+  for (const Key::Layer* layer = &key.first_; layer; layer = layer->next) {
+    record::Bytes bytes = record::KeyAt(layer->record).keys;
+    while (!bytes.empty()) {
+      const unsigned char* const start = bytes.data();
+      const std::optional<record::Key> found = record::TakeKey(bytes);
+      if (!found || key.depth == record::kMaxDepth) {
+        error = kDamaged;
+        break;
+      }
+      const std::size_t place = key.keys_->Find(found->name);
+      if (place < key.keys_->items().size()) {
+        AddLayer(*key.keys_->items()[place], start);
+      } else {
+        key.keys_->Append(Make<Key>(*this, &key, start));
+      }
     }
-    AddLayer(*content.keys.items()[place], *found);
   }
-  return true;
+  key.keysAreWhole_ = true;
+  return *key.keys_;
 }
 
 KeyTree::Key* KeyTree::FindKey(Key& key, const record::Name& name) {
-  const auto& keys = Visit(key).keys;
+  const auto& keys = TakeKeys(key);
   const std::size_t place = keys.Find(name);
   return place == keys.items().size() ? nullptr : keys.items()[place];
 }
 
 ValueRecord KeyTree::FindValue(Key& key, const record::Name& name) {
-  const auto& values = Visit(key).values;
+  if (!key.values_ && key.HasOneLayer()) return FindWhereItLies(key, name);
+  const auto& values = TakeValues(key);
   const std::size_t place = values.Find(name);
   return place == values.items().size() ? nullptr : values.items()[place];
+}
+
+ValueRecord KeyTree::FindWhereItLies(const Key& key, const record::Name& name) {
+  ValueRecord found = nullptr;  // the last of several of one name counts
+  record::Bytes bytes = record::KeyAt(key.first_.record).values;
+  while (!bytes.empty()) {
+    const ValueRecord start = bytes.data();
+    const std::optional<record::Value> value = record::TakeValue(bytes);
+    if (!value) {
+      error = kDamaged;
+      break;
+    }
+    if (value->name == name) found = start;
+  }
+  return found;
 }
 
 KeyTree::Key* KeyTree::OpenKey(Key& key, const record::Name& name, std::uint8_t dimension) {
   if (Key* const found = FindKey(key, name)) return found;
   if (key.depth == record::kMaxDepth || name.bytes > kMaxNameBytes) return nullptr;
-  auto* const units = static_cast<unsigned char*>(memory_.allocate(name.bytes, 1));
-  std::copy_n(name.units, name.bytes, units);
-  auto* const made = Make<Key>(*this, &key, record::Name{units, name.bytes}, dimension);
+  auto* const made = Make<Key>(*this, &key, MakeRecord(name, dimension));
   MarkUnsaved(*made);
-  Visit(key).keys.Append(made);
+  TakeKeys(key).Append(made);
   return made;
 }
 
 bool KeyTree::SetValue(Key& key, const record::Value& value) {
   if (!record::IsConsistent(value)) return false;
-  auto& values = Visit(key).values;
+  NamedList<ValueRecord>& values = TakeValues(key);
   const std::size_t place = values.Find(value.name);
   const bool replaces = place < values.items().size();
   const ValueRecord replaced = replaces ? values.items()[place] : nullptr;
@@ -142,7 +174,7 @@ void KeyTree::DeepCopy(Key& to, Key& from) {
   const std::size_t count = source.Keys(from).size();
   for (std::size_t i = 0; i < count; ++i) {
     Key* const key = source.Keys(from)[i];
-    if (Key* const copy = OpenKey(to, key->name, key->dimension)) DeepCopy(*copy, *key);
+    if (Key* const copy = OpenKey(to, key->name(), key->dimension())) DeepCopy(*copy, *key);
   }
 }
 
@@ -161,7 +193,7 @@ record::Buffer KeyTree::WriteUnsaved() {
 }
 
 void KeyTree::WriteUnsaved(record::Buffer& to, const Key& key) {
-  record::KeyWriter writer(to, key.dimension, key.name);
+  record::KeyWriter writer(to, key.dimension(), key.name());
   const Unsaved& unsaved = unsaved_[&key];
   for (const ValueRecord value : unsaved.values) AppendRecord(to, value);
   writer.EndValues();
@@ -176,7 +208,7 @@ record::Buffer KeyTree::WriteAll() {
 }
 
 void KeyTree::WriteAll(record::Buffer& to, Key& key) {
-  record::KeyWriter writer(to, key.dimension, key.name);
+  record::KeyWriter writer(to, key.dimension(), key.name());
   for (const ValueRecord value : Values(key)) AppendRecord(to, value);
   writer.EndValues();
   for (Key* const sub : Keys(key)) WriteAll(to, *sub);

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <memory>
@@ -18,17 +19,32 @@
 
 namespace orx {
 
-/// The UTF-16 form of a name that is looked up.
+/// The UTF-16 form of a name that is looked up; a plain one needs no memory of its own.
 class LookupName {
  public:
-  explicit LookupName(std::wstring_view name) : utf16_(ToUtf16(name)) {}
-  record::Name Get() const {
-    return {reinterpret_cast<const unsigned char*>(utf16_.data()),
-            utf16_.size() * sizeof(char16_t)};
+  explicit LookupName(std::wstring_view name) {
+    if (name.size() <= kPlain && std::all_of(name.begin(), name.end(), IsOneUnit)) {
+      std::transform(name.begin(), name.end(), plain_,
+                     [](wchar_t c) { return static_cast<char16_t>(c); });
+      name_ = {reinterpret_cast<const unsigned char*>(plain_), name.size() * sizeof(char16_t)};
+    } else {
+      other_ = ToUtf16(name);
+      name_ = {reinterpret_cast<const unsigned char*>(other_.data()),
+               other_.size() * sizeof(char16_t)};
+    }
   }
+  LookupName(const LookupName&) = delete;
+  LookupName& operator=(const LookupName&) = delete;
+
+  const record::Name& Get() const { return name_; }
 
  private:
-  std::u16string utf16_;
+  static constexpr std::size_t kPlain = 64;
+  static bool IsOneUnit(wchar_t c) { return static_cast<char32_t>(c) < 0xD800; }
+
+  char16_t plain_[kPlain];
+  std::u16string other_;
+  record::Name name_;
 };
 
 /// A value in memory: its record, in the file's bytes or in the tree's memory.
@@ -69,6 +85,16 @@ class NamedList {
   /// Puts another item of the same name in the place of one.
   void Replace(std::size_t place, Item item) { items_[place] = item; }
 
+  /// Puts an item in the place of the one of its name, or behind the others.
+  void Put(const record::Name& name, Item item) {
+    const std::size_t place = Find(name);
+    if (place < items_.size()) {
+      Replace(place, item);
+    } else {
+      Append(item);
+    }
+  }
+
  private:
   /// Up to this many items a look at each is faster than an index.
   static constexpr std::size_t kLinear = 12;
@@ -104,44 +130,43 @@ class NamedList {
   Index* index_ = nullptr;  ///< in the memory of `items_`
 };
 
-/// A key in memory. It is taken apart into values and sub-keys when it is first visited; until then
-/// it only knows the records that are laid over one another to make it.
+/// A key in memory: the records that are laid over one another to make it. Its sub-keys and its
+/// values are each taken apart when they are first needed; the values of a key of one record are
+/// read where they lie.
 class TGenericRegistryKeyImp {
  public:
-  TGenericRegistryKeyImp(KeyTree& owner, TGenericRegistryKeyImp* above, record::Name ownName,
-                         std::uint8_t ownDimension)
+  TGenericRegistryKeyImp(KeyTree& owner, TGenericRegistryKeyImp* above, const unsigned char* record)
       : tree(&owner),
         parent(above),
-        name(ownName),
-        dimension(ownDimension),
+        first_{record, nullptr},
         depth(static_cast<std::uint8_t>(above ? above->depth + 1 : 0)) {}
 
-  KeyTree* tree;
-  TGenericRegistryKeyImp* parent;  ///< null for the root
-  record::Name name;
-  std::uint8_t dimension;
-  std::uint8_t depth;
+  record::Name name() const { return record::KeyAt(first_.record).name; }
+  std::uint8_t dimension() const { return record::KeyAt(first_.record).dimension; }
+
+  KeyTree* const tree;
+  TGenericRegistryKeyImp* const parent;  ///< null for the root
 
  private:
   friend class KeyTree;
 
   struct Layer {
-    record::Bytes values;
-    record::Bytes keys;
+    const unsigned char* record;
     Layer* next;
   };
-  struct Content {
-    explicit Content(std::pmr::memory_resource* memory) : values(memory), keys(memory) {}
-    NamedList<ValueRecord> values;
-    NamedList<TGenericRegistryKeyImp*> keys;
-  };
 
-  Layer* firstLayer_ = nullptr;  ///< layers not taken apart yet
-  Layer* lastLayer_ = nullptr;
-  Content* content_ = nullptr;
+  bool HasOneLayer() const { return !first_.next; }
+
+  Layer first_;
+  Layer* last_ = nullptr;  ///< null: the first is the last
+  NamedList<ValueRecord>* values_ = nullptr;
+  NamedList<TGenericRegistryKeyImp*>* keys_ = nullptr;
+  const std::uint8_t depth;
+  bool valuesAreWhole_ = false;  ///< every layer's values are in `values_`
+  bool keysAreWhole_ = false;    ///< every layer's keys are in `keys_`
 };
 
-inline record::Name NameOf(const TGenericRegistryKeyImp* key) { return key->name; }
+inline record::Name NameOf(const TGenericRegistryKeyImp* key) { return key->name(); }
 
 /// A tree of keys in memory, together with the bytes of the file that it came from. What changed
 /// since it was last saved is kept apart, so that saving costs what changed.
@@ -156,8 +181,8 @@ class KeyTree {
 
   Key& root() { return *root_; }
   /// The sub-keys of a key, in their order.
-  const std::pmr::vector<Key*>& Keys(Key& key) { return Visit(key).keys.items(); }
-  const std::pmr::vector<ValueRecord>& Values(Key& key) { return Visit(key).values.items(); }
+  const std::pmr::vector<Key*>& Keys(Key& key) { return TakeKeys(key).items(); }
+  const std::pmr::vector<ValueRecord>& Values(Key& key) { return TakeValues(key).items(); }
 
   /// \return null when there is none of that name
   Key* FindKey(Key& key, const record::Name& name);
@@ -187,7 +212,6 @@ class KeyTree {
   FilePosition position;  ///< where the tree's file was last seen to end
 
  private:
-  using Content = Key::Content;
   struct Unsaved {
     std::vector<ValueRecord> values;
     std::vector<Key*> keys;
@@ -198,14 +222,16 @@ class KeyTree {
     return std::pmr::polymorphic_allocator<>(&memory_).new_object<T>(
         std::forward<Arguments>(arguments)...);
   }
-  void AddLayer(Key& key, const record::Key& bytes);
-  Content& Visit(Key& key);
-  bool TakeApart(Key& key, Content& content, const Key::Layer& layer);
+  const unsigned char* MakeRecord(const record::Name& name, std::uint8_t dimension);
+  void AddLayer(Key& key, const unsigned char* record);
+  NamedList<ValueRecord>& TakeValues(Key& key);
+  NamedList<Key*>& TakeKeys(Key& key);
+  ValueRecord FindWhereItLies(const Key& key, const record::Name& name);
   Unsaved& MarkUnsaved(Key& key);
   void WriteUnsaved(record::Buffer& to, const Key& key);
   void WriteAll(record::Buffer& to, Key& key);
 
-  std::unique_ptr<unsigned char[]> file_;
+  os::Memory file_;
   std::pmr::monotonic_buffer_resource memory_;
   Key* root_;
   bool changed_ = false;

@@ -3,6 +3,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <filesystem>
+#include <memory>
 #include <optional>
 
 /// The few operations on files that the registry is built on, one implementation for each
@@ -63,6 +64,22 @@ class File {
   explicit File(Handle handle) : handle_(handle) {}
 
   Handle handle_;
+};
+
+/// Memory for a whole file, not initialised.
+class Memory {
+ public:
+  Memory() = default;
+  /// \throws std::bad_alloc
+  explicit Memory(std::size_t size);
+
+  unsigned char* get() const { return bytes_.get(); }
+
+ private:
+  struct Free {
+    void operator()(unsigned char* bytes) const;
+  };
+  std::unique_ptr<unsigned char[], Free> bytes_;
 };
 
 /// \return nothing when there is no such file

@@ -1,10 +1,15 @@
 #include <fcntl.h>
 #include <sys/file.h>
+#include <sys/mman.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
+#include <cstddef>
 #include <cstdio>
+#include <cstdlib>
+#include <new>
 
 #include "os_file.h"
 
@@ -113,6 +118,21 @@ bool File::Truncate(std::uint64_t size) {
 bool File::Flush() {
   return Retry([&] { return fdatasync(handle_); }) == 0;
 }
+
+Memory::Memory(std::size_t size) {
+  // Large files are read into large pages where the system has them.
+  constexpr std::size_t kLargePage = 2U << 20U;
+  const std::size_t alignment = size < kLargePage ? alignof(std::max_align_t) : kLargePage;
+  const std::size_t whole =
+      (std::max(size, std::size_t{1}) + alignment - 1) / alignment * alignment;
+  bytes_.reset(static_cast<unsigned char*>(std::aligned_alloc(alignment, whole)));
+  if (!bytes_) throw std::bad_alloc();
+#ifdef MADV_HUGEPAGE
+  if (alignment == kLargePage) madvise(bytes_.get(), whole, MADV_HUGEPAGE);
+#endif
+}
+
+void Memory::Free::operator()(unsigned char* bytes) const { std::free(bytes); }
 
 std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
   struct stat status;

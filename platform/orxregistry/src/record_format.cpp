@@ -77,25 +77,28 @@ std::optional<Value> TakeValue(Bytes& bytes) {
   return value;
 }
 
-std::optional<Key> TakeKey(Bytes& bytes) {
-  if (bytes.size() < kKeyHeader) return std::nullopt;
-  const unsigned char* const record = bytes.data();
+Key KeyAt(const unsigned char* record) {
   Key key;
   key.dimension = record[kKeyDimensionAt];
   key.name.units = record + kKeyHeader;
   key.name.bytes = kUnit * Load<std::uint16_t>(record + kKeyNameUnitsAt);
-  if (record[kKeyReservedAt] != 0 || bytes.size() - kKeyHeader < key.name.bytes) {
-    return std::nullopt;
-  }
-  Bytes rest = bytes.substr(kKeyHeader + key.name.bytes);
-  const auto valuesSize = Load<std::uint64_t>(record + kValuesSizeAt);
-  const auto keysSize = Load<std::uint64_t>(record + kKeysSizeAt);
-  if (valuesSize > rest.size() || keysSize > rest.size() - valuesSize) return std::nullopt;
-  key.values = rest.substr(0, valuesSize);
-  key.keys = rest.substr(valuesSize, keysSize);
-  rest.remove_prefix(valuesSize + keysSize);
-  bytes = rest;
+  const unsigned char* const values = key.name.units + key.name.bytes;
+  key.values = Bytes(values, Load<std::uint64_t>(record + kValuesSizeAt));
+  key.keys = Bytes(values + key.values.size(), Load<std::uint64_t>(record + kKeysSizeAt));
   return key;
+}
+
+std::optional<Key> TakeKey(Bytes& bytes) {
+  if (bytes.size() < kKeyHeader) return std::nullopt;
+  const unsigned char* const record = bytes.data();
+  const std::size_t name = kUnit * Load<std::uint16_t>(record + kKeyNameUnitsAt);
+  if (record[kKeyReservedAt] != 0 || bytes.size() - kKeyHeader < name) return std::nullopt;
+  const std::size_t rest = bytes.size() - kKeyHeader - name;
+  const auto values = Load<std::uint64_t>(record + kValuesSizeAt);
+  const auto keys = Load<std::uint64_t>(record + kKeysSizeAt);
+  if (values > rest || keys > rest - values) return std::nullopt;
+  bytes.remove_prefix(kKeyHeader + name + values + keys);
+  return KeyAt(record);
 }
 
 void AppendValue(Buffer& to, const Value& value) {

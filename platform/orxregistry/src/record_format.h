@@ -69,8 +69,11 @@ std::optional<Value> TakeValue(Bytes& bytes);
 /// Takes the key at the front of `bytes` off them; nothing when it is not a whole key.
 std::optional<Key> TakeKey(Bytes& bytes);
 
-/// The value at the start of a record that TakeValue has accepted.
+/// The value whose record TakeValue has accepted.
 Value ValueAt(const unsigned char* record);
+
+/// The key whose record TakeKey has accepted.
+Key KeyAt(const unsigned char* record);
 
 /// Bytes of the record of a value.
 std::size_t ValueRecordSize(const Value& value);

@@ -38,11 +38,11 @@ TGenericRegistryKey::TGenericRegistryKey(const TGenericRegistryKey& parent, std:
 }
 
 COrxStringT<wchar_t> TGenericRegistryKey::GetName() const {
-  return imp_ ? ToWide(imp_->name) : COrxStringT<wchar_t>();
+  return imp_ ? ToWide(imp_->name()) : COrxStringT<wchar_t>();
 }
 
 std::uint8_t TGenericRegistryKey::GetKeyDim() const {
-  return imp_ ? imp_->dimension : std::uint8_t{0};
+  return imp_ ? imp_->dimension() : std::uint8_t{0};
 }
 
 bool TGenericRegistryKey::HasKey(std::wstring_view name) const {

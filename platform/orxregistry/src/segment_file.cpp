@@ -65,7 +65,9 @@ std::u16string DescriptionOf(Bytes bytes) {
 
 Buffer MakeFileHeader(const std::u16string& description) {
   const std::size_t size = std::min(description.size() * sizeof(char16_t), kMaxDescription);
-  Buffer header(kMagic, kMagic + sizeof kMagic);
+  Buffer header;
+  header.reserve(kDescriptionAt + size + kChecksum);
+  header.insert(header.end(), kMagic, kMagic + sizeof kMagic);
   record::Append(header, std::uint32_t{kRegistryVersion});
   record::Append(header, static_cast<std::uint32_t>(size));
   const auto* const text = reinterpret_cast<const unsigned char*>(description.data());
@@ -153,7 +155,7 @@ FileContent ReadContent(const os::File& file) {
     content.error = kNotARegistryFile;
     return content;
   }
-  content.memory = std::make_unique_for_overwrite<unsigned char[]>(stamp->size);
+  content.memory = os::Memory(stamp->size);
   const auto size = file.Read(0, content.memory.get(), stamp->size);
   if (!size) {
     content.error = kCannotBeOpened;

@@ -2,7 +2,6 @@
 
 #include <cstdint>
 #include <filesystem>
-#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
@@ -18,7 +17,7 @@ namespace orx {
 /// A file read into memory and what was found in it.
 struct FileContent {
   RegistryError error = kRegistryOk;
-  std::unique_ptr<unsigned char[]> memory;
+  os::Memory memory;
   std::u16string description;
   std::vector<record::Bytes> segments;  ///< the key trees in order, in `memory`
   std::uint64_t end = 0;                ///< where the last whole segment ends

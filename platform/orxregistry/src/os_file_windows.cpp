@@ -1,0 +1,161 @@
+#define WIN32_LEAN_AND_MEAN
+#define NOMINMAX
+#include <windows.h>
+
+#include <algorithm>
+#include <string>
+#include <vector>
+
+#include "os_file.h"
+
+namespace orx::os {
+namespace {
+
+constexpr DWORD kShareAll = FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE;
+/// What one call reads or writes at most.
+constexpr std::size_t kLargestCall = 1U << 30U;
+/// Locks bar readers from the bytes that they cover, so the byte that is locked lies behind any
+/// file's end.
+constexpr DWORD kLockedByteHigh = 0x7FFFFFFF;
+
+/// FILE_RENAME_INFO for FileRenameInfoEx, which not every header knows.
+constexpr auto kFileRenameInfoEx = static_cast<FILE_INFO_BY_HANDLE_CLASS>(22);
+constexpr DWORD kReplaceIfExists = 1;
+constexpr DWORD kPosixSemantics = 2;
+
+/// The absolute form that may be longer than MAX_PATH.
+std::wstring Native(const std::filesystem::path& path) {
+  std::error_code error;
+  const std::filesystem::path absolute = std::filesystem::absolute(path, error);
+  const std::wstring name = (error ? path : absolute).lexically_normal().make_preferred().wstring();
+  if (name.size() < MAX_PATH - 12 || name.starts_with(L"\\\\?\\")) return name;
+  return name.starts_with(L"\\\\") ? L"\\\\?\\UNC" + name.substr(1) : L"\\\\?\\" + name;
+}
+
+HANDLE Open(const std::filesystem::path& path, DWORD access, DWORD disposition) {
+  const HANDLE handle = CreateFileW(Native(path).c_str(), access, kShareAll, nullptr, disposition,
+                                    FILE_ATTRIBUTE_NORMAL, nullptr);
+  return handle == INVALID_HANDLE_VALUE ? nullptr : handle;
+}
+
+std::uint64_t Join(DWORD high, DWORD low) { return (std::uint64_t{high} << 32U) | low; }
+
+OVERLAPPED At(std::uint64_t offset) {
+  OVERLAPPED place = {};
+  place.Offset = static_cast<DWORD>(offset);
+  place.OffsetHigh = static_cast<DWORD>(offset >> 32U);
+  return place;
+}
+
+/// Replaces a file that others have open: they keep the old one.
+bool RenameOver(const std::filesystem::path& from, const std::filesystem::path& to) {
+  const HANDLE handle = Open(from, DELETE | SYNCHRONIZE, OPEN_EXISTING);
+  if (!handle) return false;
+  const std::wstring name = Native(to);
+  std::vector<unsigned char> buffer(sizeof(FILE_RENAME_INFO) + name.size() * sizeof(wchar_t));
+  auto* const info = reinterpret_cast<FILE_RENAME_INFO*>(buffer.data());
+  *reinterpret_cast<DWORD*>(info) = kReplaceIfExists | kPosixSemantics;
+  info->FileNameLength = static_cast<DWORD>(name.size() * sizeof(wchar_t));
+  std::copy(name.begin(), name.end(), info->FileName);
+  const bool renamed = SetFileInformationByHandle(handle, kFileRenameInfoEx, info,
+                                                  static_cast<DWORD>(buffer.size())) != 0;
+  CloseHandle(handle);
+  return renamed;
+}
+
+}  // namespace
+
+std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
+  const HANDLE handle = Open(path, GENERIC_READ, OPEN_EXISTING);
+  if (!handle) return std::nullopt;
+  return File(handle);
+}
+
+std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool create) {
+  for (;;) {
+    const HANDLE handle =
+        Open(path, GENERIC_READ | GENERIC_WRITE, create ? OPEN_ALWAYS : OPEN_EXISTING);
+    if (!handle) return std::nullopt;
+    File file(handle);
+    OVERLAPPED place = {};
+    place.OffsetHigh = kLockedByteHigh;
+    if (!LockFileEx(handle, LOCKFILE_EXCLUSIVE_LOCK, 0, 1, 0, &place)) return std::nullopt;
+    // While this waited, the file may have been replaced by another of the same name.
+    const std::optional<FileStamp> opened = file.Stamp();
+    const std::optional<FileStamp> named = StampOf(path);
+    if (!opened || (!named && !create)) return std::nullopt;
+    if (named && opened->IsSameFile(*named)) return file;
+  }
+}
+
+File::~File() {
+  if (handle_ != kNone) CloseHandle(handle_);
+}
+
+std::optional<FileStamp> File::Stamp() const {
+  BY_HANDLE_FILE_INFORMATION information;
+  if (!GetFileInformationByHandle(handle_, &information)) return std::nullopt;
+  FileStamp stamp;
+  stamp.device = information.dwVolumeSerialNumber;
+  stamp.file = Join(information.nFileIndexHigh, information.nFileIndexLow);
+  stamp.size = Join(information.nFileSizeHigh, information.nFileSizeLow);
+  stamp.modified = static_cast<std::int64_t>(
+      Join(information.ftLastWriteTime.dwHighDateTime, information.ftLastWriteTime.dwLowDateTime));
+  return stamp;
+}
+
+std::optional<std::size_t> File::Read(std::uint64_t offset, unsigned char* to,
+                                      std::size_t size) const {
+  std::size_t done = 0;
+  while (done < size) {
+    OVERLAPPED place = At(offset + done);
+    const auto wanted = static_cast<DWORD>(std::min(size - done, kLargestCall));
+    DWORD count = 0;
+    if (!ReadFile(handle_, to + done, wanted, &count, &place)) {
+      if (GetLastError() == ERROR_HANDLE_EOF) break;
+      return std::nullopt;
+    }
+    if (count == 0) break;
+    done += count;
+  }
+  return done;
+}
+
+bool File::Write(std::uint64_t offset, const unsigned char* from, std::size_t size) {
+  std::size_t done = 0;
+  while (done < size) {
+    OVERLAPPED place = At(offset + done);
+    const auto wanted = static_cast<DWORD>(std::min(size - done, kLargestCall));
+    DWORD count = 0;
+    if (!WriteFile(handle_, from + done, wanted, &count, &place) || count == 0) return false;
+    done += count;
+  }
+  return true;
+}
+
+bool File::Truncate(std::uint64_t size) {
+  LARGE_INTEGER end;
+  end.QuadPart = static_cast<LONGLONG>(size);
+  return SetFilePointerEx(handle_, end, nullptr, FILE_BEGIN) && SetEndOfFile(handle_);
+}
+
+bool File::Flush() { return FlushFileBuffers(handle_) != 0; }
+
+Memory::Memory(std::size_t size) : bytes_(new unsigned char[size]) {}
+
+void Memory::Free::operator()(unsigned char* bytes) const { delete[] bytes; }
+
+std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
+  const std::optional<File> file = File::OpenToRead(path);
+  return file ? file->Stamp() : std::nullopt;
+}
+
+bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
+  if (replace && RenameOver(from, to)) return true;
+  const DWORD flags = MOVEFILE_WRITE_THROUGH | (replace ? MOVEFILE_REPLACE_EXISTING : 0U);
+  return MoveFileExW(Native(from).c_str(), Native(to).c_str(), flags) != 0;
+}
+
+void Remove(const std::filesystem::path& path) { DeleteFileW(Native(path).c_str()); }
+
+}  // namespace orx::os
