@@ -3,6 +3,13 @@
 #include <filesystem>
 #include <system_error>
 
+#ifdef _WIN32
+#include <fcntl.h>
+#include <io.h>
+#else
+#include <unistd.h>
+#endif
+
 namespace orx::FileFuncs {
 namespace fs = std::filesystem;
 namespace {
@@ -39,5 +46,15 @@ bool createDirectoryTree(const COrxStringT<wchar_t>& name) {
     return fs::is_directory(path, error);
   });
 }
+
+#ifdef _WIN32
+bool isTerminal(std::FILE* file) { return _isatty(_fileno(file)) != 0; }
+
+void setBinaryMode(std::FILE* file) { _setmode(_fileno(file), _O_BINARY); }
+#else
+bool isTerminal(std::FILE* file) { return isatty(fileno(file)) != 0; }
+
+void setBinaryMode(std::FILE*) {}
+#endif
 
 }  // namespace orx::FileFuncs

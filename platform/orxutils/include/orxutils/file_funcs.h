@@ -1,5 +1,7 @@
 #pragma once
 
+#include <cstdio>
+
 #include "orxutils/export.h"
 #include "orxutils/orx_string.h"
 
@@ -15,5 +17,11 @@ ORXUTILS_EXPORT bool isDirExists(const COrxStringT<wchar_t>& name);
 /// Makes a directory with all missing parents.
 /// \return true when the directory exists afterwards
 ORXUTILS_EXPORT bool createDirectoryTree(const COrxStringT<wchar_t>& name);
+
+/// True when an open file is a terminal.
+ORXUTILS_EXPORT bool isTerminal(std::FILE* file);
+
+/// Has an open file's bytes pass as they are, line ends included.
+ORXUTILS_EXPORT void setBinaryMode(std::FILE* file);
 
 }  // namespace orx::FileFuncs
