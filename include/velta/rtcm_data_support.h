@@ -146,6 +146,13 @@ class RTCMDataSupport {
                                                           const COrxStringT<wchar_t>& source);
 
  private:
+  /// \param rotationPoint the message again when it is a 1022, null when it is a 1021
+  ResultCode ParseDatum(const RtcmBasicTransformMessage& message, const Rtcm1022* rotationPoint,
+                        const Rtcm1023* grid);
+  /// \param typeCode the projection's type code, 100 for the rectified oblique Mercator
+  template <class Message>
+  ResultCode ParseProjection(const Message& message, std::uint32_t typeCode, const Rtcm1024* grid);
+
   COrxStringT<wchar_t> SetRegionNameByPlateNumber(std::uint32_t plateNumber);
 
   ResultCode InitDatumGFF(DatumData& datum);
@@ -166,14 +173,14 @@ class RTCMDataSupport {
   static ResultCode MergeRTCMProjectionfiles(TGenericRegistryKey& target,
                                              TGenericRegistryKey& source);
 
-  COrxStringT<wchar_t> datumPath;
-  COrxStringT<wchar_t> projectionPath;
-  DatumData datum;
-  ProjectionData projection;
-  MsgUtilized msgUtilized;
-  COrxStringT<wchar_t> datumEntryName;
-  COrxStringT<wchar_t> projectionEntryName;
-  COrxStringT<wchar_t> regionName;
+  COrxStringT<wchar_t> datumPath_;
+  COrxStringT<wchar_t> projectionPath_;
+  DatumData datum_;
+  ProjectionData projection_;
+  MsgUtilized msgUtilized_;
+  COrxStringT<wchar_t> datumEntryName_;
+  COrxStringT<wchar_t> projectionEntryName_;
+  COrxStringT<wchar_t> regionName_;
 };
 
 }  // namespace orx::cs::velta

@@ -20,6 +20,8 @@ void AppendRecord(record::Buffer& to, ValueRecord value) {
 
 }  // namespace
 
+record::Name NameOf(const TGenericRegistryKeyImp* key) { return key->name(); }
+
 KeyTree::KeyTree(std::u16string text)
     : description(std::move(text)),
       root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {}

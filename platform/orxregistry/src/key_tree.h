@@ -15,12 +15,6 @@
 
 namespace orx {
 
-/// A value in memory: its record, in the file's bytes or in the tree's memory.
-using ValueRecord = const unsigned char*;
-
-inline record::Name NameOf(ValueRecord value) { return record::ValueAt(value).name; }
-inline record::Name NameOf(const TGenericRegistryKeyImp* key);
-
 /// A key in memory: the records that are laid over one another to make it. Its sub-keys and its
 /// values are each taken apart when they are first needed; the values of a key of one record are
 /// read where they lie.
@@ -56,8 +50,6 @@ class TGenericRegistryKeyImp {
   bool valuesAreWhole_ = false;  ///< every layer's values are in `values_`
   bool keysAreWhole_ = false;    ///< every layer's keys are in `keys_`
 };
-
-inline record::Name NameOf(const TGenericRegistryKeyImp* key) { return key->name(); }
 
 /// A tree of keys in memory, together with the bytes of the file that it came from. What changed
 /// since it was last saved is kept apart, so that saving costs what changed.

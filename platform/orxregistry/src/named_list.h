@@ -14,6 +14,8 @@
 
 namespace orx {
 
+class TGenericRegistryKeyImp;
+
 /// The UTF-16 form of a name that is looked up; a plain one needs no memory of its own.
 class LookupName {
  public:
@@ -41,6 +43,12 @@ class LookupName {
   std::u16string other_;
   record::Name name_;
 };
+
+/// A value in memory: its record, in the file's bytes or in the tree's memory.
+using ValueRecord = const unsigned char*;
+
+inline record::Name NameOf(ValueRecord value) { return record::ValueAt(value).name; }
+record::Name NameOf(const TGenericRegistryKeyImp* key);
 
 /// Things with names, in the order in which they were added. Finding one does not get slower with
 /// their number.
