@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 
 #include "orxutils/orx_string.h"
@@ -34,6 +35,7 @@ struct DatumData {
   /// Copies every field but `ellipsoidName`, which the target keeps. Each ellipsoid is rebuilt
   /// from its two defining values with kind 0.
   DatumData& operator=(const DatumData& other) {
+    if (this == &other) return *this;
     sourceEllipsoid = projmath::Ellipsoid::FromInverseFlattening(other.sourceEllipsoid.a,
                                                                  other.sourceEllipsoid.second);
     targetEllipsoid = projmath::Ellipsoid::FromInverseFlattening(other.targetEllipsoid.a,
@@ -50,9 +52,9 @@ struct DatumData {
   }
 
  private:
-  template <int N>
+  template <std::size_t N>
   static void CopyArray(double (&to)[N], const double (&from)[N]) {
-    for (int i = 0; i < N; ++i) to[i] = from[i];
+    for (std::size_t i = 0; i < N; ++i) to[i] = from[i];
   }
 };
 

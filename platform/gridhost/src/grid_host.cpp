@@ -4,10 +4,12 @@
 #include <boost/thread/lock_types.hpp>
 #include <cstdint>
 #include <filesystem>
+#include <functional>
 #include <map>
 #include <memory>
 #include <mutex>
 #include <string>
+#include <string_view>
 #include <system_error>
 
 #include "orxregistry/in_file_key.h"
@@ -64,10 +66,12 @@ class SharedFiles {
     return kSuccess;
   }
 
-  /// The caller may still hold the file's lock, so the tree stays as it is.
+  /// The caller may still hold the file's lock, so the tree stays as it is. Needs no memory for a
+  /// name that is normalised, as it must work when memory is out.
   void Reset(const wchar_t* name) {
     const std::lock_guard<std::mutex> lock(mutex_);
-    const auto entry = files_.find(Normalise(name));
+    auto entry = files_.find(std::wstring_view(name));
+    if (entry == files_.end()) entry = files_.find(Normalise(name));
     if (entry != files_.end() && entry->second->users > 0) --entry->second->users;
   }
 
@@ -81,7 +85,7 @@ class SharedFiles {
   }
 
   std::mutex mutex_;
-  std::map<std::wstring, std::unique_ptr<SharedFile>> files_;
+  std::map<std::wstring, std::unique_ptr<SharedFile>, std::less<>> files_;
 };
 
 SharedFiles& Files() {

@@ -63,6 +63,20 @@ bool RenameOver(const std::filesystem::path& from, const std::filesystem::path& 
   return renamed;
 }
 
+/// The same where the file system has no such rename, as on a network share. A file that is open
+/// can only be moved out of the way: for a moment there is none of that name.
+bool SwapIn(const std::filesystem::path& from, const std::filesystem::path& to) {
+  const std::wstring name = Native(to);
+  const std::wstring old = name + L".old";
+  if (!MoveFileExW(name.c_str(), old.c_str(), MOVEFILE_REPLACE_EXISTING)) return false;
+  if (!MoveFileExW(Native(from).c_str(), name.c_str(), MOVEFILE_WRITE_THROUGH)) {
+    MoveFileExW(old.c_str(), name.c_str(), 0);
+    return false;
+  }
+  DeleteFileW(old.c_str());
+  return true;
+}
+
 }  // namespace
 
 std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
@@ -151,7 +165,7 @@ std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
 }
 
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
-  if (replace && RenameOver(from, to)) return true;
+  if (replace && (RenameOver(from, to) || SwapIn(from, to))) return true;
   const DWORD flags = MOVEFILE_WRITE_THROUGH | (replace ? MOVEFILE_REPLACE_EXISTING : 0U);
   return MoveFileExW(Native(from).c_str(), Native(to).c_str(), flags) != 0;
 }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <string_view>
 #include <utility>
 
 #include "key_tree.h"
@@ -104,10 +105,9 @@ void AppendSegmentTo(Buffer& to, std::uint64_t at, const Buffer& tree, std::uint
 
 /// Tells damage from a save that never finished: behind damage there is another segment.
 bool HasSegmentBehind(Bytes bytes, std::size_t at) {
-  unsigned char mark[sizeof kSegmentMark];
-  std::memcpy(mark, &kSegmentMark, sizeof mark);
-  const Bytes sought(mark, sizeof mark);
-  for (at = bytes.find(sought, at + 1); at != Bytes::npos; at = bytes.find(sought, at + 1)) {
+  const std::string_view text(reinterpret_cast<const char*>(bytes.data()), bytes.size());
+  const std::string_view mark(reinterpret_cast<const char*>(&kSegmentMark), sizeof kSegmentMark);
+  for (at = text.find(mark, at + 1); at != text.npos; at = text.find(mark, at + 1)) {
     if (IsSegmentHeader(bytes, at)) return true;
   }
   return false;

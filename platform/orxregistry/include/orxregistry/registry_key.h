@@ -90,9 +90,9 @@ class ORXREGISTRY_EXPORT TGenericRegistryKey {
 
  private:
   friend class TGenRegKeyIterator;
-  friend COrxStringT<wchar_t> GetRegValue<COrxStringT<wchar_t>>(const TGenericRegistryKey&,
-                                                                std::wstring_view,
-                                                                const COrxStringT<wchar_t>&, int);
+  template <class T>
+  friend T GetRegValue(const TGenericRegistryKey& key, std::wstring_view name, const T& fallback,
+                       int index);
 
   TGenericRegistryKeyImpPtr imp_;
 };

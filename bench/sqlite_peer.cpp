@@ -1,0 +1,127 @@
+#include "sqlite_peer.h"
+
+#include <cstring>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "orxutils/orx_string.h"
+
+namespace velta_bench {
+namespace {
+
+/// The doubles of an entry, in the columns behind the name: area, parameters, ellipsoids, grid.
+struct Row {
+  double area[4];
+  double parameters[13];
+  double ellipsoids[4];
+  double boundaries[6];
+  double means[3];
+  double residuals[48];
+};
+
+template <std::size_t count>
+void Bind(sqlite3_stmt* statement, int column, const double (&values)[count]) {
+  sqlite3_bind_blob(statement, column, values, sizeof values, SQLITE_TRANSIENT);
+}
+
+Row RowOf(const MessageSet& set) {
+  constexpr double kUnit = 9.69627362219072e-06;  // radians
+  Row row = {};
+  row.area[0] = (set.datum.phiV - set.datum.dPhiV * 0.5) * kUnit;
+  row.area[1] = set.datum.dPhiV * kUnit;
+  row.area[2] = (set.datum.lambdaV - set.datum.dLambdaV * 0.5) * kUnit;
+  row.area[3] = set.datum.dLambdaV * kUnit;
+  for (int i = 0; i < 16; ++i) {
+    row.residuals[i] = set.grid.residualPhi[i];
+    row.residuals[16 + i] = set.grid.residualLambda[i];
+    row.residuals[32 + i] = set.grid.residualH[i];
+  }
+  return row;
+}
+
+}  // namespace
+
+SqlitePeer::SqlitePeer(const std::filesystem::path& path) {
+  sqlite3* database = nullptr;
+  Require(sqlite3_open(path.string().c_str(), &database) == SQLITE_OK, "opening the peer's file");
+  database_.reset(database);
+  Run("PRAGMA journal_mode=WAL");
+  Run("PRAGMA synchronous=FULL");
+  Run("CREATE TABLE IF NOT EXISTS entry (name TEXT PRIMARY KEY, method INT, height INT, "
+      "source TEXT, area BLOB, parameters BLOB, ellipsoids BLOB, rows INT, columns INT, "
+      "boundaries BLOB, horShift INT, vertShift INT, horMethod INT, vertMethod INT, means BLOB, "
+      "residuals BLOB)");
+  insert_ = Prepare("INSERT OR IGNORE INTO entry VALUES (?,?,?,?,?,?,?,4,4,?,?,?,?,?,?,?)");
+}
+
+void SqlitePeer::Run(const char* sql) {
+  Require(sqlite3_exec(database_.get(), sql, nullptr, nullptr, nullptr) == SQLITE_OK, sql);
+}
+
+SqlitePeer::Statement SqlitePeer::Prepare(const char* sql) {
+  sqlite3_stmt* statement = nullptr;
+  Require(sqlite3_prepare_v2(database_.get(), sql, -1, &statement, nullptr) == SQLITE_OK, sql);
+  return Statement(statement);
+}
+
+void SqlitePeer::Ingest(const MessageSet& set) {
+  const Row row = RowOf(set);
+  sqlite3_stmt* const insert = insert_.get();
+  sqlite3_bind_text(insert, 1, orx::Narrow(set.EntryName()).c_str(), -1, SQLITE_TRANSIENT);
+  sqlite3_bind_int64(insert, 2, set.datum.computationIndicator);
+  sqlite3_bind_int64(insert, 3, set.datum.heightIndicator);
+  sqlite3_bind_text(insert, 4, set.datum.sourceName.c_str(), -1, SQLITE_TRANSIENT);
+  Bind(insert, 5, row.area);
+  Bind(insert, 6, row.parameters);
+  Bind(insert, 7, row.ellipsoids);
+  Bind(insert, 8, row.boundaries);
+  sqlite3_bind_int(insert, 9, set.grid.horShiftIndicator);
+  sqlite3_bind_int(insert, 10, set.grid.vertShiftIndicator);
+  sqlite3_bind_int64(insert, 11, set.grid.horInterpolationMethod);
+  sqlite3_bind_int64(insert, 12, set.grid.vertInterpolationMethod);
+  Bind(insert, 13, row.means);
+  Bind(insert, 14, row.residuals);
+  Require(sqlite3_step(insert) == SQLITE_DONE, "inserting a row");
+  sqlite3_reset(insert);
+}
+
+bool SqlitePeer::FindArea(const Position& position) {
+  const Statement walk = Prepare("SELECT area FROM entry ORDER BY rowid");
+  while (sqlite3_step(walk.get()) == SQLITE_ROW) {
+    double area[4];
+    std::memcpy(area, sqlite3_column_blob(walk.get(), 0), sizeof area);
+    const bool inside = position.latitude >= area[0] && position.latitude <= area[0] + area[1] &&
+                        position.longitude >= area[2] && position.longitude <= area[2] + area[3];
+    if (inside) return true;
+  }
+  return false;
+}
+
+std::size_t SqlitePeer::ReadAll() {
+  const Statement walk = Prepare("SELECT * FROM entry ORDER BY rowid");
+  std::vector<std::pair<std::string, Row>> rows;
+  while (sqlite3_step(walk.get()) == SQLITE_ROW) {
+    sqlite3_stmt* const at = walk.get();
+    Row row;
+    const auto take = [at](int column, auto& to) {
+      std::memcpy(to, sqlite3_column_blob(at, column), sizeof to);
+    };
+    take(4, row.area);
+    take(5, row.parameters);
+    take(6, row.ellipsoids);
+    take(9, row.boundaries);
+    take(14, row.means);
+    take(15, row.residuals);
+    rows.emplace_back(reinterpret_cast<const char*>(sqlite3_column_text(at, 0)), row);
+  }
+  return rows.size();
+}
+
+void SqlitePeer::Merge(const std::filesystem::path& source) {
+  Run(("ATTACH '" + source.string() + "' AS source").c_str());
+  Run("INSERT OR REPLACE INTO entry SELECT * FROM source.entry");
+  Run("DETACH source");
+}
+
+}  // namespace velta_bench

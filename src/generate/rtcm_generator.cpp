@@ -1,0 +1,67 @@
+#include "velta/rtcm_generator.h"
+
+#include "generate/stored_entries.h"
+#include "records/projection_types.h"
+#include "store/gff_layout.h"
+#include "store/residual_grid.h"
+
+namespace orx::cs::velta {
+namespace {
+
+bool ReadDatum(const TGenericRegistryKey& container, const TGenericRegistryKey& entry,
+               DatumData& datum) {
+  const TGenericRegistryKey standard = OpenExisting(entry, layout::kStandardDatum);
+  projmath::TRectRgn area;
+  if (!ReadValidityArea(standard, area)) return false;
+  if (!ReadTransformation(container, standard, datum)) return false;
+  const TGenericRegistryKey gridKey = OpenExisting(entry, layout::kDatumGrid.key);
+  StoredGrid grid;
+  if (!ReadGridArea(gridKey, layout::kDatumGrid, grid)) return false;
+  if (!ReadGridValues(gridKey, grid)) return false;
+  datum.validityArea[0] = area.south;
+  datum.validityArea[1] = area.northExtent;
+  datum.validityArea[2] = area.west;
+  datum.validityArea[3] = area.eastExtent;
+  datum.validityCentre[0] = area.south + area.northExtent * 0.5;
+  datum.validityCentre[1] = area.west + area.eastExtent * 0.5;
+  datum.grid = grid.table;
+  return true;
+}
+
+}  // namespace
+
+RTCMGenerator::RTCMGenerator(std::int32_t systemId, const COrxStringT<wchar_t>& datumFileName,
+                             const COrxStringT<wchar_t>& projFileName)
+    : systemId_(systemId), datumFile_(datumFileName), projFile_(projFileName) {}
+
+RTCMGenerator::RTCMGenerator(const RTCMGenerator& other) = default;
+
+RTCMGenerator& RTCMGenerator::operator=(const RTCMGenerator& other) = default;
+
+RTCMGenerator::~RTCMGenerator() = default;
+
+std::vector<DatumData, orx_dl_allocator<DatumData>> RTCMGenerator::getAllDatums() const {
+  std::vector<DatumData, orx_dl_allocator<DatumData>> datums;
+  const TGenericRegistryKey container = OpenContainer(datumFile_);
+  for (TGenRegKeyIterator walk(container); walk;) {
+    DatumData datum;
+    if (ReadDatum(container, TGenericRegistryKey(walk++), datum)) {
+      datums.push_back(std::move(datum));
+    }
+  }
+  return datums;
+}
+
+ProjectionData::projList RTCMGenerator::getRtcmPrjTypeFromString(const COrxStringT<wchar_t>& type) {
+  return FirstCodeOf(type);
+}
+
+COrxStringT<wchar_t> RTCMGenerator::datumFileName() const { return datumFile_; }
+
+COrxStringT<wchar_t> RTCMGenerator::projFileName() const { return projFile_; }
+
+void RTCMGenerator::setDatumFileName(const COrxStringT<wchar_t>& name) { datumFile_ = name; }
+
+void RTCMGenerator::setProjFileName(const COrxStringT<wchar_t>& name) { projFile_ = name; }
+
+}  // namespace orx::cs::velta

@@ -1,0 +1,65 @@
+#include "generate/stored_entries.h"
+
+#include <algorithm>
+
+#include "orxregistry/in_file_key.h"
+#include "orxutils/file_funcs.h"
+#include "records/message_units.h"
+#include "store/gff_layout.h"
+#include "store/shared_file.h"
+
+namespace orx::cs::velta {
+namespace {
+
+/// Parameters without and with the rotation point.
+constexpr std::size_t kHelmertParameters = 7;
+constexpr std::size_t kBadekasParameters = 10;
+
+bool ReadEllipsoid(const TGenericRegistryKey& standard, const DoublesOf<2>& value,
+                   projmath::Ellipsoid& ellipsoid) {
+  double axes[2];
+  if (!Read(standard, value, axes)) return false;
+  ellipsoid = projmath::Ellipsoid::FromAxes(axes[0], axes[1]);
+  return true;
+}
+
+bool ReadText(const TGenericRegistryKey& key, const layout::Text& value,
+              COrxStringT<wchar_t>& text) {
+  if (!HasKindAndDimension(key, value)) return false;
+  text = Read(key, value);
+  return true;
+}
+
+}  // namespace
+
+TGenericRegistryKey OpenContainer(const COrxStringT<wchar_t>& fileName) {
+  if (!FileFuncs::isFileExists(fileName)) return TGenericRegistryKey(nullptr);
+  return ContainerOf(TInFileKey(fileName, nullptr, nullptr, true, kTreeFlags));
+}
+
+bool ReadValidityArea(const TGenericRegistryKey& standard, projmath::TRectRgn& area) {
+  double edges[4];
+  if (!Read(standard, layout::kValidityArea, edges)) return false;
+  area = {edges[0], edges[1] == 0.0 ? kWholeLatitude : edges[1], edges[2],
+          edges[3] == 0.0 ? kWholeLongitude : edges[3]};
+  return true;
+}
+
+bool ReadTransformation(const TGenericRegistryKey& container, const TGenericRegistryKey& standard,
+                        DatumData& datum) {
+  if (!ReadEllipsoid(standard, layout::kEllipsoid, datum.targetEllipsoid)) return false;
+  if (!ReadEllipsoid(standard, layout::kSourceEllipsoid, datum.sourceEllipsoid)) return false;
+  double parameters[13];
+  if (!Read(standard, layout::kDatumParameters, parameters)) return false;
+  if (!Has(standard, layout::kMethod)) return false;
+  datum.computationIndicator = Read(standard, layout::kMethod).value;
+  const bool hasRotationPoint = datum.computationIndicator == kMolodenskiBadekas;
+  std::copy_n(parameters, hasRotationPoint ? kBadekasParameters : kHelmertParameters,
+              datum.parameters);
+  if (!HasKindAndDimension(standard, layout::kHeightIndicator)) return false;
+  datum.heightIndicator = static_cast<std::uint32_t>(Read(standard, layout::kHeightIndicator));
+  return ReadText(standard, layout::kSourceDatumName, datum.sourceDatumName) &&
+         ReadText(container, layout::kDatumFileName, datum.targetDatumName);
+}
+
+}  // namespace orx::cs::velta

@@ -1,0 +1,60 @@
+// From a message set to its datum and its projection.
+
+#include <iterator>
+
+#include "velta/rtcm_data_support.h"
+
+namespace orx::cs::velta {
+namespace {
+
+/// By bit of the utilized message indicator.
+constexpr bool UtilizedMsgInfo::*kFlags[] = {&UtilizedMsgInfo::use1023, &UtilizedMsgInfo::use1024,
+                                             &UtilizedMsgInfo::use1025, &UtilizedMsgInfo::use1026,
+                                             &UtilizedMsgInfo::use1027};
+
+}  // namespace
+
+UtilizedMsgInfo& RTCMDataSupport::GetUtilizedMessageInfo(RtcmBasicTransformMessage& message) {
+  msgUtilized_ = MsgUtilized();
+  UtilizedMsgInfo& info = msgUtilized_.info;
+  info.systemId = static_cast<std::int32_t>(message.systemId);
+  for (unsigned bit = 0; bit < std::size(kFlags); ++bit) {
+    info.*kFlags[bit] = (message.utilizedMsgIndicator >> bit & 1U) != 0;
+  }
+  return info;
+}
+
+ResultCode RTCMDataSupport::ParseRTCMMEssages(MsgUtilized& messages) {
+  msgUtilized_ = messages;
+  const UtilizedMsgInfo& info = messages.info;
+  if (!messages.msg1021 && !messages.msg1022) return kNoDatumMessage;
+  if (info.use1023 && !messages.msg1023) return kMissing1023;
+  const Rtcm1023* const datumGrid = info.use1023 ? messages.msg1023 : nullptr;
+  ResultCode result = kSuccess;
+  bool isNamed = false;
+  if (messages.msg1021) {
+    result = ParseDatumMessages(*messages.msg1021, datumGrid);
+    isNamed = !messages.msg1021->targetName.empty();
+  }
+  if (messages.msg1022) {
+    result = ParseDatumMessages(*messages.msg1022, datumGrid);
+    isNamed = !messages.msg1022->targetName.empty();
+  }
+  if (result != kSuccess) return result;
+  if (!isNamed) return kNoDatumName;
+
+  // A projection is named after the datum that has just been ingested.
+  const Rtcm1024* const planeGrid = info.use1024 ? messages.msg1024 : nullptr;
+  const bool lacksGrid = info.use1024 && !planeGrid;
+  if (info.use1025) {
+    if (lacksGrid || !messages.msg1025) return kMissingProjectionPart;
+    result = ParseProjectionMessages(*messages.msg1025, planeGrid);
+  }
+  if (info.use1027) {
+    if (lacksGrid || !messages.msg1027) return kMissingProjectionPart;
+    result = ParseProjectionMessages(*messages.msg1027, planeGrid);
+  }
+  return result;
+}
+
+}  // namespace orx::cs::velta

@@ -1,0 +1,57 @@
+// From a datum message to an entry of its datum's file.
+
+#include "ingest/datum_conversion.h"
+#include "ingest/grid_conversion.h"
+#include "ingest/record_file.h"
+#include "records/message_units.h"
+#include "velta/rtcm_data_support.h"
+
+namespace orx::cs::velta {
+namespace {
+
+constexpr std::uint32_t kGridAnnounced = 1;  // bit 0 of the utilized message indicator
+
+}  // namespace
+
+ResultCode RTCMDataSupport::ParseDatumMessages(const Rtcm1021& message, const Rtcm1023* grid) {
+  return ParseDatum(message, nullptr, grid);
+}
+
+ResultCode RTCMDataSupport::ParseDatumMessages(const Rtcm1022& message, const Rtcm1023* grid) {
+  if (message.computationIndicator != kMolodenskiBadekas) return kBadComputationIndicator;
+  return ParseDatum(message, &message, grid);
+}
+
+ResultCode RTCMDataSupport::ParseDatum(const RtcmBasicTransformMessage& message,
+                                       const Rtcm1022* rotationPoint, const Rtcm1023* grid) {
+  datumEntryName_.clear();
+  if (grid) {
+    ConvertEllipsoidalGrid(*grid, datum_.grid);
+  } else if (message.utilizedMsgIndicator & kGridAnnounced) {
+    return kMissing1023;
+  }
+  datum_.targetDatumName = CleanDatumName(message.targetName);
+  datum_.sourceDatumName = NormaliseSourceName(message.sourceName);
+  SetRegionNameByPlateNumber(message.plateNumber);
+  ConvertEllipsoids(message, datum_);
+  datum_.computationIndicator = message.computationIndicator;
+  ConvertParameters(message, datum_);
+  if (rotationPoint) ConvertRotationPoint(*rotationPoint, datum_);
+  if (datum_.computationIndicator > kMolodenskiBadekas) return kBadComputationIndicator;
+  ConvertValidityArea(message, datum_);
+  datum_.heightIndicator = message.heightIndicator;
+  datumEntryName_ = DatumEntryName(message, grid);
+
+  // Nothing may fail between obtaining the file and giving it back.
+  const COrxStringT<wchar_t> path = GetDatumPath() + datum_.targetDatumName + kDatumFiles.extension;
+  const ResultCode result = InitDatumGFF(datum_);
+  if (result != kSuccess) return result;
+  return AddAndGiveBack(kDatumFiles, path, [this] { return AddDatumToGFF(datum_); });
+}
+
+COrxStringT<wchar_t> RTCMDataSupport::SetRegionNameByPlateNumber(std::uint32_t plateNumber) {
+  regionName_ = RegionOfPlate(plateNumber);
+  return regionName_;
+}
+
+}  // namespace orx::cs::velta

@@ -1,0 +1,54 @@
+// From a projection message to an entry of its datum's projection file.
+
+#include "ingest/grid_conversion.h"
+#include "ingest/projection_conversion.h"
+#include "ingest/record_file.h"
+#include "velta/rtcm_data_support.h"
+
+namespace orx::cs::velta {
+
+ResultCode RTCMDataSupport::ParseProjectionMessages(const Rtcm1025& message, const Rtcm1024* grid) {
+  return ParseProjection(message, message.projectionType, grid);
+}
+
+ResultCode RTCMDataSupport::ParseProjectionMessages(const Rtcm1026& /*message*/,
+                                                    const Rtcm1024* /*grid*/) {
+  return kUnsupportedProjection;
+}
+
+ResultCode RTCMDataSupport::ParseProjectionMessages(const Rtcm1027& message, const Rtcm1024* grid) {
+  std::uint32_t typeCode = message.projectionType;
+  if (typeCode == ProjectionData::OM && message.rectificationFlag) typeCode = ProjectionData::ROM;
+  return ParseProjection(message, typeCode, grid);
+}
+
+template <class Message>
+ResultCode RTCMDataSupport::ParseProjection(const Message& message, std::uint32_t typeCode,
+                                            const Rtcm1024* grid) {
+  projection_.datumName = datum_.targetDatumName;
+  if (projection_.datumName.empty()) return kNoDatumName;
+  projection_.has1024 = grid != nullptr;
+  // An entry without a grid must not carry the one of another projection.
+  projection_.table = TableData();
+  if (grid) ConvertPlaneGrid(projection_.table, *grid);
+  projection_.regionName = regionName_;
+  projection_.systemId = message.systemId;
+  projection_.rtcmProjName = projection_.datumName;
+  projection_.geoProj = CreateProjection(projection_, static_cast<int>(typeCode),
+                                         datum_.targetEllipsoid.a, datum_.targetEllipsoid.second);
+  if (!projection_.geoProj) return kUnsupportedProjection;
+  int index = 0;
+  for (const double parameter : ParametersOf(message)) {
+    projection_.geoProj->SetParam(parameter, index++, projmath::kDegreesMetresRatios);
+  }
+  projectionEntryName_ = ProjectionEntryName(message, grid);
+
+  // Nothing may fail between obtaining the file and giving it back.
+  const COrxStringT<wchar_t> path =
+      GetProjectionPath() + projection_.rtcmProjName + kProjectionFiles.extension;
+  const ResultCode result = InitProjectionGFF(projection_);
+  if (result != kSuccess) return result;
+  return AddAndGiveBack(kProjectionFiles, path, [this] { return AddProjectionToGFF(projection_); });
+}
+
+}  // namespace orx::cs::velta

@@ -1,0 +1,50 @@
+#include "ingest/record_file.h"
+
+#include "orxutils/file_funcs.h"
+
+namespace orx::cs::velta {
+
+ResultCode EnsureFile(const COrxStringT<wchar_t>& directory, const COrxStringT<wchar_t>& path,
+                      const CreateFile& create) {
+  if (!FileFuncs::isDirExists(directory) && !FileFuncs::createDirectoryTree(directory)) {
+    return kNoDirectory;
+  }
+  return FileFuncs::isFileExists(path) ? kSuccess : create(path);
+}
+
+ResultCode CreateFileWithEntry(const FileKind& kind, const COrxStringT<wchar_t>& path,
+                               const COrxStringT<wchar_t>& containerName,
+                               const FillKey& fillContainer, const COrxStringT<wchar_t>& entryName,
+                               const FillKey& fillEntry) {
+  TCSInFileKey tree(L"", kTreeDescription, nullptr, false, kTreeFlags);
+  if (tree.GetErrorState() != kRegistryOk) return kind.trouble;
+  const TGenericRegistryKey root{TGenericRegistryKeyPtr(tree)};
+  TGenericRegistryKey container(root, containerName, 0, true);
+  fillContainer(container);
+  TGenericRegistryKey entry(container, entryName, 0, true);
+  const ResultCode result = fillEntry(entry);
+  if (result == kSuccess) tree.Save(path, false, kRegistryVersion);
+  return result;
+}
+
+ResultCode OpenShared(const FileKind& kind, const COrxStringT<wchar_t>& path) {
+  kind.current = nullptr;
+  ResultCode result = Obtain(kind, path, &kind.current);
+  if (result == kSuccess && kind.current->GetErrorState() != kRegistryOk) result = kind.trouble;
+  if (result != kSuccess) GiveBack(kind, path);
+  return result;
+}
+
+ResultCode AddEntry(const FileKind& kind, const COrxStringT<wchar_t>& name, const FillKey& fill) {
+  TCSInFileKey& file = *kind.current;
+  if (file.GetErrorState() != kRegistryOk) return kind.trouble;
+  const TGenericRegistryKey container = ContainerOf(file);
+  if (container.IsNull()) return kind.trouble;
+  if (container.HasKey(name)) return kSuccess;
+  TGenericRegistryKey entry(container, name, container.GetKeyDim(), true);
+  const ResultCode result = fill(entry);
+  if (result != kSuccess) return result;
+  return file.Save(false, kRegistryVersion) ? kSuccess : kEntryNotWritten;
+}
+
+}  // namespace orx::cs::velta

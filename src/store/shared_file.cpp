@@ -1,0 +1,49 @@
+#include "store/shared_file.h"
+
+namespace orx::cs::velta {
+namespace {
+
+using ObtainFunction = ResultCode(const wchar_t* path, TCSInFileKey** file);
+using GiveBackFunction = void(const wchar_t* path);
+
+}  // namespace
+
+ResultCode LoadSibling(const FileKind& kind) {
+  if (!kind.loader) kind.loader = TDLLFuncLoader::LoadDLL(kSiblingLibrary);
+  return kind.loader ? kind.loader->GetStatus() : kNoSiblingLibrary;
+}
+
+void UnloadSibling(const FileKind& kind) {
+  if (!kind.loader) return;
+  kind.loader->ReleaseDLL();
+  kind.loader.reset();
+}
+
+ResultCode Obtain(const FileKind& kind, const COrxStringT<wchar_t>& path, TCSInFileKey** file) {
+  if (!kind.loader) {
+    const ResultCode status = LoadSibling(kind);
+    if (status != kSuccess) {
+      UnloadSibling(kind);
+      return status;
+    }
+  }
+  auto* const obtain = kind.loader->GetFunc<ObtainFunction>(kind.obtainFunction);
+  return obtain ? obtain(path.c_str(), file) : kNoSiblingLibrary;
+}
+
+void GiveBack(const FileKind& kind, const COrxStringT<wchar_t>& path) {
+  if (!kind.loader) return;
+  auto* const giveBack = kind.loader->GetFunc<GiveBackFunction>(kind.giveBackFunction);
+  if (giveBack) giveBack(path.c_str());
+}
+
+TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key) {
+  TGenRegKeyIterator walk(key);
+  return TGenericRegistryKey(walk++);
+}
+
+TGenericRegistryKey ContainerOf(const TInKey& tree) {
+  return FirstSubKey(TGenericRegistryKey(TGenericRegistryKeyPtr(tree)));
+}
+
+}  // namespace orx::cs::velta

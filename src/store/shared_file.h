@@ -1,0 +1,67 @@
+#pragma once
+
+#include "orxregistry/in_file_key.h"
+#include "orxutils/orx_string.h"
+#include "velta/rtcm_data_support.h"
+
+/// The shared files, which the sibling library owns. What is true of datum files is true of
+/// projection files; the differences are in one table.
+namespace orx::cs::velta {
+
+inline constexpr const wchar_t* kSiblingLibrary = L"RTCMGridHost.dll";
+
+/// What registry trees are made and opened with.
+inline constexpr const wchar_t* kTreeDescription = L"Sylbri RTCM System";
+inline constexpr unsigned kTreeFlags = 97;
+
+struct FileKind {
+  const wchar_t* extension;
+  TDLLFuncWrapper& loader;     ///< of the sibling library
+  TCSInFileKey*& current;      ///< the file worked on
+  const char* obtainFunction;  ///< entry points of the sibling library
+  const char* giveBackFunction;
+  ResultCode trouble;  ///< what is answered for a file that cannot be used
+};
+
+inline constexpr FileKind kDatumFiles{
+    L".dff",          RTCMDataSupport::DLLdatum, RTCMDataSupport::GFFDatumFile,
+    "GetPtrDatumGFF", "ResetRTCMDatumFile",      kDatumFileTrouble};
+inline constexpr FileKind kProjectionFiles{L".prj",
+                                           RTCMDataSupport::DLLprojection,
+                                           RTCMDataSupport::GFFProjectionFile,
+                                           "GetPtrProjectionGFF",
+                                           "ResetRTCMGridFile",
+                                           kProjectionFileTrouble};
+
+/// Loads the sibling library unless that has been done.
+/// \return 0, kNoSiblingLibrary, or the loader's status
+ResultCode LoadSibling(const FileKind& kind);
+void UnloadSibling(const FileKind& kind);
+
+/// \param file receives the shared tree, without its lock
+/// \return 0, kNoSiblingLibrary, the loader's status, or the sibling library's code
+ResultCode Obtain(const FileKind& kind, const COrxStringT<wchar_t>& path, TCSInFileKey** file);
+void GiveBack(const FileKind& kind, const COrxStringT<wchar_t>& path);
+
+/// Gives a file back when it goes.
+class GiveBackLater {
+ public:
+  /// The path must outlive the object.
+  GiveBackLater(const FileKind& kind, const COrxStringT<wchar_t>& path)
+      : kind_(kind), path_(path) {}
+  GiveBackLater(const GiveBackLater&) = delete;
+  GiveBackLater& operator=(const GiveBackLater&) = delete;
+  ~GiveBackLater() { GiveBack(kind_, path_); }
+
+ private:
+  const FileKind& kind_;
+  const COrxStringT<wchar_t>& path_;
+};
+
+/// The first sub-key, null when there is none.
+TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key);
+
+/// The container key of a tree: the first under its root; null when there is none.
+TGenericRegistryKey ContainerOf(const TInKey& tree);
+
+}  // namespace orx::cs::velta

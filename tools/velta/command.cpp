@@ -1,0 +1,26 @@
+#include "command.h"
+
+#include <cstdint>
+#include <cstdio>
+#include <iostream>
+
+namespace velta_tool {
+
+void ReportFailure(std::string_view what) { std::cerr << "velta: " << what << '\n'; }
+
+void ReportNote(std::string_view what) { std::cerr << "velta: note: " << what << '\n'; }
+
+std::string CodeText(orx::cs::velta::ResultCode code) {
+  char text[sizeof "0x00000000"];
+  std::snprintf(text, sizeof text, "0x%08x", static_cast<unsigned>(code));
+  return text;
+}
+
+std::string Describe(orx::cs::velta::ResultCode code) {
+  for (const auto& [known, meaning] : orx::cs::velta::kResultMeanings) {
+    if (known == code) return CodeText(code) + " " + meaning;
+  }
+  return CodeText(code) + " a code of RTCMGridHost's own";
+}
+
+}  // namespace velta_tool

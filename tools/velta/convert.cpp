@@ -1,0 +1,109 @@
+#include <CLI/App.hpp>
+#include <CLI/Config.hpp>
+#include <CLI/Formatter.hpp>
+#include <istream>
+#include <memory>
+#include <string>
+
+#include "command.h"
+#include "files.h"
+#include "rtcm3/codec.h"
+#include "rtcm3/fields.h"
+#include "rtcm3/json_lines.h"
+#include "rtcm3/message_reader.h"
+#include "terminal.h"
+
+namespace velta_tool {
+namespace {
+
+struct Conversion {
+  std::string from;
+  std::string to = "-";
+};
+
+int DecodeStream(const Conversion& files) {
+  Input in(files.from);
+  Output out(files.to);
+  Progress progress;
+  rtcm3::StreamCounts counts;
+  rtcm3::MessageReader messages(in.buffer(), counts, [&] {
+    out.Flush();
+    progress.Show(counts.frames.bytes);
+  });
+  while (const rtcm3::Message* message = messages.Next()) {
+    rtcm3::AppendJsonLine(*message, out.pending());
+    out.FlushMuch();
+  }
+  out.Flush();
+  if (counts.PassedOver()) ReportNote(files.from + ": " + Summary(counts));
+  if (counts.shortMessages > 0) {
+    ReportFailure(files.from + ": " + std::to_string(counts.shortMessages) +
+                  " messages end before their last field");
+    return kFailed;
+  }
+  if (counts.frames.frames == 0) {
+    ReportFailure(files.from + ": no RTCM 3 frame in it");
+    return kFailed;
+  }
+  return kDone;
+}
+
+int EncodeLines(const Conversion& files) {
+  Input in(files.from);
+  Output out(files.to);
+  std::istream lines(&in.buffer());
+  lines.exceptions(std::ios::badbit);
+  int status = kDone;
+  std::string line;
+  for (std::size_t number = 1; std::getline(lines, line); ++number) {
+    if (line.find_first_not_of(" \t\r") == std::string::npos) continue;
+    try {
+      rtcm3::Encode(rtcm3::ParseJsonLine(line), out.pending());
+    } catch (const rtcm3::FieldError& error) {
+      ReportFailure(files.from + ":" + std::to_string(number) + ": " + error.what());
+      status = kFailed;
+    }
+    const bool mayWait = in.buffer().in_avail() <= 0;
+    mayWait ? out.Flush() : out.FlushMuch();
+  }
+  out.Flush();
+  return status;
+}
+
+CLI::App* AddConversion(CLI::App& program, Action& action, const std::string& name,
+                        const std::string& help, int (*work)(const Conversion&)) {
+  const auto files = std::make_shared<Conversion>();
+  CLI::App* command = program.add_subcommand(name, help);
+  command->add_option("FILE", files->from, "the input, \"-\" for standard input")->required();
+  command->add_option("-o,--output", files->to, "the output")->capture_default_str();
+  command->callback([&action, files, work] { action = [files, work] { return work(*files); }; });
+  return command;
+}
+
+}  // namespace
+
+void AddDecode(CLI::App& program, Action& action) {
+  AddConversion(program, action, "decode",
+                "Shows the messages 1021 to 1027 of an RTCM 3 stream as JSON, one object a line.",
+                DecodeStream)
+      ->footer(
+          "Numbers are the integers of the messages. What is no such message is passed over and\n"
+          "counted.\n"
+          "\n"
+          "Example:\n"
+          "  velta decode examples/streams/dhdn.rtcm3");
+}
+
+void AddEncode(CLI::App& program, Action& action) {
+  AddConversion(program, action, "encode",
+                "Turns JSON lines, as \"velta decode\" writes them, into RTCM 3 frames.",
+                EncodeLines)
+      ->footer(
+          "Every field must be there, and nothing else. A line that cannot be encoded is reported\n"
+          "and left out.\n"
+          "\n"
+          "Example: there and back again\n"
+          "  velta encode examples/streams/dhdn.jsonl | velta decode -");
+}
+
+}  // namespace velta_tool

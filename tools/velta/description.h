@@ -1,0 +1,50 @@
+#pragma once
+
+#include <nlohmann/json.hpp>
+#include <span>
+#include <string>
+#include <vector>
+
+#include "velta/datum_data.h"
+#include "velta/rtcm_messages.h"
+
+namespace velta_tool {
+
+inline constexpr double kPi = 3.141592653589793;
+inline constexpr double kDegreesPerRadian = 180 / kPi;
+
+/// One thing to say about an entry.
+struct Property {
+  const char* label;             ///< for people
+  const char* key;               ///< for JSON
+  nlohmann::ordered_json value;  ///< number, text, or an array or an object of them
+  const char* unit = "";
+};
+using Description = std::vector<Property>;
+
+/// Edges of an area in degrees, the whole range of latitude or longitude from -90 or -180.
+struct Edges {
+  double south;
+  double north;
+  double west;
+  double east;
+
+  /// \param area south edge, extent in latitude, west edge, extent in longitude, radians
+  explicit Edges(std::span<const double> area);
+};
+
+/// A datum entry: angles in degrees, rotations and residuals of angles in arc-seconds, the scale
+/// correction in ppm, lengths in metres.
+Description Describe(const orx::cs::velta::DatumData& datum);
+
+/// A projection: angles in degrees, lengths in metres, the scale as a factor.
+Description Describe(const orx::cs::velta::Rtcm1025& projection);
+Description Describe(const orx::cs::velta::Rtcm1027& projection);
+
+/// A description as lines of text.
+std::string ToText(const Description& description);
+
+/// A description as a JSON object.
+nlohmann::ordered_json ToJson(const Description& description);
+
+}  // namespace velta_tool

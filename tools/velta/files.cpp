@@ -1,0 +1,100 @@
+#include "files.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <iostream>
+#include <stdexcept>
+#include <system_error>
+
+#include "orxutils/file_funcs.h"
+#include "orxutils/orx_string.h"
+#include "text.h"
+
+namespace velta_tool {
+namespace fs = std::filesystem;
+namespace {
+
+constexpr std::size_t kInputBuffer = std::size_t{64} * 1024;
+constexpr std::size_t kMuchOutput = std::size_t{64} * 1024;
+constexpr std::string_view kStandardStream = "-";
+
+std::runtime_error FileError(const std::string& name, const std::string& what) {
+  return std::runtime_error(name + ": " + what + ": " + std::generic_category().message(errno));
+}
+
+CLI::Validator KindCheck(const std::string& extensions, bool (*accepts)(FileKind)) {
+  return CLI::Validator(
+      [extensions, accepts](std::string& name) {
+        return accepts(KindOf(name)) ? std::string() : name + " is no " + extensions + " file";
+      },
+      "FILE" + extensions);
+}
+
+}  // namespace
+
+std::wstring ToWide(const std::string& argument) {
+  std::optional<std::wstring> wide = FromUtf8(argument);
+  if (!wide) throw std::runtime_error(argument + ": the name is not UTF-8");
+  return *std::move(wide);
+}
+
+fs::path ToPath(const std::string& name) { return std::u8string(name.begin(), name.end()); }
+
+std::string ToName(const fs::path& path) {
+  const std::u8string name = path.u8string();
+  return {name.begin(), name.end()};
+}
+
+FileKind KindOf(const std::string& file) {
+  constexpr std::size_t kExtension = 4;
+  const std::size_t length = std::min(file.size(), kExtension);
+  const std::wstring extension = orx::Widen(file.substr(file.size() - length));
+  if (orx::EqualsIgnoringCase(extension, L".dff")) return FileKind::kDatum;
+  if (orx::EqualsIgnoringCase(extension, L".prj")) return FileKind::kProjection;
+  return FileKind::kOther;
+}
+
+void RequireFile(const std::string& file) {
+  if (!orx::FileFuncs::isFileExists(ToWide(file))) {
+    throw std::runtime_error(file + ": there is no such file");
+  }
+}
+
+const CLI::Validator kDatumFile =
+    KindCheck(".dff", [](FileKind kind) { return kind == FileKind::kDatum; });
+const CLI::Validator kProjectionFile =
+    KindCheck(".prj", [](FileKind kind) { return kind == FileKind::kProjection; });
+const CLI::Validator kDatumOrProjectionFile =
+    KindCheck(".dff or .prj", [](FileKind kind) { return kind != FileKind::kOther; });
+
+Input::Input(const std::string& name) : memory_(kInputBuffer), buffer_(std::cin.rdbuf()) {
+  if (name == kStandardStream) return;
+  const fs::path path = ToPath(name);
+  if (fs::is_directory(path)) throw std::runtime_error(name + ": is a directory");
+  file_.pubsetbuf(memory_.data(), static_cast<std::streamsize>(memory_.size()));
+  if (!file_.open(path, std::ios::in | std::ios::binary)) throw FileError(name, "cannot be read");
+  buffer_ = &file_;
+}
+
+Output::Output(const std::string& name) : name_(name), buffer_(std::cout.rdbuf()) {
+  if (name == kStandardStream) return;
+  if (!file_.open(ToPath(name), std::ios::out | std::ios::binary | std::ios::trunc)) {
+    throw FileError(name, "cannot be written");
+  }
+  buffer_ = &file_;
+}
+
+void Output::FlushMuch() {
+  if (pending_.size() >= kMuchOutput) Flush();
+}
+
+void Output::Flush() {
+  const auto size = static_cast<std::streamsize>(pending_.size());
+  const bool written = buffer_->sputn(pending_.data(), size) == size && buffer_->pubsync() == 0;
+  pending_.clear();
+  if (!written) {
+    throw FileError(name_ == kStandardStream ? "standard output" : name_, "cannot be written");
+  }
+}
+
+}  // namespace velta_tool

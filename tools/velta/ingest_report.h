@@ -1,0 +1,49 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "files.h"
+#include "rtcm3/message_reader.h"
+#include "velta/result_codes.h"
+
+namespace velta_tool {
+
+/// One of the two files that a set goes into.
+struct IngestedPart {
+  std::vector<unsigned> messages;  ///< what goes there
+  std::string file;                ///< name without its directory
+  bool added;                      ///< the file has got an entry
+};
+
+struct IngestedSet {
+  std::uint32_t systemId;
+  orx::cs::velta::ResultCode result;
+  std::vector<IngestedPart> parts;
+  std::vector<unsigned> leftOut;  ///< received, but not announced by the datum message
+};
+
+struct IngestTotals {
+  std::size_t ingested = 0;
+  std::size_t failed = 0;
+  std::size_t incomplete = 0;
+  rtcm3::StreamCounts stream;
+};
+
+/// Tells on standard output what became of each set, as text or as JSON lines.
+class IngestReport {
+ public:
+  IngestReport(bool json, Output& out) : json_(json), out_(out) {}
+
+  void Add(const IngestedSet& set);
+  void AddIncomplete(std::uint32_t systemId, const std::vector<std::string>& missing);
+  void Close(const IngestTotals& totals);
+
+ private:
+  bool json_;
+  Output& out_;
+};
+
+}  // namespace velta_tool

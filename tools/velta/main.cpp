@@ -1,0 +1,55 @@
+#include <CLI/CLI.hpp>
+#include <cstdio>
+#include <exception>
+#include <iostream>
+
+#include "command.h"
+#include "orxutils/file_funcs.h"
+
+namespace {
+
+constexpr char kHelp[] =
+    "Turns RTCM 3 coordinate-transformation messages (1021 to 1027) into datum files (.dff) and\n"
+    "projection files (.prj), and these files back into messages.";
+
+constexpr char kFooter[] =
+    "\"velta COMMAND --help\" tells more about a command. As a FILE of messages or of JSON,\n"
+    "\"-\" is standard input; as an output it is standard output.\n"
+    "Exit status: 0 everything was done, 1 something of it failed, 2 a wrong call.\n"
+    "\n"
+    "Example: what is in a stream\n"
+    "  velta decode examples/streams/dhdn.rtcm3";
+
+using namespace velta_tool;
+
+int Run(int argc, char** argv) {
+  CLI::App program(kHelp, "velta");
+  program.allow_windows_style_options(false);  // "/" begins a file name
+  program.footer(kFooter);
+  program.set_version_flag("--version", "velta " VELTA_VERSION);
+  program.require_subcommand(1);
+  Action action;
+  for (const auto add :
+       {AddIngest, AddList, AddGenerate, AddMerge, AddDecode, AddEncode, AddDump}) {
+    add(program, action);
+  }
+  try {
+    program.parse(argc, argv);
+  } catch (const CLI::ParseError& error) {
+    return program.exit(error) == 0 ? kDone : kWrongCall;
+  }
+  return action();
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  try {
+    std::ios::sync_with_stdio(false);
+    for (std::FILE* stream : {stdin, stdout, stderr}) orx::FileFuncs::setBinaryMode(stream);
+    return Run(argc, argv);
+  } catch (const std::exception& error) {
+    std::fprintf(stderr, "velta: %s\n", error.what());
+    return kFailed;
+  }
+}

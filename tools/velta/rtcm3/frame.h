@@ -1,0 +1,59 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <functional>
+#include <optional>
+#include <span>
+#include <streambuf>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace velta_tool::rtcm3 {
+
+/// The most bytes that a frame can carry.
+inline constexpr std::size_t kMaxPayload = 1023;
+
+/// Appends a frame around a payload of at most kMaxPayload bytes.
+void AppendFrame(std::string_view payload, std::string& out);
+
+/// What a stream held so far.
+struct FrameCounts {
+  std::uint64_t bytes = 0;         ///< read
+  std::uint64_t frames = 0;        ///< whole, with the right checksum
+  std::uint64_t skippedBytes = 0;  ///< outside those frames
+  std::uint64_t badCrcs = 0;       ///< places that looked like a frame but for the checksum
+};
+
+/// Finds the frames in a stream of bytes. After a place that fails, the search goes on one byte
+/// behind its first.
+class FrameReader {
+ public:
+  using Payload = std::span<const std::uint8_t>;
+
+  /// \param in stays the caller's and must outlive the reader; takes what has arrived without
+  ///     waiting for more, so that a live stream is followed frame by frame
+  /// \param counts the caller's too; counted on from what they hold
+  /// \param beforeRead called each time before the stream is asked, which may have to wait
+  FrameReader(std::streambuf& in, FrameCounts& counts, std::function<void()> beforeRead = {});
+
+  /// \return the next frame's payload, valid until the next call; nothing at the end
+  std::optional<Payload> Next();
+
+ private:
+  bool SkipToPreamble();
+  void Skip(std::size_t bytes);
+  std::size_t FrameSize();
+  bool Require(std::size_t bytes);
+  bool Fill();
+
+  std::streambuf& in_;
+  FrameCounts& counts_;
+  std::function<void()> beforeRead_;
+  std::vector<std::uint8_t> buffer_;
+  std::size_t begin_ = 0;
+  std::size_t end_ = 0;
+};
+
+}  // namespace velta_tool::rtcm3

@@ -1,0 +1,28 @@
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+
+namespace velta_tool {
+
+/// Shows on standard error, when that is a terminal, how much of a long input has been read.
+class Progress {
+ public:
+  Progress();
+  /// Takes away what was shown.
+  ~Progress();
+  Progress(const Progress&) = delete;
+  Progress& operator=(const Progress&) = delete;
+
+  /// \param bytes read so far
+  void Show(std::uint64_t bytes);
+
+ private:
+  using Clock = std::chrono::steady_clock;
+
+  Clock::time_point next_;
+  bool terminal_;
+  bool shown_ = false;
+};
+
+}  // namespace velta_tool
