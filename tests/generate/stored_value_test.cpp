@@ -145,16 +145,20 @@ TEST_F(StoredValueTest, FirstEntryWinsAndAMalformedOneInFrontEndsTheSearchesButN
   EXPECT_EQ(Generator().getAllDatums().at(1).targetDatumName, L"AUTO_DHDN_BESEL");
   std::swap(projection_.Entry(0), projection_.Entry(1));
   EXPECT_EQ(Found(), kNoProjection);
+  Standard().Remove(L"Ellipsoid"), Grid().Remove(L"dHData");
+  EXPECT_EQ(Found(), "L4");
+  EXPECT_EQ(Generator().getAllDatums().size(), 1U);
 
   Standard().Set<double>(L"BoundariesStandardDatum", {-1.0, 0.1, -1.0, 0.1});
   Grid().Set<double>(L"BoundariesTargetDatum", {-1.0, 0.1, -1.0, 0.1, 0, 0});
-  Standard().Remove(L"Ellipsoid"), Grid().Remove(L"dHData");  // not looked at, being far away
-  EXPECT_EQ(Found(), kNoProjection);
-  EXPECT_EQ(Generator().getAllDatums().size(), 1U);
+  EXPECT_EQ(Found(), kNoProjection);  // far away, no more of it is looked at
   Standard().Remove(L"BoundariesStandardDatum"), Grid().Remove(L"NRowsT");
   EXPECT_EQ(Found(), "L4");
   std::swap(datum_.Entry(0), datum_.Entry(1));
   EXPECT_EQ(Found(), kNoProjection);
+  // Text of the size of the boundaries that ends before them.
+  Grid().Value(L"BoundariesTargetDatum") = {L"BoundariesTargetDatum", 5, 0, 1, std::string(48, 0)};
+  EXPECT_EQ(Found(), "D4");
 }
 
 TEST_F(StoredValueTest, GridsOfAnyShapeAreSafe) {
@@ -209,7 +213,7 @@ TEST_F(StoredValueTest, PositionsAreFoundOnEdgesPolesAndAcrossTheDateLine) {
   }
   Table().Set<double>(L"BoundariesTableProj", {10, 5, 400, 1, 0, 0});
   EXPECT_TRUE(Written().get1024(15, 401, 0));
-  EXPECT_FALSE(Generator().get1024(15, 401 - 2 * kPi, 0));
+  EXPECT_FALSE(Generator().get1024(15, 400.5 - 2 * kPi, 0));
 }
 
 TEST_F(StoredValueTest, DatumNumbersAreTruncated) {
@@ -277,7 +281,7 @@ TEST_F(StoredValueTest, ProjectionMessageFollowsTheTypeString) {
       {L"CASSINI", tm, "25 77: 6 90872727 818181818 0 0 500000000"},
       {L"MERCATOR", tm, "25 77: 9 90872727 818181818 0 0 500000000"},
       {L"OM", om,
-       "27 77: 7 -2454545454 -8272727272 4000000000 660000000 10000000000000000000 500 0"},
+       "27 77: 7 -2454545454 -8272727272 4000000000 660000000 10000000000000000000 500 0 0"},
       {L"ROM", om,
        "27 77: 7 -2454545454 -8272727272 4000000000 660000000 10000000000000000000 500 1 "
        "-90909090"},

@@ -53,9 +53,12 @@ TEST_P(MergeTest, SourcesEntriesAreLaidOverTheTargets) {
 TEST_P(MergeTest, FileThatCannotBeUsedFailsAndLeavesTheTargetAloneAndGivenBack) {
   Make("target", 1, {L"B"});
   Make("source", 2, {L"A"});
-  std::string damaged = ReadBytes(Path("source"));
-  damaged[damaged.size() / 2] ^= 1;
-  WriteBytes(Path("damaged"), damaged + damaged);
+  Make("damaged", 3, {L"C"});
+  const std::size_t size = ReadBytes(Path("damaged")).size();
+  EXPECT_EQ(Merge("damaged", "source") + Merge("damaged", "target"), kSuccess);
+  std::string damaged = ReadBytes(Path("damaged"));
+  damaged[size + 80] ^= 1;  // in what the first merge added
+  WriteBytes(Path("damaged"), damaged);
   WriteBytes(Path("garbage"), "no registry file");
   WriteGff(Path("rootless"), GffKey());
   const std::string before = ReadBytes(Path("target"));

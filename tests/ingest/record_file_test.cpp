@@ -83,6 +83,18 @@ class RecordFileTest : public RtcmTest, public testing::WithParamInterface<bool>
     (isDatum_ ? set.datum.phiV : set.planeGrid.north0) += number;
     return Ingest(set, isDatum_ ? kGrid : kAllParts);
   }
+  /// Ingests three entries and damages what the second added.
+  std::string Damage() {
+    std::size_t sizes[3] = {};
+    for (const int number : {0, 1, 2}) {
+      EXPECT_EQ(IngestEntry(number), kSuccess);
+      sizes[number] = ReadBytes(path_).size();
+    }
+    std::string bytes = ReadBytes(path_);
+    bytes[(sizes[0] + sizes[1]) / 2] ^= 1;
+    WriteBytes(path_, bytes);
+    return bytes;
+  }
   /// How many entries the file holds, when nobody holds its lock.
   std::size_t Entries() {
     std::thread([this] {
@@ -133,9 +145,11 @@ TEST_P(RecordFileTest, DirectoryOrFileThatCannotBeUsedIsReported) {
   std::filesystem::create_directories(path_);
   EXPECT_EQ(IngestEntry(), kNoSuchFile);
   std::filesystem::remove(path_);
+  const std::string bytes = Damage();
+  EXPECT_EQ(IngestEntry(3), kind_.trouble);
+  EXPECT_EQ(ReadBytes(path_), bytes);
   WriteBytes(path_, "no registry file");
   EXPECT_EQ(IngestEntry(), kind_.trouble);
-  EXPECT_EQ(ReadBytes(path_), "no registry file");
 }
 
 #ifndef _WIN32
@@ -169,7 +183,9 @@ TEST_P(RecordFileTest, OnlyTheCurrentDescriptionIsAdded) {
     return isDatum_ ? support_.AddDatumToGFF(datum) : support_.AddProjectionToGFF(projection);
   };
   EXPECT_EQ(add(), kSuccess);
-  orx::TCSInFileKey bad(directory_.path().wstring(), nullptr, nullptr, true, 97);
+  std::filesystem::remove(path_);
+  Damage();
+  orx::TCSInFileKey bad(path_.wstring(), nullptr, nullptr, true, 97);
   orx::TCSInFileKey empty(L"", nullptr, nullptr, false, 97);
   for (orx::TCSInFileKey* const file : {&bad, &empty, static_cast<orx::TCSInFileKey*>(nullptr)}) {
     kind_.current = file;

@@ -4,6 +4,7 @@
 
 #include "orxutils/dll_func_loader.h"
 #include "orxutils/file_funcs.h"
+#include "orxutils/path.h"
 #include "registry_fixture.h"
 #include "userdirs/user_dirs.h"
 
@@ -26,7 +27,7 @@ TEST(OrxString, ConvertsBothWays) {
 
 TEST(FileFuncs, TellsFilesFromDirectories) {
   const TemporaryDirectory directory;
-  const std::wstring made = (directory / "a" / "b" / "c").wstring() + L"/";
+  const std::wstring made = orx::ToName(directory.path()) + L"/a/g\u00E9\u4E2D \U0001F4CD/c/";
   EXPECT_FALSE(orx::FileFuncs::isDirExists(made));
   EXPECT_TRUE(orx::FileFuncs::createDirectoryTree(made));
   EXPECT_TRUE(orx::FileFuncs::createDirectoryTree(made)) << "there already";
@@ -80,6 +81,13 @@ TEST_F(GridHost, HandsOutOneTreeForOneFileByAnyOfItsNames) {
   GiveBack();
   EXPECT_EQ(Obtain(), tree);
   EXPECT_EQ(Obtain((file.directory / "x" / ".." / "tree.dff").wstring()), tree);
+}
+
+TEST_F(GridHost, TakesNamesOfAnyLanguage) {
+  const std::wstring name = orx::ToName(file.directory.path()) + L"/g\u00E9\u4E2D \U0001F4CD.dff";
+  EXPECT_TRUE(file.Load().Save(name, false, 512));
+  ASSERT_NE(Obtain(name), nullptr);
+  EXPECT_EQ(Describe(*Obtain(name)), Describe(file.Load()));
 }
 
 TEST_F(GridHost, ReadsAgainWhatChangedOnDiskAndWhatNobodySaved) {

@@ -7,6 +7,7 @@
 #include <limits>
 #include <vector>
 
+#include "ingest/datum_conversion.h"
 #include "ingest/grid_conversion.h"
 #include "ingest/projection_conversion.h"
 #include "records/comparison.h"
@@ -70,6 +71,16 @@ TEST(EllipsoidalGrid, IsScaledToTheLastBitAndTheNextReplacesIt) {
   EXPECT_TRUE(table.hasTable && !table.horShift && !table.vertShift);
   EXPECT_EQ(All(table.dNdLatData), Doubles(16));
   EXPECT_EQ(table.reserved1, 7U);
+}
+
+TEST(ValidityArea, LiesAroundItsCentreOrBeginsThere) {
+  Rtcm1021 message;
+  message.phiV = 10, message.lambdaV = -4, message.dPhiV = 5;
+  DatumData datum;
+  ConvertValidityArea(message, datum);
+  constexpr double kTwo = 9.69627362219072e-06;
+  EXPECT_EQ(All(datum.validityArea), (Doubles{7.5 * kTwo, 5 * kTwo, -4 * kTwo, 6.283185307179586}));
+  EXPECT_EQ(All(datum.validityCentre), (Doubles{10 * kTwo, -4 * kTwo}));
 }
 
 TEST(PlaneGrid, IsScaledInWholeMetresOf32Bits) {

@@ -47,7 +47,7 @@ void VisitFields(RtcmMessage& message, const Visit& visit) {
     visit(m->projectionType, 0);
     visit(m->laPC, 34), visit(m->loPC, 35), visit(m->azIL, 35), visit(m->addSIL, 30);
     visit(m->epc, 36), visit(m->npc, 35), visit(m->rectificationFlag, 1);
-    if (m->rectificationFlag) visit(m->diffARSG, 26);
+    visit(m->diffARSG, 26);
   }
 }
 

@@ -8,11 +8,13 @@
 #include <map>
 #include <memory>
 #include <mutex>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <system_error>
 
 #include "orxregistry/in_file_key.h"
+#include "orxutils/path.h"
 
 #ifdef _WIN32
 #define GRIDHOST_EXPORT extern "C" __declspec(dllexport)
@@ -77,11 +79,12 @@ class SharedFiles {
 
  private:
   static std::wstring Normalise(const wchar_t* name) {
-    try {
-      return std::filesystem::absolute(name).lexically_normal().wstring();
-    } catch (const std::system_error&) {
-      return name;  // no path of this system; opening it will fail
-    }
+    const std::optional<std::filesystem::path> path = orx::ToPath(name);
+    std::error_code error;
+    const std::filesystem::path whole =
+        path ? std::filesystem::absolute(*path, error) : std::filesystem::path();
+    // Opening what is no path of this system will fail.
+    return path && !error ? orx::ToName(whole.lexically_normal()) : name;
   }
 
   std::mutex mutex_;

@@ -2,23 +2,14 @@
 
 #include <filesystem>
 #include <optional>
-#include <system_error>
 #include <utility>
 
 #include "key_tree.h"
+#include "orxutils/path.h"
 #include "segment_file.h"
 
 namespace orx {
 namespace {
-
-/// \return nothing when the name is no path of this system
-std::optional<std::filesystem::path> ToPath(const COrxStringT<wchar_t>& name) {
-  try {
-    return std::filesystem::path(name);
-  } catch (const std::system_error&) {
-    return std::nullopt;
-  }
-}
 
 std::shared_ptr<KeyTree> Load(const COrxStringT<wchar_t>& fileName) {
   const std::optional<std::filesystem::path> path = ToPath(fileName);

@@ -1,11 +1,12 @@
 #include "orxutils/dll_func_loader.h"
 
-#include <array>
 #include <boost/dll/runtime_symbol_info.hpp>
 #include <boost/dll/shared_library.hpp>
 #include <filesystem>
 #include <system_error>
 #include <utility>
+
+#include "orxutils/path.h"
 
 namespace orx {
 namespace dll = boost::dll;
@@ -20,7 +21,7 @@ namespace {
 
 /// "Name.dll" without its ending, so that the platform's own decoration can be added.
 fs::path PlainName(const COrxStringT<wchar_t>& name) {
-  fs::path path(name);
+  fs::path path = ToPath(name).value_or(fs::path());
   return path.extension() == L".dll" ? path.replace_extension() : path;
 }
 

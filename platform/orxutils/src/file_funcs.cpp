@@ -1,7 +1,10 @@
 #include "orxutils/file_funcs.h"
 
 #include <filesystem>
+#include <optional>
 #include <system_error>
+
+#include "orxutils/path.h"
 
 #ifdef _WIN32
 #include <fcntl.h>
@@ -17,12 +20,9 @@ namespace {
 /// Asks about a path; a name that is no path of this system is answered with false.
 template <class Question>
 bool Ask(const COrxStringT<wchar_t>& name, Question question) {
-  try {
-    std::error_code error;
-    return question(fs::path(name), error) && !error;
-  } catch (const std::system_error&) {
-    return false;
-  }
+  const std::optional<fs::path> path = ToPath(name);
+  std::error_code error;
+  return path && question(*path, error) && !error;
 }
 
 }  // namespace

@@ -3,6 +3,8 @@
 #include <cstdlib>
 #include <filesystem>
 
+#include "orxutils/path.h"
+
 namespace orx {
 namespace {
 
@@ -34,7 +36,7 @@ COrxStringT<wchar_t> GetUserGeoDir() {
   const std::filesystem::path directory =
       replacement.empty() ? std::filesystem::path(BaseDirectory()) / "orx/geodata"
                           : std::filesystem::path(replacement);
-  COrxStringT<wchar_t> name = directory.wstring();
+  COrxStringT<wchar_t> name = ToName(directory);
   while (name.size() > 1 && (name.back() == L'/' || name.back() == L'\\')) name.pop_back();
   return name;
 }
