@@ -20,7 +20,7 @@ FNR <= count { compare(sent[FNR], $0); next }
 END {
   while (FNR < count) unexplained("did not come back: " sent[++FNR])
   if (summary) {
-    printf "  %d messages, %d fields: %d the same, %d different by a rule\n", count, all_fields,
+    printf "  %d messages, %d fields: %d the same, %d different by the rules above\n", count, all_fields,
            all_fields - all_differing, all_explained
   }
   exit failed

@@ -24,12 +24,13 @@ namespace orx::cs::velta {
 /// shared files themselves are guarded by their own mutexes.
 class RTCMDataSupport {
  public:
-  /// \param datumPath directory of the datum files, ending in a separator; taken as it is. Null:
+  /// \param datumDirectory directory of the datum files, ending in a separator; taken as it is.
+  /// Null:
   ///     the user's geodetic directory and "/datums/rtcmdata/".
-  /// \param projectionPath the same for projection files; null: "/projections/rtcmdata/".
+  /// \param projectionDirectory the same for projection files; null: "/projections/rtcmdata/".
   /// Loads the sibling library if it can; makes no directory.
-  VELTA_EXPORT explicit RTCMDataSupport(const wchar_t* datumPath = nullptr,
-                                        const wchar_t* projectionPath = nullptr);
+  VELTA_EXPORT explicit RTCMDataSupport(const wchar_t* datumDirectory = nullptr,
+                                        const wchar_t* projectionDirectory = nullptr);
 
   RTCMDataSupport(const RTCMDataSupport&) = delete;
 
@@ -117,7 +118,7 @@ class RTCMDataSupport {
   /// Adds the object's current datum to the shared datum file `GFFDatumFile`, unless an entry of
   /// its name is there, and saves the file. The caller holds the file's mutex.
   /// \return 0, kNotTheCurrentDescription, kDatumFileTrouble or kEntryNotWritten
-  VELTA_EXPORT ResultCode AddDatumToGFF(DatumData& datum);
+  VELTA_EXPORT ResultCode AddDatumToGFF(DatumData& description);
 
   /// Makes a 1025 the current projection and adds it to the projection file of the current datum.
   /// \param grid the 1024 that belongs to it, or null
@@ -133,7 +134,7 @@ class RTCMDataSupport {
   /// Adds the object's current projection to the shared projection file `GFFProjectionFile`,
   /// unless an entry of its name is there, and saves the file. The caller holds the file's mutex.
   /// \return 0, kNotTheCurrentDescription, kProjectionFileTrouble or kEntryNotWritten
-  VELTA_EXPORT ResultCode AddProjectionToGFF(ProjectionData& projection);
+  VELTA_EXPORT ResultCode AddProjectionToGFF(ProjectionData& description);
 
   /// Copies every entry of the datum file `source` into the shared datum file `target` and saves
   /// it. An entry that both hold gets the source's values; nothing is deleted. Holds the target's
@@ -155,15 +156,15 @@ class RTCMDataSupport {
 
   COrxStringT<wchar_t> SetRegionNameByPlateNumber(std::uint32_t plateNumber);
 
-  ResultCode InitDatumGFF(DatumData& datum);
-  ResultCode CreateNewDatumGFF(const COrxStringT<wchar_t>& path, DatumData& datum);
+  ResultCode InitDatumGFF(DatumData& description);
+  ResultCode CreateNewDatumGFF(const COrxStringT<wchar_t>& path, DatumData& description);
   ResultCode InitWithExistedDatumGFF(const COrxStringT<wchar_t>& path);
-  ResultCode InitDatumRegKey(TGenericRegistryKey& entry, DatumData& datum);
+  ResultCode InitDatumRegKey(TGenericRegistryKey& entry, DatumData& description);
 
-  ResultCode InitProjectionGFF(ProjectionData& projection);
-  ResultCode CreateNewPrjGFF(const COrxStringT<wchar_t>& path, ProjectionData& projection);
+  ResultCode InitProjectionGFF(ProjectionData& description);
+  ResultCode CreateNewPrjGFF(const COrxStringT<wchar_t>& path, ProjectionData& description);
   ResultCode InitWithExistedPrjGFF(const COrxStringT<wchar_t>& path);
-  ResultCode InitPrjRegKey(TGenericRegistryKey& entry, ProjectionData& projection);
+  ResultCode InitPrjRegKey(TGenericRegistryKey& entry, ProjectionData& description);
 
   static ResultCode _MergeRTCMDatumfiles(const COrxStringT<wchar_t>& target,
                                          const COrxStringT<wchar_t>& source);
@@ -173,14 +174,14 @@ class RTCMDataSupport {
   static ResultCode MergeRTCMProjectionfiles(TGenericRegistryKey& target,
                                              TGenericRegistryKey& source);
 
-  COrxStringT<wchar_t> datumPath_;
-  COrxStringT<wchar_t> projectionPath_;
-  DatumData datum_;
-  ProjectionData projection_;
-  MsgUtilized msgUtilized_;
-  COrxStringT<wchar_t> datumEntryName_;
-  COrxStringT<wchar_t> projectionEntryName_;
-  COrxStringT<wchar_t> regionName_;
+  COrxStringT<wchar_t> datumPath;
+  COrxStringT<wchar_t> projectionPath;
+  DatumData datum;
+  ProjectionData projection;
+  MsgUtilized msgUtilized;
+  COrxStringT<wchar_t> datumEntryName;
+  COrxStringT<wchar_t> projectionEntryName;
+  COrxStringT<wchar_t> regionName;
 };
 
 }  // namespace orx::cs::velta

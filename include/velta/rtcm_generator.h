@@ -21,10 +21,10 @@ namespace orx::cs::velta {
 /// message integers truncate toward zero.
 class VELTA_EXPORT RTCMGenerator {
  public:
-  /// \param systemId System Identification Number of every record built
+  /// \param id System Identification Number of every record built
   /// \param datumFileName full path of the datum file; it need not exist
   /// \param projFileName full path of the projection file; it need not exist
-  RTCMGenerator(std::int32_t systemId, const COrxStringT<wchar_t>& datumFileName,
+  RTCMGenerator(std::int32_t id, const COrxStringT<wchar_t>& datumFileName,
                 const COrxStringT<wchar_t>& projFileName);
   RTCMGenerator(const RTCMGenerator& other);
   RTCMGenerator& operator=(const RTCMGenerator& other);
@@ -75,9 +75,9 @@ class VELTA_EXPORT RTCMGenerator {
   void setProjFileName(const COrxStringT<wchar_t>& name);
 
  private:
-  std::int32_t systemId_;
-  COrxStringT<wchar_t> datumFile_;
-  COrxStringT<wchar_t> projFile_;
+  std::int32_t systemId;
+  COrxStringT<wchar_t> datumFile;
+  COrxStringT<wchar_t> projFile;
 };
 
 }  // namespace orx::cs::velta

@@ -92,12 +92,12 @@ boost::shared_ptr<Message> FindGrid(const COrxStringT<wchar_t>& fileName, const 
 
 boost::shared_ptr<Rtcm1023> RTCMGenerator::get1023(double latitude, double longitude,
                                                    double /*height*/) const {
-  return FindGrid<Rtcm1023>(datumFile_, kEllipsoidal, latitude, longitude, systemId_);
+  return FindGrid<Rtcm1023>(datumFile, kEllipsoidal, latitude, longitude, systemId);
 }
 
 boost::shared_ptr<Rtcm1024> RTCMGenerator::get1024(double northing, double easting,
                                                    double /*height*/) const {
-  return FindGrid<Rtcm1024>(projFile_, kPlane, northing, easting, systemId_);
+  return FindGrid<Rtcm1024>(projFile, kPlane, northing, easting, systemId);
 }
 
 }  // namespace orx::cs::velta

@@ -59,7 +59,7 @@ boost::shared_ptr<RtcmMessage> Finish(Message message, std::int32_t systemId) {
 }  // namespace
 
 boost::shared_ptr<RtcmMessage> RTCMGenerator::getRtcmProjMessage() const {
-  const TGenericRegistryKey entry = FirstSubKey(OpenContainer(projFile_));
+  const TGenericRegistryKey entry = FirstSubKey(OpenContainer(projFile));
   const TGenericRegistryKey standard = OpenExisting(entry, layout::kStandardProjection);
   if (!HasKindAndDimension(standard, layout::kProjectionType)) return nullptr;
   Parameters parameters;
@@ -67,9 +67,9 @@ boost::shared_ptr<RtcmMessage> RTCMGenerator::getRtcmProjMessage() const {
   const auto type = getRtcmPrjTypeFromString(Read(standard, layout::kProjectionType));
   if (type == ProjectionData::NONE) return nullptr;
   if (type == ProjectionData::OM || type == ProjectionData::ROM) {
-    return Finish(Make1027(type == ProjectionData::ROM, parameters), systemId_);
+    return Finish(Make1027(type == ProjectionData::ROM, parameters), systemId);
   }
-  return Finish(Make1025(type, parameters), systemId_);
+  return Finish(Make1025(type, parameters), systemId);
 }
 
 }  // namespace orx::cs::velta

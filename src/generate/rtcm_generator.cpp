@@ -30,9 +30,9 @@ bool ReadDatum(const TGenericRegistryKey& container, const TGenericRegistryKey& 
 
 }  // namespace
 
-RTCMGenerator::RTCMGenerator(std::int32_t systemId, const COrxStringT<wchar_t>& datumFileName,
+RTCMGenerator::RTCMGenerator(std::int32_t id, const COrxStringT<wchar_t>& datumFileName,
                              const COrxStringT<wchar_t>& projFileName)
-    : systemId_(systemId), datumFile_(datumFileName), projFile_(projFileName) {}
+    : systemId(id), datumFile(datumFileName), projFile(projFileName) {}
 
 RTCMGenerator::RTCMGenerator(const RTCMGenerator& other) = default;
 
@@ -42,7 +42,7 @@ RTCMGenerator::~RTCMGenerator() = default;
 
 std::vector<DatumData, orx_dl_allocator<DatumData>> RTCMGenerator::getAllDatums() const {
   std::vector<DatumData, orx_dl_allocator<DatumData>> datums;
-  const TGenericRegistryKey container = OpenContainer(datumFile_);
+  const TGenericRegistryKey container = OpenContainer(datumFile);
   for (TGenRegKeyIterator walk(container); walk;) {
     DatumData datum;
     if (ReadDatum(container, TGenericRegistryKey(walk++), datum)) {
@@ -56,12 +56,12 @@ ProjectionData::projList RTCMGenerator::getRtcmPrjTypeFromString(const COrxStrin
   return FirstCodeOf(type);
 }
 
-COrxStringT<wchar_t> RTCMGenerator::datumFileName() const { return datumFile_; }
+COrxStringT<wchar_t> RTCMGenerator::datumFileName() const { return datumFile; }
 
-COrxStringT<wchar_t> RTCMGenerator::projFileName() const { return projFile_; }
+COrxStringT<wchar_t> RTCMGenerator::projFileName() const { return projFile; }
 
-void RTCMGenerator::setDatumFileName(const COrxStringT<wchar_t>& name) { datumFile_ = name; }
+void RTCMGenerator::setDatumFileName(const COrxStringT<wchar_t>& name) { datumFile = name; }
 
-void RTCMGenerator::setProjFileName(const COrxStringT<wchar_t>& name) { projFile_ = name; }
+void RTCMGenerator::setProjFileName(const COrxStringT<wchar_t>& name) { projFile = name; }
 
 }  // namespace orx::cs::velta

@@ -27,45 +27,50 @@ void AddValidityArea(TGenericRegistryKey& key, const DatumData& datum) {
 
 }  // namespace
 
-ResultCode RTCMDataSupport::InitDatumGFF(DatumData& datum) {
-  const COrxStringT<wchar_t> path = GetDatumPath() + datum.targetDatumName + kDatumFiles.extension;
-  const ResultCode result = EnsureFile(
-      GetDatumPath(), path, [&](const auto& newFile) { return CreateNewDatumGFF(newFile, datum); });
+ResultCode RTCMDataSupport::InitDatumGFF(DatumData& description) {
+  const COrxStringT<wchar_t> path =
+      GetDatumPath() + description.targetDatumName + kDatumFiles.extension;
+  const ResultCode result = EnsureFile(GetDatumPath(), path, [&](const auto& newFile) {
+    return CreateNewDatumGFF(newFile, description);
+  });
   return result == kSuccess ? InitWithExistedDatumGFF(path) : result;
 }
 
-ResultCode RTCMDataSupport::CreateNewDatumGFF(const COrxStringT<wchar_t>& path, DatumData& datum) {
+ResultCode RTCMDataSupport::CreateNewDatumGFF(const COrxStringT<wchar_t>& path,
+                                              DatumData& description) {
   const auto fillContainer = [&](TGenericRegistryKey& container) {
-    Add(container, layout::kDatumFileName, datum.targetDatumName);
+    Add(container, layout::kDatumFileName, description.targetDatumName);
     return kSuccess;
   };
-  const auto fillEntry = [&](TGenericRegistryKey& entry) { return InitDatumRegKey(entry, datum); };
-  return CreateFileWithEntry(kDatumFiles, path, datum.targetDatumName, fillContainer,
-                             datumEntryName_, fillEntry);
+  const auto fillEntry = [&](TGenericRegistryKey& entry) {
+    return InitDatumRegKey(entry, description);
+  };
+  return CreateFileWithEntry(kDatumFiles, path, description.targetDatumName, fillContainer,
+                             datumEntryName, fillEntry);
 }
 
 ResultCode RTCMDataSupport::InitWithExistedDatumGFF(const COrxStringT<wchar_t>& path) {
   return OpenShared(kDatumFiles, path);
 }
 
-ResultCode RTCMDataSupport::InitDatumRegKey(TGenericRegistryKey& entry, DatumData& datum) {
+ResultCode RTCMDataSupport::InitDatumRegKey(TGenericRegistryKey& entry, DatumData& description) {
   Add(entry, layout::kVersion, layout::kEntryVersion);
   TGenericRegistryKey standard(entry, layout::kStandardDatum, 0, true);
-  AddEllipsoid(standard, layout::kEllipsoid, datum.targetEllipsoid);
-  Add(standard, layout::kMethod, {datum_.computationIndicator});
-  Add(standard, layout::kDatumParameters, datum.parameters);
-  Add(standard, layout::kSourceDatumName, datum.sourceDatumName);
-  AddEllipsoid(standard, layout::kSourceEllipsoid, datum.sourceEllipsoid);
-  AddValidityArea(standard, datum);
-  Add(standard, layout::kHeightIndicator, static_cast<signed char>(datum.heightIndicator));
-  return WriteResidualGrid(entry, layout::kDatumGrid, datum.grid);
+  AddEllipsoid(standard, layout::kEllipsoid, description.targetEllipsoid);
+  Add(standard, layout::kMethod, {datum.computationIndicator});
+  Add(standard, layout::kDatumParameters, description.parameters);
+  Add(standard, layout::kSourceDatumName, description.sourceDatumName);
+  AddEllipsoid(standard, layout::kSourceEllipsoid, description.sourceEllipsoid);
+  AddValidityArea(standard, description);
+  Add(standard, layout::kHeightIndicator, static_cast<signed char>(description.heightIndicator));
+  return WriteResidualGrid(entry, layout::kDatumGrid, description.grid);
 }
 
-ResultCode RTCMDataSupport::AddDatumToGFF(DatumData& datum) {
+ResultCode RTCMDataSupport::AddDatumToGFF(DatumData& description) {
   if (!GFFDatumFile) return kDatumFileTrouble;
-  if (!IsSameDatum(datum, datum_)) return kNotTheCurrentDescription;
-  return AddEntry(kDatumFiles, datumEntryName_,
-                  [&](TGenericRegistryKey& entry) { return InitDatumRegKey(entry, datum); });
+  if (!IsSameDatum(description, datum)) return kNotTheCurrentDescription;
+  return AddEntry(kDatumFiles, datumEntryName,
+                  [&](TGenericRegistryKey& entry) { return InitDatumRegKey(entry, description); });
 }
 
 }  // namespace orx::cs::velta

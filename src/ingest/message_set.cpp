@@ -15,8 +15,8 @@ constexpr bool UtilizedMsgInfo::*kFlags[] = {&UtilizedMsgInfo::use1023, &Utilize
 }  // namespace
 
 UtilizedMsgInfo& RTCMDataSupport::GetUtilizedMessageInfo(RtcmBasicTransformMessage& message) {
-  msgUtilized_ = MsgUtilized();
-  UtilizedMsgInfo& info = msgUtilized_.info;
+  msgUtilized = MsgUtilized();
+  UtilizedMsgInfo& info = msgUtilized.info;
   info.systemId = static_cast<std::int32_t>(message.systemId);
   for (unsigned bit = 0; bit < std::size(kFlags); ++bit) {
     info.*kFlags[bit] = (message.utilizedMsgIndicator >> bit & 1U) != 0;
@@ -25,7 +25,7 @@ UtilizedMsgInfo& RTCMDataSupport::GetUtilizedMessageInfo(RtcmBasicTransformMessa
 }
 
 ResultCode RTCMDataSupport::ParseRTCMMEssages(MsgUtilized& messages) {
-  msgUtilized_ = messages;
+  msgUtilized = messages;
   const UtilizedMsgInfo& info = messages.info;
   if (!messages.msg1021 && !messages.msg1022) return kNoDatumMessage;
   if (info.use1023 && !messages.msg1023) return kMissing1023;

@@ -24,34 +24,34 @@ ResultCode RTCMDataSupport::ParseDatumMessages(const Rtcm1022& message, const Rt
 
 ResultCode RTCMDataSupport::ParseDatum(const RtcmBasicTransformMessage& message,
                                        const Rtcm1022* rotationPoint, const Rtcm1023* grid) {
-  datumEntryName_.clear();
+  datumEntryName.clear();
   if (grid) {
-    ConvertEllipsoidalGrid(*grid, datum_.grid);
+    ConvertEllipsoidalGrid(*grid, datum.grid);
   } else if (message.utilizedMsgIndicator & kGridAnnounced) {
     return kMissing1023;
   }
-  datum_.targetDatumName = CleanDatumName(message.targetName);
-  datum_.sourceDatumName = NormaliseSourceName(message.sourceName);
+  datum.targetDatumName = CleanDatumName(message.targetName);
+  datum.sourceDatumName = NormaliseSourceName(message.sourceName);
   SetRegionNameByPlateNumber(message.plateNumber);
-  ConvertEllipsoids(message, datum_);
-  datum_.computationIndicator = message.computationIndicator;
-  ConvertParameters(message, datum_);
-  if (rotationPoint) ConvertRotationPoint(*rotationPoint, datum_);
-  if (datum_.computationIndicator > kMolodenskiBadekas) return kBadComputationIndicator;
-  ConvertValidityArea(message, datum_);
-  datum_.heightIndicator = message.heightIndicator;
-  datumEntryName_ = DatumEntryName(message, grid);
+  ConvertEllipsoids(message, datum);
+  datum.computationIndicator = message.computationIndicator;
+  ConvertParameters(message, datum);
+  if (rotationPoint) ConvertRotationPoint(*rotationPoint, datum);
+  if (datum.computationIndicator > kMolodenskiBadekas) return kBadComputationIndicator;
+  ConvertValidityArea(message, datum);
+  datum.heightIndicator = message.heightIndicator;
+  datumEntryName = DatumEntryName(message, grid);
 
   // Nothing may fail between obtaining the file and giving it back.
-  const COrxStringT<wchar_t> path = GetDatumPath() + datum_.targetDatumName + kDatumFiles.extension;
-  const ResultCode result = InitDatumGFF(datum_);
+  const COrxStringT<wchar_t> path = GetDatumPath() + datum.targetDatumName + kDatumFiles.extension;
+  const ResultCode result = InitDatumGFF(datum);
   if (result != kSuccess) return result;
-  return AddAndGiveBack(kDatumFiles, path, [this] { return AddDatumToGFF(datum_); });
+  return AddAndGiveBack(kDatumFiles, path, [this] { return AddDatumToGFF(datum); });
 }
 
 COrxStringT<wchar_t> RTCMDataSupport::SetRegionNameByPlateNumber(std::uint32_t plateNumber) {
-  regionName_ = RegionOfPlate(plateNumber);
-  return regionName_;
+  regionName = RegionOfPlate(plateNumber);
+  return regionName;
 }
 
 }  // namespace orx::cs::velta

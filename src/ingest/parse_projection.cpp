@@ -25,30 +25,30 @@ ResultCode RTCMDataSupport::ParseProjectionMessages(const Rtcm1027& message, con
 template <class Message>
 ResultCode RTCMDataSupport::ParseProjection(const Message& message, std::uint32_t typeCode,
                                             const Rtcm1024* grid) {
-  projection_.datumName = datum_.targetDatumName;
-  if (projection_.datumName.empty()) return kNoDatumName;
-  projection_.has1024 = grid != nullptr;
+  projection.datumName = datum.targetDatumName;
+  if (projection.datumName.empty()) return kNoDatumName;
+  projection.has1024 = grid != nullptr;
   // An entry without a grid must not carry the one of another projection.
-  projection_.table = TableData();
-  if (grid) ConvertPlaneGrid(projection_.table, *grid);
-  projection_.regionName = regionName_;
-  projection_.systemId = message.systemId;
-  projection_.rtcmProjName = projection_.datumName;
-  projection_.geoProj = CreateProjection(projection_, static_cast<int>(typeCode),
-                                         datum_.targetEllipsoid.a, datum_.targetEllipsoid.second);
-  if (!projection_.geoProj) return kUnsupportedProjection;
+  projection.table = TableData();
+  if (grid) ConvertPlaneGrid(projection.table, *grid);
+  projection.regionName = regionName;
+  projection.systemId = message.systemId;
+  projection.rtcmProjName = projection.datumName;
+  projection.geoProj = CreateProjection(projection, static_cast<int>(typeCode),
+                                        datum.targetEllipsoid.a, datum.targetEllipsoid.second);
+  if (!projection.geoProj) return kUnsupportedProjection;
   int index = 0;
   for (const double parameter : ParametersOf(message)) {
-    projection_.geoProj->SetParam(parameter, index++, projmath::kDegreesMetresRatios);
+    projection.geoProj->SetParam(parameter, index++, projmath::kDegreesMetresRatios);
   }
-  projectionEntryName_ = ProjectionEntryName(message, grid);
+  projectionEntryName = ProjectionEntryName(message, grid);
 
   // Nothing may fail between obtaining the file and giving it back.
   const COrxStringT<wchar_t> path =
-      GetProjectionPath() + projection_.rtcmProjName + kProjectionFiles.extension;
-  const ResultCode result = InitProjectionGFF(projection_);
+      GetProjectionPath() + projection.rtcmProjName + kProjectionFiles.extension;
+  const ResultCode result = InitProjectionGFF(projection);
   if (result != kSuccess) return result;
-  return AddAndGiveBack(kProjectionFiles, path, [this] { return AddProjectionToGFF(projection_); });
+  return AddAndGiveBack(kProjectionFiles, path, [this] { return AddProjectionToGFF(projection); });
 }
 
 }  // namespace orx::cs::velta

@@ -27,49 +27,49 @@ void AddParameters(TGenericRegistryKey& key, const projmath::TGeoProj& projectio
 
 }  // namespace
 
-ResultCode RTCMDataSupport::InitProjectionGFF(ProjectionData& projection) {
+ResultCode RTCMDataSupport::InitProjectionGFF(ProjectionData& description) {
   const COrxStringT<wchar_t> path =
-      GetProjectionPath() + projection.rtcmProjName + kProjectionFiles.extension;
+      GetProjectionPath() + description.rtcmProjName + kProjectionFiles.extension;
   const ResultCode result = EnsureFile(GetProjectionPath(), path, [&](const auto& newFile) {
-    return CreateNewPrjGFF(newFile, projection);
+    return CreateNewPrjGFF(newFile, description);
   });
   return result == kSuccess ? InitWithExistedPrjGFF(path) : result;
 }
 
 ResultCode RTCMDataSupport::CreateNewPrjGFF(const COrxStringT<wchar_t>& path,
-                                            ProjectionData& projection) {
+                                            ProjectionData& description) {
   const auto fillContainer = [&](TGenericRegistryKey& container) {
-    Add(container, layout::kProjectionFileName, projection.rtcmProjName);
-    Add(container, layout::kSystemId, projection.systemId);
+    Add(container, layout::kProjectionFileName, description.rtcmProjName);
+    Add(container, layout::kSystemId, description.systemId);
     return kSuccess;
   };
   const auto fillEntry = [&](TGenericRegistryKey& entry) {
-    return InitPrjRegKey(entry, projection);
+    return InitPrjRegKey(entry, description);
   };
-  return CreateFileWithEntry(kProjectionFiles, path, projection.rtcmProjName, fillContainer,
-                             projectionEntryName_, fillEntry);
+  return CreateFileWithEntry(kProjectionFiles, path, description.rtcmProjName, fillContainer,
+                             projectionEntryName, fillEntry);
 }
 
 ResultCode RTCMDataSupport::InitWithExistedPrjGFF(const COrxStringT<wchar_t>& path) {
   return OpenShared(kProjectionFiles, path);
 }
 
-ResultCode RTCMDataSupport::InitPrjRegKey(TGenericRegistryKey& entry, ProjectionData& projection) {
+ResultCode RTCMDataSupport::InitPrjRegKey(TGenericRegistryKey& entry, ProjectionData& description) {
   Add(entry, layout::kVersion, layout::kEntryVersion);
   TGenericRegistryKey standard(entry, layout::kStandardProjection, 0, true);
-  Add(standard, layout::kProjectionName, projection.rtcmProjName);
-  Add(standard, layout::kDatumName, datum_.targetDatumName);
-  AddEllipsoid(standard, *projection.geoProj);
-  Add(standard, layout::kProjectionType, projection.prjType);
-  AddParameters(standard, *projection.geoProj);
-  return WriteResidualGrid(entry, layout::kProjectionGrid, projection.table);
+  Add(standard, layout::kProjectionName, description.rtcmProjName);
+  Add(standard, layout::kDatumName, datum.targetDatumName);
+  AddEllipsoid(standard, *description.geoProj);
+  Add(standard, layout::kProjectionType, description.prjType);
+  AddParameters(standard, *description.geoProj);
+  return WriteResidualGrid(entry, layout::kProjectionGrid, description.table);
 }
 
-ResultCode RTCMDataSupport::AddProjectionToGFF(ProjectionData& projection) {
+ResultCode RTCMDataSupport::AddProjectionToGFF(ProjectionData& description) {
   if (!GFFProjectionFile) return kProjectionFileTrouble;
-  if (!ProjectionEquals(projection, projection_)) return kNotTheCurrentDescription;
-  return AddEntry(kProjectionFiles, projectionEntryName_,
-                  [&](TGenericRegistryKey& entry) { return InitPrjRegKey(entry, projection); });
+  if (!ProjectionEquals(description, projection)) return kNotTheCurrentDescription;
+  return AddEntry(kProjectionFiles, projectionEntryName,
+                  [&](TGenericRegistryKey& entry) { return InitPrjRegKey(entry, description); });
 }
 
 }  // namespace orx::cs::velta

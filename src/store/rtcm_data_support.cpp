@@ -23,9 +23,9 @@ TDLLFuncWrapper RTCMDataSupport::DLLprojection;
 TCSInFileKey* RTCMDataSupport::GFFDatumFile = nullptr;
 TCSInFileKey* RTCMDataSupport::GFFProjectionFile = nullptr;
 
-RTCMDataSupport::RTCMDataSupport(const wchar_t* datumPath, const wchar_t* projectionPath)
-    : datumPath_(GivenOr(datumPath, kDatumFolder)),
-      projectionPath_(GivenOr(projectionPath, kProjectionFolder)) {
+RTCMDataSupport::RTCMDataSupport(const wchar_t* datumDirectory, const wchar_t* projectionDirectory)
+    : datumPath(GivenOr(datumDirectory, kDatumFolder)),
+      projectionPath(GivenOr(projectionDirectory, kProjectionFolder)) {
   // Without the sibling library now, the first message tries again and reports it.
   GetDatumTransformationDLL();
   GetPrjTransformationDLL();
@@ -60,38 +60,38 @@ void RTCMDataSupport::ReleasePtrProjectionGFF(const COrxStringT<wchar_t>& fileNa
   GiveBack(kProjectionFiles, fileName);
 }
 
-COrxStringT<wchar_t> RTCMDataSupport::GetDatumPath() const { return datumPath_; }
+COrxStringT<wchar_t> RTCMDataSupport::GetDatumPath() const { return datumPath; }
 
-COrxStringT<wchar_t> RTCMDataSupport::GetProjectionPath() const { return projectionPath_; }
+COrxStringT<wchar_t> RTCMDataSupport::GetProjectionPath() const { return projectionPath; }
 
-COrxStringT<wchar_t> RTCMDataSupport::GetRegionName() { return regionName_; }
+COrxStringT<wchar_t> RTCMDataSupport::GetRegionName() { return regionName; }
 
-COrxStringT<wchar_t> RTCMDataSupport::GetSourceDatumName() const { return datum_.sourceDatumName; }
+COrxStringT<wchar_t> RTCMDataSupport::GetSourceDatumName() const { return datum.sourceDatumName; }
 
-COrxStringT<wchar_t> RTCMDataSupport::GetTargetDatumName() const { return datum_.targetDatumName; }
+COrxStringT<wchar_t> RTCMDataSupport::GetTargetDatumName() const { return datum.targetDatumName; }
 
-projmath::Ellipsoid& RTCMDataSupport::GetDatumSourceEllipsoid() { return datum_.sourceEllipsoid; }
+projmath::Ellipsoid& RTCMDataSupport::GetDatumSourceEllipsoid() { return datum.sourceEllipsoid; }
 
-projmath::Ellipsoid& RTCMDataSupport::GetDatumTargetEllipsoid() { return datum_.targetEllipsoid; }
+projmath::Ellipsoid& RTCMDataSupport::GetDatumTargetEllipsoid() { return datum.targetEllipsoid; }
 
 void RTCMDataSupport::SetDatumEllipsoidName(const COrxStringT<wchar_t>& name) {
-  datum_.ellipsoidName = name;
+  datum.ellipsoidName = name;
 }
 
 bool RTCMDataSupport::GetCustomDatumData(CustomDatumData& summary) {
-  summary.ellipsoidName = datum_.ellipsoidName;
-  summary.datumName = datum_.targetDatumName;
+  summary.ellipsoidName = datum.ellipsoidName;
+  summary.datumName = datum.targetDatumName;
   summary.datumGroup = kRtcmGroup;
   summary.transformationDll = kSiblingLibrary;
   return !summary.ellipsoidName.empty();
 }
 
 bool RTCMDataSupport::GetCustomProjectionData(CustomProjectionData& summary) {
-  summary.projectionName = projection_.rtcmProjName;
+  summary.projectionName = projection.rtcmProjName;
   summary.projectionGroup = kRtcmGroup;
   summary.transformationDll = kSiblingLibrary;
-  summary.datumName = projection_.datumName;
-  summary.projectionType = projection_.prjType;
+  summary.datumName = projection.datumName;
+  summary.projectionType = projection.prjType;
   summary.unitName = kMeters;
   return !summary.datumName.empty() && !summary.transformationDll.empty() &&
          !summary.projectionName.empty();

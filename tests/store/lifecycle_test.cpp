@@ -43,6 +43,7 @@ TEST_F(LifecycleTest, SummariesFollowTheLastSetAndAnAssignment) {
 }
 
 TEST_F(LifecycleTest, OneObjectsEndUnloadsTheSiblingAndTheOtherGoesOn) {
+  EXPECT_TRUE(RTCMDataSupport::DLLdatum && RTCMDataSupport::DLLprojection);
   ASSERT_EQ(Ingest(Dhdn(), kGrid), kSuccess);
   EXPECT_TRUE(IsSiblingLoaded());
   { const RTCMDataSupport other; }
