@@ -5,6 +5,9 @@
 # that did not come back.
 
 BEGIN {
+  kept_as_they_are = " message systemId utilizedMsgIndicator computationIndicator heightIndicator " \
+    "horShiftIndicator vertShiftIndicator horInterpolationMethod vertInterpolationMethod " \
+    "projectionType rectificationFlag "
   not_stored = " plateNumber horQualityIndicator vertQualityIndicator" \
                " horGridQualityIndicator vertGridQualityIndicator mjd "
 }
@@ -88,6 +91,7 @@ function explain(name, sent, generated) {
   if (index(not_stored, " " name " ") && generated == 0) return "not kept in the files"
   if (name == "targetName") return generated == cleaned(sent) ? "cleaned to be a file name" : ""
   if (name == "sourceName") return generated == family(sent) ? "reduced to its family" : ""
+  if (index(kept_as_they_are, " " name " ")) return ""
   return truncated(sent, generated) ? "cut toward zero" : ""
 }
 

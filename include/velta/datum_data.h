@@ -11,8 +11,8 @@ namespace orx::cs::velta {
 
 /// A datum transformation in physical units: angles in radians, lengths in metres.
 struct DatumData {
-  projmath::Ellipsoid sourceEllipsoid;   ///< of the source (reference) system; WGS 84 by default
-  projmath::Ellipsoid targetEllipsoid;   ///< of the target (local) system; WGS 84 by default
+  projmath::Ellipsoid sourceEllipsoid = projmath::Ellipsoid::Wgs84();  ///< of the source system
+  projmath::Ellipsoid targetEllipsoid = projmath::Ellipsoid::Wgs84();  ///< of the target system
   COrxStringT<wchar_t> targetDatumName;  ///< also the base name of the datum's file
   COrxStringT<wchar_t> sourceDatumName;
   /// dX, dY, dZ (m); R1, R2, R3 (arc-seconds); dS (ppm); XP, YP, ZP of the rotation point (m);

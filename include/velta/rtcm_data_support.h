@@ -109,8 +109,8 @@ class RTCMDataSupport {
   /// Makes a 1021 the current datum and adds it to the datum file of its target datum.
   /// \param grid the 1023 that belongs to it, or null
   /// \return 0 (also when the entry was there), kMissing1023, kBadComputationIndicator,
-  ///     kNoDirectory, kDatumFileTrouble, kEntryNotWritten, kNoSiblingLibrary, or the sibling
-  ///     library's code
+  ///     kNoDirectory, kDatumFileTrouble, kEntryNotWritten, kNoSiblingLibrary, the loader's status,
+  ///     or the sibling library's code
   VELTA_EXPORT ResultCode ParseDatumMessages(const Rtcm1021& message, const Rtcm1023* grid);
   /// As for a 1021, with the rotation point of a 1022.
   VELTA_EXPORT ResultCode ParseDatumMessages(const Rtcm1022& message, const Rtcm1023* grid);
@@ -123,8 +123,8 @@ class RTCMDataSupport {
   /// Makes a 1025 the current projection and adds it to the projection file of the current datum.
   /// \param grid the 1024 that belongs to it, or null
   /// \return 0 (also when the entry was there), kNoDatumName, kUnsupportedProjection,
-  ///     kNoDirectory, kProjectionFileTrouble, kEntryNotWritten, kNoSiblingLibrary, or the sibling
-  ///     library's code
+  ///     kNoDirectory, kProjectionFileTrouble, kEntryNotWritten, kNoSiblingLibrary, the loader's
+  ///     status, or the sibling library's code
   VELTA_EXPORT ResultCode ParseProjectionMessages(const Rtcm1025& message, const Rtcm1024* grid);
   /// Refuses: changes nothing and returns kUnsupportedProjection.
   VELTA_EXPORT ResultCode ParseProjectionMessages(const Rtcm1026& message, const Rtcm1024* grid);
@@ -139,7 +139,8 @@ class RTCMDataSupport {
   /// Copies every entry of the datum file `source` into the shared datum file `target` and saves
   /// it. An entry that both hold gets the source's values; nothing is deleted. Holds the target's
   /// mutex meanwhile, and gives the target back whatever the outcome.
-  /// \return 0, kDatumFileTrouble, kNoSiblingLibrary, or the sibling library's code
+  /// \return 0, kDatumFileTrouble, kNoSiblingLibrary, the loader's status, or the sibling
+  ///     library's code
   VELTA_EXPORT static ResultCode MergeRTCMDatumfiles(const COrxStringT<wchar_t>& target,
                                                      const COrxStringT<wchar_t>& source);
   /// As MergeRTCMDatumfiles, for projection files, with kProjectionFileTrouble.

@@ -24,6 +24,12 @@ ResultCode MergeEntries(const FileKind& kind, const TGenericRegistryKey& target,
   return kSuccess;
 }
 
+/// Looks into every key below a key, and at every value.
+void LookInto(const TGenericRegistryKey& key) {
+  key.HasValue(L"");
+  for (TGenRegKeyIterator walk(key); walk;) LookInto(TGenericRegistryKey(walk++));
+}
+
 ResultCode MergeFiles(const FileKind& kind, const COrxStringT<wchar_t>& targetPath,
                       const COrxStringT<wchar_t>& sourcePath, MergeContainers* merge) {
   TCSInFileKey* target = nullptr;
@@ -37,9 +43,11 @@ ResultCode MergeFiles(const FileKind& kind, const COrxStringT<wchar_t>& targetPa
   if (source.GetErrorState() != kRegistryOk) return kind.trouble;
   TGenericRegistryKey sourceContainer = ContainerOf(source);
   if (sourceContainer.IsNull()) return kind.trouble;
-  if (merge(targetContainer, sourceContainer) != kSuccess) return kind.trouble;
-  // Damage inside a key shows only when the key is visited.
+  // Damage inside a key shows only when the key is looked into: all of them before the target is
+  // touched.
+  LookInto(sourceContainer);
   if (source.GetErrorState() != kRegistryOk) return kind.trouble;
+  if (merge(targetContainer, sourceContainer) != kSuccess) return kind.trouble;
   return target->Save(false, kRegistryVersion) ? kSuccess : kind.trouble;
 }
 

@@ -37,10 +37,11 @@ ResultCode OpenShared(const FileKind& kind, const COrxStringT<wchar_t>& path) {
 
 ResultCode AddEntry(const FileKind& kind, const COrxStringT<wchar_t>& name, const FillKey& fill) {
   TCSInFileKey& file = *kind.current;
-  if (file.GetErrorState() != kRegistryOk) return kind.trouble;
   const TGenericRegistryKey container = ContainerOf(file);
-  if (container.IsNull()) return kind.trouble;
-  if (container.HasKey(name)) return kSuccess;
+  const bool isPresent = container.HasKey(name);
+  // Damage inside a key shows only when the key has been looked into.
+  if (container.IsNull() || file.GetErrorState() != kRegistryOk) return kind.trouble;
+  if (isPresent) return kSuccess;
   TGenericRegistryKey entry(container, name, container.GetKeyDim(), true);
   const ResultCode result = fill(entry);
   if (result != kSuccess) return result;

@@ -106,13 +106,12 @@ class TSimpleBinValue : public TBinaryValue {
   }
 
   static Holder CopyOf(const void* data, std::uint32_t bytes) {
-    const Block block(new (std::nothrow) SharedBlock);
-    if (!block) return {};
-    block->bytes.reset(new (std::nothrow) unsigned char[bytes]);
-    if (!block->bytes) return {};
+    auto block = std::unique_ptr<SharedBlock>(new (std::nothrow) SharedBlock);
+    if (block) block->bytes.reset(new (std::nothrow) unsigned char[bytes]);
+    if (!block || !block->bytes) return {};
     block->size = bytes;
     std::memcpy(block->bytes.get(), data, bytes);
-    return block;
+    return Block(block.release());
   }
 
   bool valid_ = false;

@@ -2,7 +2,7 @@
 // other than they should be.
 
 #include <cmath>
-#include <limits>
+#include <cstdint>
 
 #include "support/message_fields.h"
 #include "support/rtcm_test.h"
@@ -15,7 +15,6 @@ using Doubles = std::vector<double>;
 // Within the areas of the DHDN set.
 constexpr double kLatitude = 374415 * kHalfSecond, kLongitude = 64815 * kHalfSecond;
 constexpr double kNorthing = 5400000, kEasting = 3400000;
-constexpr auto kLowest = std::numeric_limits<std::int32_t>::min();
 
 /// The DHDN set's files, to be changed and asked about.
 class StoredValueTest : public RtcmTest {
@@ -58,37 +57,33 @@ class StoredValueTest : public RtcmTest {
   GffKey projection_;
 };
 
-constexpr const char* kAll = "LD34P";
-constexpr const char* kNoDatum = "34P";  // not listed either
-constexpr const char* kNoGrid = "D4P";   // not listed either
-constexpr const char* kNoTable = "LD3P";
-constexpr const char* kNoProjection = "LD34";
+constexpr auto *kAll = "LD34P", *kNoTable = "LD3P", *kNoProjection = "LD34";
+constexpr auto *kNoDatum = "34P", *kNoGrid = "D4P";  // not listed either
 
 TEST_F(StoredValueTest, EveryValueIsCheckedAsItsQueryDoes) {
-  const struct {
-    GffKey& root;
-    const wchar_t* key;   ///< L"" is the container
-    const char* matters;  ///< of presence, type, size and dimension
-    const char* found;    ///< when something that matters is wrong
-    std::vector<std::wstring> values;
-  } cases[] = {
+  using Names = std::vector<std::wstring>;
+  const Names gridNumbers = {L"dMeanValue", L"dNdLatData", L"dEdLonData", L"dHData"};
+  Names gridCodes = {L"NRowsT", L"NColsT"};
+  for (const auto* name :
+       {L"DoApplyHorShifts", L"DoApplyVertShifts", L"HorInterpolation", L"VertInterpolation"})
+    gridCodes.push_back(std::wstring(name) + L"ForAreaIndex");
+  // What matters of presence, type, size and dimension, and what is found when that is wrong.
+  const std::tuple<GffKey&, const wchar_t*, const char*, const char*, Names> cases[] = {
       {datum_, L"", "ptd", kNoDatum, {L"rtcm_datumName"}},
       {datum_, L"StandardDatum", "ps", kNoDatum, {L"BoundariesStandardDatum", L"Ellipsoid"}},
       {datum_, L"StandardDatum", "ps", kNoDatum, {L"RefEllipsoid", L"DatumStandardParameters"}},
       {datum_, L"StandardDatum", "p", kNoDatum, {L"StandardMethod"}},
       {datum_, L"StandardDatum", "ptsd", kNoDatum, {L"HtIndicator"}},
       {datum_, L"StandardDatum", "ptd", kNoDatum, {L"RTCMRefDatumName"}},
-      {datum_, L"TargetDatum", "pts", kNoGrid, {L"NRowsT", L"NColsT"}},
-      {datum_, L"TargetDatum", "pts", kNoGrid, {L"DoApplyHorShiftsForAreaIndex"}},
-      {datum_, L"TargetDatum", "pts", kNoGrid, {L"DoApplyVertShiftsForAreaIndex"}},
-      {datum_, L"TargetDatum", "pts", kNoGrid, {L"HorInterpolationForAreaIndex"}},
-      {datum_, L"TargetDatum", "pts", kNoGrid, {L"VertInterpolationForAreaIndex"}},
-      {datum_, L"TargetDatum", "ps", kNoGrid, {L"BoundariesTargetDatum", L"dMeanValue"}},
-      {datum_, L"TargetDatum", "ps", kNoGrid, {L"dNdLatData", L"dEdLonData", L"dHData"}},
+      {datum_, L"TargetDatum", "pts", kNoGrid, gridCodes},
+      {datum_, L"TargetDatum", "ps", kNoGrid, gridNumbers},
+      {datum_, L"TargetDatum", "ps", kNoGrid, {L"BoundariesTargetDatum"}},
       {projection_, L"StandardPrj", "", kAll, {L"Ellipsoid", L"RTCMProjName", L"DatumName"}},
       {projection_, L"StandardPrj", "ptsd", kNoProjection, {L"PrjType"}},
       {projection_, L"StandardPrj", "ps", kNoProjection, {L"PrjStandardParameters"}},
-      {projection_, L"TableProj", "ps", kNoTable, {L"BoundariesTableProj", L"dHData"}},
+      {projection_, L"TableProj", "pts", kNoTable, gridCodes},
+      {projection_, L"TableProj", "ps", kNoTable, gridNumbers},
+      {projection_, L"TableProj", "ps", kNoTable, {L"BoundariesTableProj"}},
   };
   ASSERT_EQ(Found(), kAll);
   const auto spoil = [](GffKey& key, const std::wstring& name, char what) {
@@ -96,19 +91,18 @@ TEST_F(StoredValueTest, EveryValueIsCheckedAsItsQueryDoes) {
     const bool isText = value.size == 0;
     if (what == 't') value.type = value.type == 2 ? 3 : 2;
     if (what == 't' && isText) value.size = static_cast<std::uint32_t>(value.bytes.size());
-    if (what == 's') value.bytes.insert(0, 8, '\1');
-    if (what == 's' && !isText) value.size += 8;
+    if (what == 's') value.bytes.insert(0, 8, '\1'), value.size += isText ? 0 : 8;
     if (what == 'd') value.dimension = 2;
     if (what == 'p') key.Remove(name);
   };
-  for (const auto& c : cases) {
-    for (const std::wstring& value : c.values) {
+  for (const auto& [root, key, matters, found, values] : cases) {
+    for (const std::wstring& value : values) {
       for (const char what : {'p', 't', 's', 'd'}) {
-        const GffKey before = c.root;
-        spoil(*c.key ? c.root.Entry()[c.key] : c.root.Container(), value, what);
-        const bool matters = std::string(c.matters).find(what) != std::string::npos;
-        EXPECT_EQ(Found(), matters ? c.found : kAll) << orx::Narrow(value) << " " << what;
-        c.root = before;
+        const GffKey before = root;
+        spoil(*key ? root.Entry()[key] : root.Container(), value, what);
+        const bool isWrong = std::string(matters).find(what) != std::string::npos;
+        EXPECT_EQ(Found(), isWrong ? found : kAll) << orx::Narrow(value) << " " << what;
+        root = before;
       }
     }
   }
@@ -163,9 +157,9 @@ TEST_F(StoredValueTest, FirstEntryWinsAndAMalformedOneInFrontEndsTheSearchesButN
 
 TEST_F(StoredValueTest, GridsOfAnyShapeAreSafe) {
   const std::tuple<int, int, const char*> cases[] = {
-      {4, 4, kAll},   {2, 2, kAll},   {2, 8, kAll},         {1, 1, "LDP"},       {1, 4, "LDP"},
-      {16, 1, "LDP"}, {5, 5, "DP"},   {17, 1, "DP"},        {0, 0, "DP"},        {0, 4, "DP"},
-      {4, 0, "DP"},   {-4, -4, "DP"}, {65536, 65536, "DP"}, {kLowest, -1, "DP"}, {-1, 1, "DP"}};
+      {4, 4, kAll},   {2, 2, kAll},   {2, 8, kAll},         {1, 1, "LDP"},         {1, 4, "LDP"},
+      {16, 1, "LDP"}, {5, 5, "DP"},   {17, 1, "DP"},        {0, 0, "DP"},          {0, 4, "DP"},
+      {4, 0, "DP"},   {-4, -4, "DP"}, {65536, 65536, "DP"}, {INT32_MIN, -1, "DP"}, {-1, 1, "DP"}};
   for (const auto& [rows, columns, found] : cases) {
     for (GffKey* const key : {&Grid(), &Table()}) {
       key->Set<int>(L"NRowsT", {rows}), key->Set<int>(L"NColsT", {columns});
@@ -190,12 +184,7 @@ TEST_F(StoredValueTest, GridsOfAnyShapeAreSafe) {
 
 TEST_F(StoredValueTest, PositionsAreFoundOnEdgesPolesAndAcrossTheDateLine) {
   const double d = kPi / 180;
-  const struct {
-    Doubles area;
-    double latitude;
-    double longitude;
-    bool isInside;
-  } cases[] = {
+  const std::tuple<Doubles, double, double, bool> cases[] = {
       {{0.1, 0.25, 0.5, 0.5}, 0.1, 0.5, true},
       {{0.1, 0.25, 0.5, 0.5}, 0.35, 1.0, true},
       {{0.1, 0.25, 0.5, 0.5}, 0.0999, 0.7, false},
@@ -246,6 +235,10 @@ TEST_F(StoredValueTest, DatumNumbersAreTruncated) {
   Standard().Set<unsigned>(L"StandardMethod", {4});
   EXPECT_FALSE(Written().getRtcmDatumMessage(0.6, 0.3, 0));
   EXPECT_EQ(Generator().getAllDatums().at(0).parameters[7], 0.0);
+  Standard().Set<unsigned>(L"StandardMethod", {3});
+  Standard().Value(L"StandardMethod").type = 2;  // of another kind: reads as 0
+  made = Written().getRtcmDatumMessage(0.6, 0.3, 0);
+  EXPECT_EQ(made->messageType * 10 + made->computationIndicator, 210U);
 }
 
 TEST_F(StoredValueTest, GridNumbersAreTruncated) {
@@ -270,11 +263,7 @@ TEST_F(StoredValueTest, GridNumbersAreTruncated) {
 TEST_F(StoredValueTest, ProjectionMessageFollowsTheTypeString) {
   const Doubles tm = {9.0, 0.9996, 0.0, 500000.0, -0.0019};
   const Doubles om = {44, 0.9996, -91, -27, 1e16, 0.5, 43};
-  const struct {
-    const wchar_t* type;
-    Doubles parameters;
-    const char* message;
-  } cases[] = {
+  const std::tuple<const wchar_t*, Doubles, const char*> cases[] = {
       {L"TMERC", tm, "25 77: 1 0 818181818 660000000 500000000 -1"},
       {L"STER", tm, "25 77: 8 0 818181818 660000000 500000000 -1"},
       {L"LC", {0, 1.02}, "25 77: 3 0 0 2700000000 0 0"},
@@ -288,13 +277,13 @@ TEST_F(StoredValueTest, ProjectionMessageFollowsTheTypeString) {
       {L"tmerc", {0, (1073741823 * 1e-5 + 993000) * 1e-6}, "25 77: 1 0 0 1073741822 0 0"},
       {L"TM", tm, "nothing"},
   };
-  for (auto c : cases) {
-    const std::u16string units = orx::ToUtf16(c.type) + u'\0';
+  for (auto [type, parameters, message] : cases) {
+    const std::u16string units = orx::ToUtf16(type) + u'\0';
     Projection().Set<char16_t>(L"PrjType", {units.begin(), units.end()});
-    c.parameters.resize(16);
-    Projection().Set(L"PrjStandardParameters", c.parameters);
+    parameters.resize(16);
+    Projection().Set(L"PrjStandardParameters", parameters);
     const auto made = Written().getRtcmProjMessage();
-    EXPECT_EQ(Describe(made.get()), c.message);
+    EXPECT_EQ(Describe(made.get()), message);
   }
 }
 

@@ -124,6 +124,7 @@ TEST(RegistryFile, ANewFileNeverReplacesOne) {
   const std::string before = file.Bytes();
   TCSInFileKey tree = RegistryFile::New();
   EXPECT_FALSE(tree.Save(file.path.wstring(), false, 512));
+  EXPECT_FALSE(TCSInFileKey(file.path.wstring(), nullptr, nullptr, false, 97).Save(false, 512));
   EXPECT_FALSE(tree.Save((file.directory / "no" / "such").wstring(), false, 512));
   EXPECT_EQ(file.Bytes(), before);
   EXPECT_EQ(std::distance(std::filesystem::directory_iterator(file.directory.path()), {}), 1)
@@ -132,8 +133,9 @@ TEST(RegistryFile, ANewFileNeverReplacesOne) {
 
 TEST(RegistryFile, ALostFileIsNotASuccess) {
   const RegistryFile file;
-  file.Create();
-  TCSInFileKey tree = file.Load();
+  TCSInFileKey tree(file.path.wstring(), nullptr, nullptr, false, 97U);
+  EXPECT_TRUE(tree.Save(false, 512)) << "a new tree makes its file";
+  EXPECT_TRUE(tree.Save(false, 512)) << "and then goes on with it";
   std::filesystem::remove(file.path);
   EXPECT_FALSE(tree.Save(false, 512)) << "nothing to write, but nothing is safe either";
   RegistryFile::AddEntry(tree, L"S_1", "new");

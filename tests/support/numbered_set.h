@@ -12,13 +12,9 @@ namespace velta_test {
 /// of validity of its own.
 struct NumberedSet {
   explicit NumberedSet(std::uint32_t number, const std::string& datumName = "ROVERS") {
-    constexpr std::int32_t kCellsInARow = 1000;
-    constexpr std::int32_t kCell = 90;        // half arc-seconds
-    constexpr std::int32_t kSouth = 300'000;  // half arc-seconds
-    constexpr std::int32_t kWest = 36'000;    // half arc-seconds
-    constexpr std::uint32_t kSpacing = 30;    // half arc-seconds
-    constexpr std::uint32_t kArea = 22;       // two arc-seconds
-    constexpr std::int32_t kHalvesInTwo = 4;
+    constexpr std::int32_t kCellsInARow = 1000, kHalvesInTwo = 4;
+    constexpr std::int32_t kCell = 90, kSouth = 300'000, kWest = 36'000;  // half arc-seconds
+    constexpr std::uint32_t kSpacing = 30, kArea = 22;  // half and two arc-seconds
     const auto cell = static_cast<std::int32_t>(number);
     grid.phi0 = kSouth + cell / kCellsInARow * kCell;
     grid.lambda0 = kWest + cell % kCellsInARow * kCell;

@@ -99,7 +99,7 @@ TEST_F(IngestTest, WhatIsMissingOrNotSupportedOrNotAnnouncedIsSaid) {
        "velta: system 1: incomplete, not received: 1023, 1025\n"},
       {Frame(1025, 7), "sets: 0 ingested, 0 failed, 1 incomplete",
        "velta: system 7: incomplete, not received: 1021 or 1022\n"},
-      {Datum(1, kLambert, "B"), "system 1: 1021 in B.dff, added",
+      {Datum(1, kLambert, "B") + Frame(1026, 1), "system 1: 1021 in B.dff, added",
        "velta: system 1: 1026: 0x80040638 projection type not supported\n"},
       {Frame(1025, 1) + Datum(1, 0, "C"), "system 1: 1021 in C.dff, added; not announced: 1025",
        ""},
@@ -107,7 +107,8 @@ TEST_F(IngestTest, WhatIsMissingOrNotSupportedOrNotAnnouncedIsSaid) {
        "velta: system 1: 0x80040635 unacceptable computation indicator\n"},
       {Datum(1, 0, ""), "system 1: 1021 in .dff, added",
        "velta: system 1: 0x80040643 no target datum name\n"},
-      {"no frame", "sets: 0 ingested, 0 failed, 0 incomplete", "velta: -: no RTCM 3 frame in it\n"},
+      {"no frame", "sets: 0 ingested, 0 failed, 0 incomplete",
+       "velta: note: -: byte 0: 8 bytes that are no frame\nvelta: -: no RTCM 3 frame in it\n"},
       {"", "sets: 0 ingested, 0 failed, 0 incomplete", "velta: -: no RTCM 3 frame in it\n"},
   };
   for (const auto& [stream, firstLine, err] : cases) {

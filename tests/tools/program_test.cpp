@@ -40,6 +40,8 @@ TEST_F(ProgramTest, DecodeReportsWhatItPassedOver) {
   const Outcome outcome = Run("decode -", good.frame + shortMessage + "?");
   EXPECT_EQ(outcome.out, good.json + "\n");
   EXPECT_EQ(outcome.err,
+            "velta: note: -: byte 31: 1025 ends before its last field\n"
+            "velta: note: -: byte 47: 1 bytes that are no frame\n"
             "velta: note: -: frames: 2 (1025: 1, too short: 1); passed over: 1 bytes, 0 wrong "
             "checksums\n"
             "velta: -: 1 messages end before their last field\n");
@@ -58,7 +60,7 @@ class RoundTripTest : public ProgramTest {
     const Outcome frames = Run(call + " -o @frames");
     EXPECT_EQ(frames.status, 0) << frames.err;
     EXPECT_EQ(frames.out, "");
-    const std::string lines = Run("decode @frames").out;
+    std::string lines = Run("decode @frames").out;
     EXPECT_EQ(Run(call + " --json").out, lines);
     return lines;
   }
@@ -120,10 +122,20 @@ TEST_F(FilesTest, PositionOutsideNamesTheAreas) {
   const Outcome outcome = Run("generate --datum @AUTO_DHDN_BESEL.dff --lat 2 --lon -9.5");
   EXPECT_EQ(outcome.status, 1);
   EXPECT_EQ(outcome.out, "");
-  EXPECT_NE(outcome.err.find("no area holds latitude 2, longitude -9.5 degrees; the areas are\n"
+  EXPECT_NE(outcome.err.find("no area holds latitude 2, longitude -9.5 degrees, or an entry "
+                             "up to the one that does cannot be used; the areas are\n"
                              "  latitude 49.10222 to 53.10222, longitude 8.362778 to 12.36278"),
             std::string::npos)
       << outcome.err;
+}
+
+TEST_F(FilesTest, ListSaysThatAFileIsDamaged) {
+  std::string bytes = Read("AUTO_DHDN_BESEL.dff");
+  bytes[bytes.size() / 2] ^= 1;
+  Write("bad.dff", bytes);
+  const Outcome outcome = Run("list @bad.dff");
+  EXPECT_EQ(outcome.status, 1);
+  EXPECT_NE(outcome.err.find("damaged"), std::string::npos) << outcome.err;
 }
 
 TEST_F(FilesTest, ListShowsPhysicalUnits) {

@@ -20,7 +20,7 @@ std::string Describe(orx::cs::velta::ResultCode code) {
   for (const auto& [known, meaning] : orx::cs::velta::kResultMeanings) {
     if (known == code) return CodeText(code) + " " + meaning;
   }
-  return CodeText(code) + " a code of RTCMGridHost's own";
+  return CodeText(code) + " RTCMGridHost: the file does not exist, or could not be made or opened";
 }
 
 }  // namespace velta_tool

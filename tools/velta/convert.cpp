@@ -35,6 +35,7 @@ int DecodeStream(const Conversion& files) {
     out.FlushMuch();
   }
   out.Flush();
+  for (const std::string& remark : counts.frames.remarks) ReportNote(files.from + ": " + remark);
   if (counts.PassedOver()) ReportNote(files.from + ": " + Summary(counts));
   if (counts.shortMessages > 0) {
     ReportFailure(files.from + ": " + std::to_string(counts.shortMessages) +

@@ -113,17 +113,6 @@ void WriteKey(const TGenericRegistryKey& key, const std::string& indent, Output&
   text += "]}";
 }
 
-std::string_view ErrorText(std::uint32_t error) {
-  switch (error) {
-    case orx::kCannotBeOpened:
-      return "cannot be opened";
-    case orx::kNotARegistryFile:
-      return "not a registry file";
-    default:
-      return "damaged; shown is what could be read";
-  }
-}
-
 int Run(const std::string& file) {
   RequireFile(file);
   const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, kOpenFlags);
@@ -131,11 +120,7 @@ int Run(const std::string& file) {
   WriteKey(TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)), "", out);
   out.pending() += '\n';
   out.Flush();
-  const std::uint32_t error = tree.GetErrorState();
-  if (error == orx::kRegistryOk) return kDone;
-  ReportFailure(file + ": error state " + std::to_string(error) + ": " +
-                std::string(ErrorText(error)));
-  return kFailed;
+  return ReportErrorState(file, tree.GetErrorState()) ? kFailed : kDone;
 }
 
 }  // namespace

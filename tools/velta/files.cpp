@@ -6,6 +6,8 @@
 #include <stdexcept>
 #include <system_error>
 
+#include "command.h"
+#include "orxregistry/in_file_key.h"
 #include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
 #include "text.h"
@@ -95,6 +97,20 @@ void Output::Flush() {
   if (!written) {
     throw FileError(name_ == kStandardStream ? "standard output" : name_, "cannot be written");
   }
+}
+
+bool ReportErrorState(const std::string& file, std::uint32_t error) {
+  if (error == orx::kRegistryOk) return false;
+  const char* text = "damaged; shown is what could be read";
+  if (error == orx::kCannotBeOpened) text = "cannot be opened";
+  if (error == orx::kNotARegistryFile) text = "not a registry file";
+  ReportFailure(file + ": error state " + std::to_string(error) + ": " + text);
+  return true;
+}
+
+bool ReportErrorState(const std::string& file) {
+  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, 0);
+  return ReportErrorState(file, tree.GetErrorState());
 }
 
 }  // namespace velta_tool

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <CLI/App.hpp>
+#include <cstdint>
 #include <filesystem>
 #include <fstream>
 #include <streambuf>
@@ -69,5 +70,13 @@ class Output {
   std::streambuf* buffer_;
   std::string pending_;
 };
+
+/// Says on standard error what is wrong with a registry file.
+/// \param error its error state
+/// \return false when nothing is
+bool ReportErrorState(const std::string& file, std::uint32_t error);
+
+/// As above, for a file that the library reads without telling its state.
+bool ReportErrorState(const std::string& file);
 
 }  // namespace velta_tool

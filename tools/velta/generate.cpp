@@ -53,11 +53,13 @@ std::string Decimal(double number) {
   return text;
 }
 
-/// Says that no area of a datum file holds the position, and which areas there are.
+/// Says that a datum file has no entry to use for the position, and which areas there are. The
+/// library does not tell an area that is not there from an entry that it cannot use.
 std::runtime_error NoAreaError(const Options& options, const RTCMGenerator& generator) {
   const auto datums = generator.getAllDatums();
   std::string text = options.datum + ": no area holds latitude " + Decimal(options.latitude) +
-                     ", longitude " + Decimal(options.longitude) + " degrees";
+                     ", longitude " + Decimal(options.longitude) +
+                     " degrees, or an entry up to the one that does cannot be used";
   if (datums.empty()) return std::runtime_error(text + "; the file has no complete entry");
   text += "; the areas are";
   for (std::size_t i = 0; i < datums.size() && i < kMostAreasNamed; ++i) {
@@ -90,18 +92,20 @@ std::vector<Message> Generate(const Options& options) {
       messages.emplace_back(*grid);
       announced |= kAnnounce1023;
     } else {
-      ReportNote(options.datum + ": no residual grid covers the position, no 1023 sent");
+      ReportNote(options.datum + ": no usable residual grid covers the position, no 1023 sent");
     }
   }
   if (!options.projection.empty()) {
     RequireFile(options.projection);
     if (options.northing && options.easting) {
-      if (const auto grid = generator.get1024(*options.northing, *options.easting, 0)) {
-        messages.emplace_back(*grid);
-        announced |= kAnnounce1024;
-      } else {
-        ReportNote(options.projection + ": no residual grid covers the position, no 1024 sent");
+      const auto grid = generator.get1024(*options.northing, *options.easting, 0);
+      if (!grid) {
+        throw std::runtime_error(options.projection + ": no usable residual grid covers northing " +
+                                 Decimal(*options.northing) + ", easting " +
+                                 Decimal(*options.easting) + " metres");
       }
+      messages.emplace_back(*grid);
+      announced |= kAnnounce1024;
     }
     const auto projection = generator.getRtcmProjMessage();
     if (!projection) throw std::runtime_error(options.projection + ": no usable projection in it");

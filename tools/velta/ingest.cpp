@@ -7,6 +7,7 @@
 #include <initializer_list>
 #include <map>
 #include <memory>
+#include <set>
 #include <string>
 #include <system_error>
 #include <utility>
@@ -98,7 +99,10 @@ class Ingestion {
       out_.Flush();
       progress_.Show(totals_.stream.frames.bytes);
     });
+    totals_.stream.frames.remarks.clear();
     while (const rtcm3::Message* message = messages.Next()) Take(*message);
+    for (const std::string& remark : totals_.stream.frames.remarks)
+      ReportNote(file + ": " + remark);
     if (totals_.stream.frames.frames == framesBefore) Fail(file + ": no RTCM 3 frame in it");
   }
 
@@ -120,6 +124,10 @@ class Ingestion {
  private:
   void Take(const rtcm3::Message& message) {
     const std::uint32_t systemId = rtcm3::SystemIdOf(message);
+    if (std::holds_alternative<rtcm3::Rtcm1026>(message)) {
+      NameUnsupported(systemId);
+      return;
+    }
     MessageSet& set = sets_[systemId];
     set.Put(message, *support_);
     if (!set.Complete()) return;
@@ -137,9 +145,14 @@ class Ingestion {
     const std::string system = "system " + std::to_string(systemId) + ": ";
     ++(result == orx::cs::velta::kSuccess ? totals_.ingested : totals_.failed);
     if (result != orx::cs::velta::kSuccess) Fail(system + Describe(result));
-    if (set.Announces(1026)) {
-      Fail(system + "1026: " + Describe(orx::cs::velta::kUnsupportedProjection));
-    }
+    if (set.Announces(1026)) NameUnsupported(systemId);
+  }
+
+  /// Says, once for each system, that a 1026 is not taken.
+  void NameUnsupported(std::uint32_t systemId) {
+    if (!unsupported_.insert(systemId).second) return;
+    Fail("system " + std::to_string(systemId) +
+         ": 1026: " + Describe(orx::cs::velta::kUnsupportedProjection));
   }
 
   std::vector<IngestedPart> PartsOf(const MessageSet& set) {
@@ -176,6 +189,7 @@ class Ingestion {
   SizeWatch datumFiles_;
   SizeWatch projectionFiles_;
   std::map<std::uint32_t, MessageSet> sets_;
+  std::set<std::uint32_t> unsupported_;  ///< systems whose 1026 has been named
   IngestTotals totals_;
   int status_ = kDone;
   Output out_;

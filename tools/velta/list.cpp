@@ -54,7 +54,10 @@ int ListProjection(const Options& options) {
 
 int Run(const Options& options) {
   RequireFile(options.file);
-  return KindOf(options.file) == FileKind::kDatum ? ListDatums(options) : ListProjection(options);
+  const bool isDamaged = ReportErrorState(options.file);
+  const int status =
+      KindOf(options.file) == FileKind::kDatum ? ListDatums(options) : ListProjection(options);
+  return isDamaged ? kFailed : status;
 }
 
 }  // namespace

@@ -38,12 +38,23 @@ TInFileKey::~TInFileKey() = default;
 bool TInFileKey::Save(bool /*flag*/, unsigned registryVersion) {
   const std::optional<std::filesystem::path> path = ToPath(fileName_);
   if (!path || registryVersion != kRegistryVersion || tree_->error != kRegistryOk) return false;
+  const bool isNew = tree_->position.end == 0;
+  if (isNew) return SaveNew(*path);
   const AppendResult result =
       AppendSegment(*path, tree_->position, tree_->WriteUnsaved(), tree_->superseded());
   if (result == AppendResult::kFailed) return false;
   tree_->MarkSaved();
   // What others appended is in the file and not in this tree.
   if (result == AppendResult::kBehindOthers) tree_->position.stamp = os::FileStamp();
+  return true;
+}
+
+bool TInFileKey::SaveNew(const std::filesystem::path& path) {
+  const record::Buffer file = MakeRegistryFile(tree_->description, tree_->WriteAll());
+  const std::optional<os::FileStamp> stamp = PublishFile(path, file, false);
+  if (!stamp) return false;
+  tree_->MarkSaved();
+  tree_->position = {*stamp, file.size(), 0};
   return true;
 }
 

@@ -56,7 +56,9 @@ bool RenameToNewName(const char* from, const char* to) {
 }  // namespace
 
 std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
-  const int handle = Retry([&] { return open(path.c_str(), O_RDONLY | O_CLOEXEC); });
+  // Not to wait for somebody to write into a pipe of that name.
+  const int flags = O_RDONLY | O_CLOEXEC | O_NONBLOCK;
+  const int handle = Retry([&] { return open(path.c_str(), flags); });
   if (handle < 0) return std::nullopt;
   return File(handle);
 }

@@ -29,8 +29,7 @@ bool Ask(const COrxStringT<wchar_t>& name, Question question) {
 
 bool isFileExists(const COrxStringT<wchar_t>& name) {
   return Ask(name, [](const fs::path& path, std::error_code& error) {
-    const fs::file_status status = fs::status(path, error);
-    return fs::exists(status) && !fs::is_directory(status);
+    return fs::is_regular_file(path, error);
   });
 }
 

@@ -2,6 +2,8 @@
 
 namespace orx::cs::projmath {
 
+Ellipsoid Ellipsoid::Wgs84() { return FromInverseFlattening(6378137.0, 298.257223563); }
+
 Ellipsoid Ellipsoid::FromAxes(double a, double b) {
   Ellipsoid ellipsoid;
   ellipsoid.a = a;

@@ -34,7 +34,11 @@ void AppendFrame(std::string_view payload, std::string& out) {
 }
 
 FrameReader::FrameReader(std::streambuf& in, FrameCounts& counts, std::function<void()> beforeRead)
-    : in_(in), counts_(counts), beforeRead_(std::move(beforeRead)), buffer_(kBufferSize) {}
+    : in_(in),
+      counts_(counts),
+      beforeRead_(std::move(beforeRead)),
+      buffer_(kBufferSize),
+      bytesBefore_(counts.bytes) {}
 
 std::optional<FrameReader::Payload> FrameReader::Next() {
   while (SkipToPreamble()) {
@@ -47,14 +51,35 @@ std::optional<FrameReader::Payload> FrameReader::Next() {
     const std::size_t checked = size - kCrcSize;
     if (Crc(frame, checked) != boost::endian::load_big_u24(frame + checked)) {
       ++counts_.badCrcs;
+      ++skippedCrcs_;
       Skip(1);
       continue;
     }
+    EndSkipping();
     ++counts_.frames;
+    frameAt_ = Place();
     begin_ += size;
     return Payload(frame + kHeaderSize, checked - kHeaderSize);
   }
+  EndSkipping();
   return std::nullopt;
+}
+
+void FrameReader::RemarkAt(std::uint64_t place, const std::string& what) {
+  if (remarksLeft_ == 0) return;
+  --remarksLeft_;
+  counts_.remarks.push_back("byte " + std::to_string(place) + ": " + what);
+}
+
+/// Remarks on what was skipped up to here.
+void FrameReader::EndSkipping() {
+  if (skipped_ == 0) return;
+  std::string what = std::to_string(skipped_) + " bytes that are no frame";
+  if (skippedCrcs_ > 0) what += ", " + std::to_string(skippedCrcs_) + " wrong checksums among them";
+  if (endsInFrame_) what += "; the stream ends inside a frame";
+  RemarkAt(skippedAt_, what);
+  skipped_ = skippedCrcs_ = 0;
+  endsInFrame_ = false;
 }
 
 /// Moves to the next byte that may begin a frame.
@@ -73,17 +98,24 @@ bool FrameReader::SkipToPreamble() {
 }
 
 void FrameReader::Skip(std::size_t bytes) {
+  if (skipped_ == 0) skippedAt_ = Place();
+  skipped_ += bytes;
   begin_ += bytes;
   counts_.skippedBytes += bytes;
 }
 
 /// Size of the frame that begins here, 0 when none does or the stream ends inside it.
 std::size_t FrameReader::FrameSize() {
-  if (!Require(kHeaderSize)) return 0;
+  if (!Require(kHeaderSize)) {
+    endsInFrame_ = true;
+    return 0;
+  }
   const std::uint8_t* header = buffer_.data() + begin_;
   if ((header[1] & kReservedBits) != 0) return 0;
   const std::size_t size = kHeaderSize + boost::endian::load_big_u16(header + 1) + kCrcSize;
-  return Require(size) ? size : 0;
+  if (Require(size)) return size;
+  endsInFrame_ = true;
+  return 0;
 }
 
 /// Makes so many bytes available; false when the stream ends before.

@@ -24,7 +24,11 @@ struct FrameCounts {
   std::uint64_t frames = 0;        ///< whole, with the right checksum
   std::uint64_t skippedBytes = 0;  ///< outside those frames
   std::uint64_t badCrcs = 0;       ///< places that looked like a frame but for the checksum
+  /// Where bytes were passed over and why, up to the first kMostRemarks of a stream.
+  std::vector<std::string> remarks;
 };
+
+inline constexpr std::size_t kMostRemarks = 10;
 
 /// Finds the frames in a stream of bytes. After a place that fails, the search goes on one byte
 /// behind its first.
@@ -41,7 +45,13 @@ class FrameReader {
   /// \return the next frame's payload, valid until the next call; nothing at the end
   std::optional<Payload> Next();
 
+  /// Adds a remark about the last frame.
+  void Remark(const std::string& what) { RemarkAt(frameAt_, what); }
+
  private:
+  std::uint64_t Place() const { return counts_.bytes - bytesBefore_ - (end_ - begin_); }
+  void RemarkAt(std::uint64_t place, const std::string& what);
+  void EndSkipping();
   bool SkipToPreamble();
   void Skip(std::size_t bytes);
   std::size_t FrameSize();
@@ -54,6 +64,13 @@ class FrameReader {
   std::vector<std::uint8_t> buffer_;
   std::size_t begin_ = 0;
   std::size_t end_ = 0;
+  std::uint64_t bytesBefore_;  ///< counted before this stream
+  std::uint64_t frameAt_ = 0;  ///< place of the last frame in the stream
+  std::size_t remarksLeft_ = kMostRemarks;
+  std::uint64_t skippedAt_ = 0;  ///< place, bytes and bad checksums of the run being skipped
+  std::uint64_t skipped_ = 0;
+  std::uint64_t skippedCrcs_ = 0;
+  bool endsInFrame_ = false;  ///< the stream ends before what looks like a frame does
 };
 
 }  // namespace velta_tool::rtcm3

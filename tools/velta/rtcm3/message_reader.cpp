@@ -43,6 +43,8 @@ const Message* MessageReader::Next() {
         break;
       case Decoded::kTooShort:
         ++counts_.shortMessages;
+        frames_.Remark(std::to_string((*payload)[0] << 4 | (*payload)[1] >> 4) +
+                       " ends before its last field");
         break;
     }
   }

@@ -2,6 +2,7 @@
 
 #include <boost/thread/recursive_mutex.hpp>
 #include <cstdint>
+#include <filesystem>
 #include <memory>
 
 #include "orxregistry/export.h"
@@ -56,8 +57,8 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
              const void* stringLookup, bool openExisting, unsigned flags);
   ~TInFileKey() override;
 
-  /// Appends what changed since the last save to the tree's own file, or writes the file afresh
-  /// when more than half of it is superseded. Durable when it returns true. When it returns
+  /// Appends what changed since the last save to the tree's own file, which is made for a new tree,
+  /// or writes the file afresh when more than half of it is superseded. Durable when it returns true. When it returns
   /// false, what was durable stays loadable and the tree keeps its changes for another try.
   /// \param flag no meaning here
   /// \param registryVersion kRegistryVersion
@@ -76,6 +77,8 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
   void Reload();
 
  private:
+  bool SaveNew(const std::filesystem::path& path);
+
   COrxStringT<wchar_t> fileName_;
 };
 

@@ -8,7 +8,7 @@
 /// Questions to the file system. Nothing here throws for a name that the system does not take.
 namespace orx::FileFuncs {
 
-/// True when a file (not a directory) of that name exists.
+/// True when a regular file of that name exists.
 ORXUTILS_EXPORT bool isFileExists(const COrxStringT<wchar_t>& name);
 
 /// True when a directory of that name exists.

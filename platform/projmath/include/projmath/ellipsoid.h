@@ -6,20 +6,21 @@
 
 namespace orx::cs::projmath {
 
-/// An ellipsoid of revolution, defined by its semi-major axis and a second value, WGS 84 unless
-/// set otherwise.
+/// An ellipsoid of revolution, defined by its semi-major axis and a second value.
 struct Ellipsoid {
   /// What `second` means.
   enum Kind : std::uint8_t { kInverseFlattening = 0, kSemiMinorAxis = 2 };
 
-  double a = 6378137.0;           ///< semi-major axis, metres
-  double second = 298.257223563;  ///< second defining value, see `kind`
+  double a = 0.0;       ///< semi-major axis, metres
+  double second = 0.0;  ///< second defining value, see `kind`
   std::uint8_t kind = kInverseFlattening;
 
   double semiMinorAxis = 0.0;        ///< b, metres; derived
   double flattening = 0.0;           ///< f = (a - b) / a; derived
   double eccentricitySquared = 0.0;  ///< e^2 = f (2 - f); derived
 
+  /// WGS 84, by its inverse flattening. Source: NGA.STND.0036, table 3.1.
+  PROJMATH_EXPORT static Ellipsoid Wgs84();
   /// An ellipsoid given by its two axes in metres, completed.
   PROJMATH_EXPORT static Ellipsoid FromAxes(double a, double b);
   /// An ellipsoid given by its semi-major axis in metres and its inverse flattening, completed.
