@@ -4,6 +4,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <functional>
 
 #include "file_faults.h"
@@ -131,7 +132,13 @@ TEST_P(SaveUnderFaults, AProcessKilledAnywhereLosesNothing) {
   }
 }
 
-INSTANTIATE_TEST_SUITE_P(Saves, SaveUnderFaults, ::testing::ValuesIn(kScenarios));
+std::string NameOf(const ::testing::TestParamInfo<Scenario>& scenario) {
+  std::string name = scenario.param.what;
+  std::replace(name.begin(), name.end(), ' ', '_');
+  return name;
+}
+
+INSTANTIATE_TEST_SUITE_P(Saves, SaveUnderFaults, ::testing::ValuesIn(kScenarios), NameOf);
 
 }  // namespace
 }  // namespace velta_test

@@ -58,10 +58,9 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
   ~TInFileKey() override;
 
   /// Appends what changed since the last save to the tree's own file, which is made for a new tree,
-  /// or writes the file afresh when more than half of it is superseded. Durable when it returns true. When it returns
-  /// false, what was durable stays loadable and the tree keeps its changes for another try.
-  /// \param flag no meaning here
-  /// \param registryVersion kRegistryVersion
+  /// or writes the file afresh when more than half of it is superseded. Durable when it returns
+  /// true. When it returns false, what was durable stays loadable and the tree keeps its changes
+  /// for another try. \param flag no meaning here \param registryVersion kRegistryVersion
   bool Save(bool flag, unsigned registryVersion);
 
   /// Writes the whole tree to a new file, whole or not at all; durable when it returns true. A
