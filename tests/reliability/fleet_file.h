@@ -33,9 +33,12 @@ class FleetFile {
   orx::TCSInFileKey Load() const { return {path(), nullptr, nullptr, true, 97}; }
 
   static bool Holds(const orx::TCSInFileKey& tree, std::uint32_t number) {
+    return Holds(tree, NumberedSet(number).EntryName());
+  }
+  static bool Holds(const orx::TCSInFileKey& tree, const std::wstring& entry) {
     const orx::TGenericRegistryKey root{orx::TGenericRegistryKeyPtr(tree)};
     const orx::TGenericRegistryKey container(orx::TGenRegKeyIterator(root)++);
-    return container.HasKey(NumberedSet(number).EntryName());
+    return container.HasKey(entry);
   }
 
  private:

@@ -43,9 +43,14 @@ class KillMachine {
   void StartWriter() {
     const std::uint32_t first = nextWriter_++ * kNumbersOfAWriter;
     Start(true, [this, first](int report) {
-      orx::cs::velta::RTCMDataSupport support(file_.directory().c_str(), nullptr);
+      const std::wstring directory = file_.directory();
+      orx::cs::velta::RTCMDataSupport support(directory.c_str(), directory.c_str());
+      orx::cs::velta::Rtcm1025 projection;
+      projection.projectionType = 1;
       for (std::uint32_t number = first;; ++number) {
+        projection.laNO = number;
         if (FleetFile::Ingest(support, number) != 0) _exit(kRefused);
+        if (support.ParseProjectionMessages(projection, nullptr) != 0) _exit(kRefused);
         if (write(report, &number, sizeof number) != sizeof number) _exit(0);
       }
     });
@@ -85,10 +90,15 @@ class KillMachine {
   void CheckAcknowledged() {
     for (const Process& process : processes_) Collect(process);
     if (acknowledged_.empty()) return;
-    const orx::TCSInFileKey tree = file_.Load();
-    ASSERT_EQ(tree.GetErrorState(), orx::kRegistryOk);
+    const orx::TCSInFileKey datums = file_.Load();
+    const orx::TCSInFileKey projections(file_.directory() + L"ROVERS.prj", nullptr, nullptr, true,
+                                        97);
+    ASSERT_EQ(datums.GetErrorState(), orx::kRegistryOk);
+    ASSERT_EQ(projections.GetErrorState(), orx::kRegistryOk);
     for (const std::uint32_t number : acknowledged_) {
-      ASSERT_TRUE(FleetFile::Holds(tree, number)) << "lost: " << number;
+      ASSERT_TRUE(FleetFile::Holds(datums, number)) << "lost: " << number;
+      const std::wstring entry = L"S_" + std::to_wstring(number) + L"_0";
+      ASSERT_TRUE(FleetFile::Holds(projections, entry)) << "lost projection: " << number;
     }
   }
 
