@@ -24,11 +24,10 @@ namespace orx::cs::velta {
 /// shared files themselves are guarded by their own mutexes.
 class RTCMDataSupport {
  public:
-  /// \param datumDirectory directory of the datum files, ending in a separator; taken as it is.
-  /// Null:
-  ///     the user's geodetic directory and "/datums/rtcmdata/".
-  /// \param projectionDirectory the same for projection files; null: "/projections/rtcmdata/".
   /// Loads the sibling library if it can; makes no directory.
+  /// \param datumDirectory directory of the datum files, ending in a separator; taken as it is.
+  ///     Null: the user's geodetic directory and "/datums/rtcmdata/".
+  /// \param projectionDirectory the same for projection files; null: "/projections/rtcmdata/"
   VELTA_EXPORT explicit RTCMDataSupport(const wchar_t* datumDirectory = nullptr,
                                         const wchar_t* projectionDirectory = nullptr);
 
