@@ -61,10 +61,11 @@ boost::shared_ptr<RtcmMessage> Finish(Message message, std::int32_t systemId) {
 boost::shared_ptr<RtcmMessage> RTCMGenerator::getRtcmProjMessage() const {
   const TGenericRegistryKey entry = FirstSubKey(OpenContainer(projFile));
   const TGenericRegistryKey standard = OpenExisting(entry, layout::kStandardProjection);
-  if (!HasKindAndDimension(standard, layout::kProjectionType)) return nullptr;
+  COrxStringT<wchar_t> typeName;
+  if (!Read(standard, layout::kProjectionType, typeName)) return nullptr;
   Parameters parameters;
   if (!Read(standard, layout::kProjectionParameters, parameters)) return nullptr;
-  const auto type = getRtcmPrjTypeFromString(Read(standard, layout::kProjectionType));
+  const auto type = getRtcmPrjTypeFromString(typeName);
   if (type == ProjectionData::NONE) return nullptr;
   if (type == ProjectionData::OM || type == ProjectionData::ROM) {
     return Finish(Make1027(type == ProjectionData::ROM, parameters), systemId);

@@ -43,11 +43,12 @@ RTCMGenerator::~RTCMGenerator() = default;
 std::vector<DatumData, orx_dl_allocator<DatumData>> RTCMGenerator::getAllDatums() const {
   std::vector<DatumData, orx_dl_allocator<DatumData>> datums;
   const TGenericRegistryKey container = OpenContainer(datumFile);
+  std::size_t entries = 0;
+  for (TGenRegKeyIterator walk(container); walk; walk++) ++entries;
+  datums.reserve(entries);
   for (TGenRegKeyIterator walk(container); walk;) {
-    DatumData datum;
-    if (ReadDatum(container, TGenericRegistryKey(walk++), datum)) {
-      datums.push_back(std::move(datum));
-    }
+    datums.emplace_back();
+    if (!ReadDatum(container, TGenericRegistryKey(walk++), datums.back())) datums.pop_back();
   }
   return datums;
 }

@@ -23,13 +23,6 @@ bool ReadEllipsoid(const TGenericRegistryKey& standard, const DoublesOf<2>& valu
   return true;
 }
 
-bool ReadText(const TGenericRegistryKey& key, const layout::Text& value,
-              COrxStringT<wchar_t>& text) {
-  if (!HasKindAndDimension(key, value)) return false;
-  text = Read(key, value);
-  return true;
-}
-
 }  // namespace
 
 TGenericRegistryKey OpenContainer(const COrxStringT<wchar_t>& fileName) {
@@ -56,10 +49,12 @@ bool ReadTransformation(const TGenericRegistryKey& container, const TGenericRegi
   const bool hasRotationPoint = datum.computationIndicator == kMolodenskiBadekas;
   std::copy_n(parameters, hasRotationPoint ? kBadekasParameters : kHelmertParameters,
               datum.parameters);
-  if (!HasKindAndDimension(standard, layout::kHeightIndicator)) return false;
-  datum.heightIndicator = static_cast<std::uint32_t>(Read(standard, layout::kHeightIndicator));
-  return ReadText(standard, layout::kSourceDatumName, datum.sourceDatumName) &&
-         ReadText(container, layout::kDatumFileName, datum.targetDatumName);
+  signed char height = 0;
+  if (standard.GetValueDim(layout::kHeightIndicator.name) != kValueDimension) return false;
+  if (!Read(standard, layout::kHeightIndicator, height)) return false;
+  datum.heightIndicator = static_cast<std::uint32_t>(height);
+  return Read(standard, layout::kSourceDatumName, datum.sourceDatumName) &&
+         Read(container, layout::kDatumFileName, datum.targetDatumName);
 }
 
 }  // namespace orx::cs::velta

@@ -9,7 +9,7 @@ namespace orx::cs::velta {
 bool ReadDoubles(const TGenericRegistryKey& key, const wchar_t* name, double* to,
                  std::size_t count) {
   const std::size_t bytes = count * sizeof(double);
-  if (!key.HasValue(name) || key.GetValueSize(name) != bytes) return false;
+  if (key.GetValueSize(name) != bytes) return false;
   TSimpleBinValue block;
   // Text may end before its stored size does.
   if (!key.GetValue(name, block, 0, false)) return false;

@@ -48,20 +48,6 @@ bool Has(const TGenericRegistryKey& key, const ValueOf<T>& value) {
   return key.HasValue(value.name) != 0;
 }
 
-/// True when the key has the value with the type code and, but for text, the size of its kind.
-template <class T>
-bool HasKind(const TGenericRegistryKey& key, const ValueOf<T>& value) {
-  const TBinValue<T> kind{T()};
-  return Has(key, value) && key.GetValueType(value.name) == kind.GetType() &&
-         (kind.GetSize() == 0 || key.GetValueSize(value.name) == kind.GetSize());
-}
-
-/// As HasKind, with the dimension that values are written with.
-template <class T>
-bool HasKindAndDimension(const TGenericRegistryKey& key, const ValueOf<T>& value) {
-  return HasKind(key, value) && key.GetValueDim(value.name) == kValueDimension;
-}
-
 /// \return the stored value, `T()` when there is none of that kind
 template <class T>
 T Read(const TGenericRegistryKey& key, const ValueOf<T>& value) {
@@ -69,9 +55,24 @@ T Read(const TGenericRegistryKey& key, const ValueOf<T>& value) {
   return key.GetValue(value.name, stored, 0, false) ? stored.GetTypedValue() : T();
 }
 
-inline COrxStringT<wchar_t> Read(const TGenericRegistryKey& key,
-                                 const ValueOf<COrxStringT<wchar_t>>& value) {
-  return GetRegValue<COrxStringT<wchar_t>>(key, value.name, COrxStringT<wchar_t>(), 0);
+/// Reads a value that must have the type code and the size of its kind.
+/// \return false when there is none; `to` is then as it was
+template <class T>
+bool Read(const TGenericRegistryKey& key, const ValueOf<T>& value, T& to) {
+  TBinValue<T> stored{T()};
+  if (!key.GetValue(value.name, stored, 0, false)) return false;
+  to = stored.GetTypedValue();
+  return true;
+}
+
+/// Reads a text that must have the dimension that values are written with.
+/// \return false when there is none; `to` is then as it was
+inline bool Read(const TGenericRegistryKey& key, const ValueOf<COrxStringT<wchar_t>>& value,
+                 COrxStringT<wchar_t>& to) {
+  const bool isText =
+      key.GetValueType(value.name) == kWideString && key.GetValueDim(value.name) == kValueDimension;
+  if (isText) to = GetRegValue<COrxStringT<wchar_t>>(key, value.name, {}, 0);
+  return isText;
 }
 
 /// Reads a block of exactly so many doubles, whatever its type code.

@@ -52,8 +52,9 @@ template <class Stored, class Held, std::size_t count>
 bool ReadSettings(const TGenericRegistryKey& key, const Setting<Stored, Held> (&settings)[count],
                   TableData& table) {
   return std::all_of(std::begin(settings), std::end(settings), [&](const auto& setting) {
-    if (!HasKind(key, setting.value)) return false;
-    table.*setting.member = Read(key, setting.value);
+    Stored stored = {};
+    if (!Read(key, setting.value, stored)) return false;
+    table.*setting.member = stored;
     return true;
   });
 }
@@ -93,8 +94,9 @@ ResultCode WriteResidualGrid(const TGenericRegistryKey& entry, const layout::Res
 
 bool ReadGridArea(const TGenericRegistryKey& gridKey, const layout::ResidualGrid& grid,
                   StoredGrid& stored) {
-  if (!Has(gridKey, layout::kRows) || !Has(gridKey, layout::kColumns)) return false;
+  if (!Has(gridKey, layout::kRows)) return false;
   stored.rows = Read(gridKey, layout::kRows);
+  if (!Has(gridKey, layout::kColumns)) return false;
   stored.columns = Read(gridKey, layout::kColumns);
   double(&bounds)[6] = stored.table.bounds;
   if (!Read(gridKey, grid.boundaries, bounds)) return false;

@@ -22,6 +22,32 @@ void AppendRecord(record::Buffer& to, ValueRecord value) {
 
 record::Name NameOf(const TGenericRegistryKeyImp* key) { return key->name(); }
 
+bool VisitedValues::Visit(const TGenericRegistryKeyImp& key, const unsigned char* record) {
+  key_ = nullptr;
+  count_ = 0;
+  last_ = 0;
+  record::Bytes bytes = record::KeyAt(record).values;
+  while (!bytes.empty()) {
+    const ValueRecord start = bytes.data();
+    const std::optional<record::Value> value = record::TakeValue(bytes);
+    if (!value || count_ == kMost) return false;
+    const auto place = std::find_if(
+        values_, values_ + count_, [&](ValueRecord other) { return NameOf(other) == value->name; });
+    *place = start;  // of several of one name the last counts
+    if (place == values_ + count_) ++count_;
+  }
+  key_ = &key;
+  return true;
+}
+
+ValueRecord VisitedValues::Find(LookupName& name) {
+  for (std::size_t i = 0; i < count_; ++i) {
+    if (name == NameOf(values_[last_])) return values_[last_];
+    last_ = last_ + 1 == count_ ? 0 : last_ + 1;
+  }
+  return nullptr;
+}
+
 KeyTree::KeyTree(std::u16string text)
     : description(std::move(text)),
       root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {}
@@ -102,32 +128,13 @@ NamedList<KeyTree::Key*>& KeyTree::TakeKeys(Key& key) {
   return *key.keys_;
 }
 
-KeyTree::Key* KeyTree::FindKey(Key& key, const record::Name& name) {
-  const auto& keys = TakeKeys(key);
-  const std::size_t place = keys.Find(name);
-  return place == keys.items().size() ? nullptr : keys.items()[place];
-}
-
-ValueRecord KeyTree::FindValue(Key& key, const record::Name& name) {
-  if (!key.values_ && key.HasOneLayer()) return FindWhereItLies(key, name);
+ValueRecord KeyTree::FindValue(Key& key, LookupName& name) {
+  const bool readWhereTheyLie = !key.values_ && key.HasOneLayer() &&
+                                (visited_.IsAt(key) || visited_.Visit(key, key.first_.record));
+  if (readWhereTheyLie) return visited_.Find(name);
   const auto& values = TakeValues(key);
   const std::size_t place = values.Find(name);
   return place == values.items().size() ? nullptr : values.items()[place];
-}
-
-ValueRecord KeyTree::FindWhereItLies(const Key& key, const record::Name& name) {
-  ValueRecord found = nullptr;  // the last of several of one name counts
-  record::Bytes bytes = record::KeyAt(key.first_.record).values;
-  while (!bytes.empty()) {
-    const ValueRecord start = bytes.data();
-    const std::optional<record::Value> value = record::TakeValue(bytes);
-    if (!value) {
-      error = kDamaged;
-      break;
-    }
-    if (value->name == name) found = start;
-  }
-  return found;
 }
 
 KeyTree::Key* KeyTree::OpenKey(Key& key, const record::Name& name, std::uint8_t dimension) {

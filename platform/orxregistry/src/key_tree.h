@@ -16,8 +16,7 @@
 namespace orx {
 
 /// A key in memory: the records that are laid over one another to make it. Its sub-keys and its
-/// values are each taken apart when they are first needed; the values of a key of one record are
-/// read where they lie.
+/// values are each taken apart when they are first needed.
 class TGenericRegistryKeyImp {
  public:
   TGenericRegistryKeyImp(KeyTree& owner, TGenericRegistryKeyImp* above, const unsigned char* record)
@@ -51,6 +50,26 @@ class TGenericRegistryKeyImp {
   bool keysAreWhole_ = false;    ///< every layer's keys are in `keys_`
 };
 
+/// The values of the key that was looked at last, if it is one record with few of them. Most keys
+/// of a file are read once, value after value, so that a list for each would only cost memory.
+class VisitedValues {
+ public:
+  /// \return false when the key has too many values, or damaged ones
+  bool Visit(const TGenericRegistryKeyImp& key, const unsigned char* record);
+  bool IsAt(const TGenericRegistryKeyImp& key) const { return key_ == &key; }
+  /// Looks at the value found last and those behind it first.
+  /// \return null when there is none of that name
+  ValueRecord Find(LookupName& name);
+
+ private:
+  static constexpr std::size_t kMost = 16;
+
+  const TGenericRegistryKeyImp* key_ = nullptr;
+  std::size_t count_ = 0;
+  std::size_t last_ = 0;
+  ValueRecord values_[kMost];
+};
+
 /// A tree of keys in memory, together with the bytes of the file that it came from. What changed
 /// since it was last saved is kept apart, so that saving costs what changed.
 class KeyTree {
@@ -68,8 +87,13 @@ class KeyTree {
   const std::pmr::vector<ValueRecord>& Values(Key& key) { return TakeValues(key).items(); }
 
   /// \return null when there is none of that name
-  Key* FindKey(Key& key, const record::Name& name);
-  ValueRecord FindValue(Key& key, const record::Name& name);
+  template <class AnyName>
+  Key* FindKey(Key& key, AnyName& name) {
+    const auto& keys = TakeKeys(key);
+    const std::size_t place = keys.Find(name);
+    return place == keys.items().size() ? nullptr : keys.items()[place];
+  }
+  ValueRecord FindValue(Key& key, LookupName& name);
 
   /// \return the sub-key of that name, made when missing; null when it would be too deep or its
   ///     name is too long
@@ -109,7 +133,6 @@ class KeyTree {
   void AddLayer(Key& key, const unsigned char* record);
   NamedList<ValueRecord>& TakeValues(Key& key);
   NamedList<Key*>& TakeKeys(Key& key);
-  ValueRecord FindWhereItLies(const Key& key, const record::Name& name);
   Unsaved& MarkUnsaved(Key& key);
   void WriteUnsaved(record::Buffer& to, const Key& key);
   void WriteAll(record::Buffer& to, Key& key);
@@ -117,6 +140,7 @@ class KeyTree {
   os::Memory file_;
   std::pmr::monotonic_buffer_resource memory_;
   Key* root_;
+  VisitedValues visited_;
   bool changed_ = false;
   std::uint64_t superseded_ = 0;
   std::unordered_map<const Key*, Unsaved> unsaved_;

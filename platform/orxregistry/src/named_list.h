@@ -16,38 +16,47 @@ namespace orx {
 
 class TGenericRegistryKeyImp;
 
-/// The UTF-16 form of a name that is looked up; a plain one needs no memory of its own.
+/// A name that is looked up. It is compared where it lies; only what needs its UTF-16 form makes
+/// it.
 class LookupName {
  public:
-  explicit LookupName(std::wstring_view name) {
-    if (name.size() <= kPlain && std::all_of(name.begin(), name.end(), IsOneUnit)) {
-      std::transform(name.begin(), name.end(), plain_,
-                     [](wchar_t c) { return static_cast<char16_t>(c); });
-      name_ = {reinterpret_cast<const unsigned char*>(plain_), name.size() * sizeof(char16_t)};
-    } else {
-      other_ = ToUtf16(name);
-      name_ = {reinterpret_cast<const unsigned char*>(other_.data()),
-               other_.size() * sizeof(char16_t)};
-    }
+  /// The text must outlive the object.
+  explicit LookupName(std::wstring_view name) : name_(name) {
+    char32_t bits = 0;  // of all characters: no branch in the loop
+    for (const wchar_t c : name) bits |= static_cast<char32_t>(c);
+    isOneUnitEach_ = bits < kFirstSurrogate;
   }
-  LookupName(const LookupName&) = delete;
-  LookupName& operator=(const LookupName&) = delete;
 
-  const record::Name& Get() const { return name_; }
+  bool operator==(const record::Name& stored) {
+    if (!isOneUnitEach_) return Units() == stored;
+    if (stored.bytes != name_.size() * sizeof(char16_t)) return false;
+    char32_t difference = 0;
+    for (std::size_t i = 0; i < name_.size(); ++i) {
+      const auto unit = record::Load<char16_t>(stored.units + i * sizeof(char16_t));
+      difference |= static_cast<char32_t>(name_[i]) ^ unit;
+    }
+    return difference == 0;
+  }
+
+  /// The UTF-16 form, which lives as long as this.
+  record::Name Units() {
+    if (units_.empty()) units_ = ToUtf16(name_);
+    return {reinterpret_cast<const unsigned char*>(units_.data()),
+            units_.size() * sizeof(char16_t)};
+  }
 
  private:
-  static constexpr std::size_t kPlain = 64;
-  static bool IsOneUnit(wchar_t c) { return static_cast<char32_t>(c) < 0xD800; }
+  static constexpr char32_t kFirstSurrogate = 0xD800;
 
-  char16_t plain_[kPlain];
-  std::u16string other_;
-  record::Name name_;
+  std::wstring_view name_;
+  bool isOneUnitEach_;
+  std::u16string units_;
 };
 
 /// A value in memory: its record, in the file's bytes or in the tree's memory.
 using ValueRecord = const unsigned char*;
 
-inline record::Name NameOf(ValueRecord value) { return record::ValueAt(value).name; }
+inline record::Name NameOf(ValueRecord value) { return record::ValueNameAt(value); }
 record::Name NameOf(const TGenericRegistryKeyImp* key);
 
 /// Things with names, in the order in which they were added. Finding one does not get slower with
@@ -60,11 +69,14 @@ class NamedList {
   const std::pmr::vector<Item>& items() const { return items_; }
 
   /// \return the place of the item of that name in `items()`, or their number
+  std::size_t Find(LookupName& name) const {
+    if (index_) return FindIndexed(name.Units());
+    std::size_t place = 0;
+    while (place < items_.size() && !(name == NameOf(items_[place]))) ++place;
+    return place;
+  }
   std::size_t Find(const record::Name& name) const {
-    if (index_) {
-      const auto found = index_->find(name);
-      return found == index_->end() ? items_.size() : *found;
-    }
+    if (index_) return FindIndexed(name);
     std::size_t place = 0;
     while (place < items_.size() && !(NameOf(items_[place]) == name)) ++place;
     return place;
@@ -99,9 +111,7 @@ class NamedList {
   struct Hash {
     using is_transparent = void;
     const NamedList* list;
-    std::size_t operator()(const record::Name& name) const {
-      return std::hash<std::string_view>()({reinterpret_cast<const char*>(name.units), name.bytes});
-    }
+    std::size_t operator()(const record::Name& name) const { return record::HashOf(name); }
     std::size_t operator()(std::size_t place) const { return (*this)(NameOf(list->items_[place])); }
   };
   struct Equal {
@@ -115,6 +125,11 @@ class NamedList {
     }
   };
   using Index = std::pmr::unordered_set<std::size_t, Hash, Equal>;
+
+  std::size_t FindIndexed(const record::Name& name) const {
+    const auto found = index_->find(name);
+    return found == index_->end() ? items_.size() : *found;
+  }
 
   void MakeIndex() {
     std::pmr::polymorphic_allocator<> memory(items_.get_allocator().resource());

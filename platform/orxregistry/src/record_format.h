@@ -1,12 +1,16 @@
 #pragma once
 
+#include <bit>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
+#include <limits>
 #include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "orxregistry/bin_value.h"
 
 /// The bytes of keys and values, in files and in memory alike: see docs/gff-format.md.
 /// Integers are little-endian, nothing is aligned. Nothing here trusts a byte that it reads.
@@ -14,6 +18,8 @@ namespace orx::record {
 
 using Bytes = std::basic_string_view<unsigned char>;
 using Buffer = std::vector<unsigned char>;
+
+static_assert(std::endian::native == std::endian::little, "stored as they stand in memory");
 
 /// Keys nested deeper than this are damage.
 inline constexpr int kMaxDepth = 64;
@@ -41,6 +47,10 @@ struct Name {
   }
 };
 
+/// A hash that nobody outside this process can foresee, so that no file can be made to slow the
+/// look-up of its names.
+std::size_t HashOf(const Name& name);
+
 /// A value: its description, its name, its bytes.
 struct Value {
   std::uint32_t type = 0;
@@ -59,24 +69,95 @@ struct Key {
   Bytes keys;
 };
 
+// Where the fields of a value's header are, and its size.
+inline constexpr std::size_t kDataSizeAt = 0;
+inline constexpr std::size_t kElementSizeAt = 4;
+inline constexpr std::size_t kValueNameUnitsAt = 8;
+inline constexpr std::size_t kTypeAt = 10;
+inline constexpr std::size_t kValueDimensionAt = 11;
+inline constexpr std::size_t kValueHeader = 12;
+
+// The same for a key.
+inline constexpr std::size_t kValuesSizeAt = 0;
+inline constexpr std::size_t kKeysSizeAt = 8;
+inline constexpr std::size_t kKeyNameUnitsAt = 16;
+inline constexpr std::size_t kKeyDimensionAt = 18;
+inline constexpr std::size_t kKeyReservedAt = 19;
+inline constexpr std::size_t kKeyHeader = 20;
+
+inline constexpr std::size_t kUnit = sizeof(char16_t);
+
+inline bool IsTerminatedText(const unsigned char* data, std::size_t size) {
+  if (size < kUnit || size % kUnit != 0) return false;
+  return Load<char16_t>(data + size - kUnit) == 0;
+}
+
 /// True when the description and the data of a value agree: text ends with a zero unit and fills
 /// its data, any other value has as many bytes as one element.
-bool IsConsistent(const Value& value);
+inline bool IsConsistent(const Value& value) {
+  if (value.type == kNoValue || value.type > std::numeric_limits<std::uint8_t>::max()) return false;
+  if (value.name.bytes / kUnit > std::numeric_limits<std::uint16_t>::max()) return false;
+  if (value.elementSize == 0) return IsTerminatedText(value.data, value.dataSize);
+  return value.dataSize == value.elementSize;
+}
 
-/// Takes the value at the front of `bytes` off them; nothing when it is not a whole value.
-std::optional<Value> TakeValue(Bytes& bytes);
-
-/// Takes the key at the front of `bytes` off them; nothing when it is not a whole key.
-std::optional<Key> TakeKey(Bytes& bytes);
+/// The name of a value whose record TakeValue has accepted.
+inline Name ValueNameAt(const unsigned char* record) {
+  return {record + kValueHeader, kUnit * Load<std::uint16_t>(record + kValueNameUnitsAt)};
+}
 
 /// The value whose record TakeValue has accepted.
-Value ValueAt(const unsigned char* record);
-
-/// The key whose record TakeKey has accepted.
-Key KeyAt(const unsigned char* record);
+inline Value ValueAt(const unsigned char* record) {
+  Value value;
+  value.dataSize = Load<std::uint32_t>(record + kDataSizeAt);
+  value.elementSize = Load<std::uint32_t>(record + kElementSizeAt);
+  value.type = record[kTypeAt];
+  value.dimension = record[kValueDimensionAt];
+  value.name = ValueNameAt(record);
+  value.data = value.name.units + value.name.bytes;
+  return value;
+}
 
 /// Bytes of the record of a value.
-std::size_t ValueRecordSize(const Value& value);
+inline std::size_t ValueRecordSize(const Value& value) {
+  return kValueHeader + value.name.bytes + value.dataSize;
+}
+
+/// Takes the value at the front of `bytes` off them; nothing when it is not a whole value.
+inline std::optional<Value> TakeValue(Bytes& bytes) {
+  if (bytes.size() < kValueHeader) return std::nullopt;
+  const Value value = ValueAt(bytes.data());
+  const std::size_t size = ValueRecordSize(value);
+  if (size > bytes.size() || !IsConsistent(value)) return std::nullopt;
+  bytes.remove_prefix(size);
+  return value;
+}
+
+/// The key whose record TakeKey has accepted.
+inline Key KeyAt(const unsigned char* record) {
+  Key key;
+  key.dimension = record[kKeyDimensionAt];
+  key.name.units = record + kKeyHeader;
+  key.name.bytes = kUnit * Load<std::uint16_t>(record + kKeyNameUnitsAt);
+  const unsigned char* const values = key.name.units + key.name.bytes;
+  key.values = Bytes(values, Load<std::uint64_t>(record + kValuesSizeAt));
+  key.keys = Bytes(values + key.values.size(), Load<std::uint64_t>(record + kKeysSizeAt));
+  return key;
+}
+
+/// Takes the key at the front of `bytes` off them; nothing when it is not a whole key.
+inline std::optional<Key> TakeKey(Bytes& bytes) {
+  if (bytes.size() < kKeyHeader) return std::nullopt;
+  const unsigned char* const record = bytes.data();
+  const std::size_t name = kUnit * Load<std::uint16_t>(record + kKeyNameUnitsAt);
+  if (record[kKeyReservedAt] != 0 || bytes.size() - kKeyHeader < name) return std::nullopt;
+  const std::size_t rest = bytes.size() - kKeyHeader - name;
+  const auto values = Load<std::uint64_t>(record + kValuesSizeAt);
+  const auto keys = Load<std::uint64_t>(record + kKeysSizeAt);
+  if (values > rest || keys > rest - values) return std::nullopt;
+  bytes.remove_prefix(kKeyHeader + name + values + keys);
+  return KeyAt(record);
+}
 
 void AppendValue(Buffer& to, const Value& value);
 

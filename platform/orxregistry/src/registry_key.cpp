@@ -21,7 +21,9 @@ COrxStringT<wchar_t> ToWide(const record::Name& name) {
 }
 
 ValueRecord Find(const TGenericRegistryKeyImpPtr& key, std::wstring_view name) {
-  return key ? key->tree->FindValue(*key, LookupName(name).Get()) : nullptr;
+  if (!key) return nullptr;
+  LookupName sought(name);
+  return key->tree->FindValue(*key, sought);
 }
 
 }  // namespace
@@ -32,9 +34,10 @@ TGenericRegistryKey::TGenericRegistryKey(const TGenericRegistryKey& parent, std:
                                          std::uint8_t dimension, bool create) {
   if (parent.IsNull()) return;
   KeyTree& tree = *parent.imp_->tree;
-  const LookupName sought(name);
-  imp_ = Share(parent.imp_, create ? tree.OpenKey(*parent.imp_, sought.Get(), dimension)
-                                   : tree.FindKey(*parent.imp_, sought.Get()));
+  LookupName sought(name);
+  TGenericRegistryKeyImp* key = tree.FindKey(*parent.imp_, sought);
+  if (!key && create) key = tree.OpenKey(*parent.imp_, sought.Units(), dimension);
+  imp_ = Share(parent.imp_, key);
 }
 
 COrxStringT<wchar_t> TGenericRegistryKey::GetName() const {
@@ -46,7 +49,8 @@ std::uint8_t TGenericRegistryKey::GetKeyDim() const {
 }
 
 bool TGenericRegistryKey::HasKey(std::wstring_view name) const {
-  return imp_ && imp_->tree->FindKey(*imp_, LookupName(name).Get());
+  LookupName sought(name);
+  return imp_ && imp_->tree->FindKey(*imp_, sought);
 }
 
 void TGenericRegistryKey::DeepCopy(const TGenericRegistryKey& source) {
@@ -57,12 +61,12 @@ int TGenericRegistryKey::AddValue(std::wstring_view name, const bin_value& value
                                   std::uint8_t dimension, bool /*flag*/) {
   const void* const data = value.GetData();
   if (!imp_ || !data) return 0;
-  const LookupName target(name);
+  LookupName target(name);
   record::Value stored;
   stored.type = value.GetType();
   stored.elementSize = value.GetSize();
   stored.dimension = dimension;
-  stored.name = target.Get();
+  stored.name = target.Units();
   stored.data = static_cast<const unsigned char*>(data);
   stored.dataSize = value.GetByteSize();
   return imp_->tree->SetValue(*imp_, stored) ? 1 : 0;
@@ -118,8 +122,9 @@ COrxStringT<wchar_t> GetRegValue(const TGenericRegistryKey& key, std::wstring_vi
   if (!found) return fallback;
   const record::Value stored = record::ValueAt(found);
   if (stored.type != kWideString || stored.elementSize != 0) return fallback;
-  const COrxStringT<wchar_t> text = ToWide({stored.data, stored.dataSize});
-  return text.substr(0, text.find(L'\0'));
+  std::size_t bytes = 0;
+  while (record::Load<char16_t>(stored.data + bytes) != u'\0') bytes += sizeof(char16_t);
+  return ToWide({stored.data, bytes});
 }
 
 }  // namespace orx

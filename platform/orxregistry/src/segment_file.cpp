@@ -24,6 +24,8 @@ constexpr std::size_t kDescriptionAt = kDescriptionSizeAt + sizeof(std::uint32_t
 constexpr std::size_t kMaxDescription = 4096;
 constexpr std::size_t kChecksum = sizeof(std::uint64_t);
 constexpr std::size_t kMaxFileHeader = kDescriptionAt + kMaxDescription + kChecksum;
+/// A file of so many bytes is read in one piece, whatever it is.
+constexpr std::uint64_t kReadUnasked = 1U << 16U;
 
 // Segment header: mark, zero, size of the tree, superseded bytes, checksum of the tree, checksum of
 // the header itself, for which its place in the file is the seed.
@@ -143,17 +145,19 @@ void FindSegments(Bytes bytes, FileContent& content) {
 FileContent ReadContent(const os::File& file) {
   FileContent content;
   const std::optional<os::FileStamp> stamp = file.Stamp();
-  unsigned char header[kMaxFileHeader];
-  const auto headerSize = file.Read(0, header, sizeof header);
-  if (!stamp || !headerSize) {
+  if (!stamp) {
     content.error = kCannotBeOpened;
     return content;
   }
   content.stamp = *stamp;
-  // No more is read of what is no registry file, however large.
-  if (CheckFileHeader(Bytes(header, *headerSize)) == 0) {
-    content.error = kNotARegistryFile;
-    return content;
+  if (stamp->size > kReadUnasked) {
+    // No more is read of what is no registry file, however large.
+    unsigned char header[kMaxFileHeader];
+    const auto headerSize = file.Read(0, header, sizeof header);
+    if (!headerSize || CheckFileHeader(Bytes(header, *headerSize)) == 0) {
+      content.error = headerSize ? kNotARegistryFile : kCannotBeOpened;
+      return content;
+    }
   }
   content.memory = os::Memory(stamp->size);
   const auto size = file.Read(0, content.memory.get(), stamp->size);
