@@ -54,12 +54,12 @@ void DurableAppender::Append(const std::string& bytes) {
   Require(fdatasync(file_) == 0, "flushing");
 }
 
-void JoinDurably(const fs::path& a, const fs::path& b, const fs::path& to) {
+void JoinDurably(const std::vector<fs::path>& parts, const fs::path& to) {
   const int file = open(to.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0666);
   Require(file >= 0, "opening " + to.string());
-  for (const fs::path& from : {a, b}) {
+  for (const fs::path& part : parts) {
     std::size_t size = 0;
-    const std::unique_ptr<char[]> bytes = ReadAll(from, size);
+    const std::unique_ptr<char[]> bytes = ReadAll(part, size);
     WriteAll(file, bytes.get(), size);
   }
   Require(fdatasync(file) == 0, "flushing");

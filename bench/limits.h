@@ -4,6 +4,7 @@
 #include <filesystem>
 #include <memory>
 #include <string>
+#include <vector>
 
 /// What no file layer can go below: the same bytes, read or made durable, and nothing else.
 namespace velta_bench {
@@ -26,9 +27,8 @@ class DurableAppender {
   int file_;
 };
 
-/// Reads two files and writes the bytes of both into a new one, durably.
-void JoinDurably(const std::filesystem::path& a, const std::filesystem::path& b,
-                 const std::filesystem::path& to);
+/// Reads files and writes the bytes of all into a new one, durably.
+void JoinDurably(const std::vector<std::filesystem::path>& parts, const std::filesystem::path& to);
 
 /// The most memory that this process has had in use, in bytes.
 std::size_t PeakMemory();

@@ -168,9 +168,7 @@ void AddQueries(Suite& suite, const Files& files, int iterations) {
 
 void AddMerging(Suite& suite, const Files& files, int iterations) {
   const fs::path target = files.directory / "target.dff";
-  const auto fresh = [target](const fs::path& from) {
-    fs::copy_file(from, target, fs::copy_options::overwrite_existing);
-  };
+  const auto fresh = [target](const fs::path& from) { JoinDurably({from}, target); };
   suite.Add(
       {"merge as many new entries", files.entries, "read both, write the result", 2.0}, iterations,
       [=](benchmark::State& state) {
@@ -185,7 +183,7 @@ void AddMerging(Suite& suite, const Files& files, int iterations) {
         }
       },
       [=](benchmark::State& state) {
-        for (auto _ : state) JoinDurably(files.Datum(), files.Other(), target);
+        for (auto _ : state) JoinDurably({files.Datum(), files.Other()}, target);
       },
       [=](benchmark::State& state) {
         for (auto _ : state) {

@@ -40,8 +40,7 @@ bool TInFileKey::Save(bool /*flag*/, unsigned registryVersion) {
   if (!path || registryVersion != kRegistryVersion || tree_->error != kRegistryOk) return false;
   const bool isNew = tree_->position.end == 0;
   if (isNew) return SaveNew(*path);
-  const AppendResult result =
-      AppendSegment(*path, tree_->position, tree_->WriteUnsaved(), tree_->superseded());
+  const AppendResult result = AppendUnsaved(*path, *tree_);
   if (result == AppendResult::kFailed) return false;
   tree_->MarkSaved();
   // What others appended is in the file and not in this tree.
@@ -50,11 +49,11 @@ bool TInFileKey::Save(bool /*flag*/, unsigned registryVersion) {
 }
 
 bool TInFileKey::SaveNew(const std::filesystem::path& path) {
-  const record::Buffer file = MakeRegistryFile(tree_->description, tree_->WriteAll());
-  const std::optional<os::FileStamp> stamp = PublishFile(path, file, false);
+  const std::optional<record::Buffer> file = MakeRegistryFile(*tree_);
+  const auto stamp = file ? PublishFile(path, *file, false) : std::nullopt;
   if (!stamp) return false;
   tree_->MarkSaved();
-  tree_->position = {*stamp, file.size(), 0};
+  tree_->position = {*stamp, file->size(), 0};
   return true;
 }
 
@@ -62,9 +61,8 @@ bool TInFileKey::Save(const COrxStringT<wchar_t>& fileName, bool /*flag*/,
                       unsigned registryVersion) {
   const std::optional<std::filesystem::path> path = ToPath(fileName);
   if (!path || registryVersion != kRegistryVersion || tree_->error != kRegistryOk) return false;
-  const record::Buffer tree = tree_->WriteAll();
-  if (tree_->error != kRegistryOk) return false;
-  return PublishFile(*path, MakeRegistryFile(tree_->description, tree), false).has_value();
+  const std::optional<record::Buffer> file = MakeRegistryFile(*tree_);
+  return file && PublishFile(*path, *file, false);
 }
 
 bool TInFileKey::HasUnsavedChanges() const { return tree_->has_unsaved(); }

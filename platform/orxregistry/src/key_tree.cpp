@@ -15,7 +15,7 @@ bool IsSame(const record::Value& a, const record::Value& b) {
 }
 
 void AppendRecord(record::Buffer& to, ValueRecord value) {
-  to.insert(to.end(), value, value + record::ValueRecordSize(record::ValueAt(value)));
+  record::AppendBytes(to, {value, record::ValueRecordSize(record::ValueAt(value))});
 }
 
 }  // namespace
@@ -68,12 +68,17 @@ KeyTree::KeyTree(FileContent content)
   }
 }
 
+/// A copy in the tree's memory.
+const unsigned char* KeyTree::Keep(record::Bytes bytes) {
+  auto* const kept = static_cast<unsigned char*>(memory_.allocate(bytes.size(), 1));
+  std::copy(bytes.begin(), bytes.end(), kept);
+  return kept;
+}
+
 const unsigned char* KeyTree::MakeRecord(const record::Name& name, std::uint8_t dimension) {
   record::Buffer bytes;
   record::KeyWriter(bytes, dimension, name).Close();
-  auto* const made = static_cast<unsigned char*>(memory_.allocate(bytes.size(), 1));
-  std::copy(bytes.begin(), bytes.end(), made);
-  return made;
+  return Keep({bytes.data(), bytes.size()});
 }
 
 void KeyTree::AddLayer(Key& key, const unsigned char* record) {
@@ -157,8 +162,8 @@ bool KeyTree::SetValue(Key& key, const record::Value& value) {
   Unsaved& unsaved = MarkUnsaved(key);
   record::Buffer bytes;
   record::AppendValue(bytes, value);
-  auto* const made = static_cast<unsigned char*>(memory_.allocate(bytes.size(), 1));
-  std::copy(bytes.begin(), bytes.end(), made);
+  const ValueRecord made = Keep({bytes.data(), bytes.size()});
+  unsavedBytes_ += bytes.size();
   if (!replaces) {
     unsaved.values.push_back(made);
     values.Append(made);
@@ -178,6 +183,18 @@ bool KeyTree::SetValue(Key& key, const record::Value& value) {
 void KeyTree::DeepCopy(Key& to, Key& from) {
   if (&to == &from) return;
   KeyTree& source = *from.tree;
+  if (&source != this && source.isAsLoaded_ && from.HasOneLayer() && to.IsBlank()) {
+    // As a whole, and where it lies: this is how entries are copied when files are merged.
+    const unsigned char* const record = from.first_.record;
+    const std::size_t size = record::KeyRecordSize(record);
+    if (record::IsWhole({record, size}, record::kMaxDepth - to.depth)) {
+      lenders_.insert(source.shared_from_this());
+      AddLayer(to, record);
+      MarkUnsaved(to).copied = record;
+      unsavedBytes_ += size;
+      return;
+    }
+  }
   for (const ValueRecord value : source.Values(from)) SetValue(to, record::ValueAt(value));
   // A key laid over one of its own sub-keys grows while it is walked: only what it held counts.
   const std::size_t count = source.Keys(from).size();
@@ -189,31 +206,28 @@ void KeyTree::DeepCopy(Key& to, Key& from) {
 
 KeyTree::Unsaved& KeyTree::MarkUnsaved(Key& key) {
   changed_ = true;
+  isAsLoaded_ = false;
   const auto [entry, isNew] = unsaved_.try_emplace(&key);
   Unsaved& unsaved = entry->second;
   if (isNew && key.parent) MarkUnsaved(*key.parent).keys.push_back(&key);
   return unsaved;
 }
 
-record::Buffer KeyTree::WriteUnsaved() {
-  record::Buffer bytes;
-  if (changed_) WriteUnsaved(bytes, *root_);
-  return bytes;
+void KeyTree::WriteUnsaved(record::Buffer& to) {
+  to.reserve(to.size() + unsavedBytes_);
+  WriteUnsaved(to, *root_);
 }
 
 void KeyTree::WriteUnsaved(record::Buffer& to, const Key& key) {
   record::KeyWriter writer(to, key.dimension(), key.name());
   const Unsaved& unsaved = unsaved_[&key];
+  const record::Key copied = unsaved.copied ? record::KeyAt(unsaved.copied) : record::Key();
+  record::AppendBytes(to, copied.values);
   for (const ValueRecord value : unsaved.values) AppendRecord(to, value);
   writer.EndValues();
+  record::AppendBytes(to, copied.keys);
   for (const Key* const sub : unsaved.keys) WriteUnsaved(to, *sub);
   writer.Close();
-}
-
-record::Buffer KeyTree::WriteAll() {
-  record::Buffer bytes;
-  WriteAll(bytes, *root_);
-  return bytes;
 }
 
 void KeyTree::WriteAll(record::Buffer& to, Key& key) {
@@ -227,6 +241,7 @@ void KeyTree::WriteAll(record::Buffer& to, Key& key) {
 void KeyTree::MarkSaved() {
   changed_ = false;
   superseded_ = 0;
+  unsavedBytes_ = 0;
   unsaved_.clear();
 }
 

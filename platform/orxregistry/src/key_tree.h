@@ -1,7 +1,9 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
 #include <memory_resource>
+#include <set>
 #include <string>
 #include <unordered_map>
 #include <utility>
@@ -40,6 +42,11 @@ class TGenericRegistryKeyImp {
   };
 
   bool HasOneLayer() const { return !first_.next; }
+  /// True when nobody has put anything into it or looked for anything in it.
+  bool IsBlank() const {
+    const record::Key content = record::KeyAt(first_.record);
+    return HasOneLayer() && !values_ && !keys_ && content.values.empty() && content.keys.empty();
+  }
 
   Layer first_;
   Layer* last_ = nullptr;  ///< null: the first is the last
@@ -72,7 +79,7 @@ class VisitedValues {
 
 /// A tree of keys in memory, together with the bytes of the file that it came from. What changed
 /// since it was last saved is kept apart, so that saving costs what changed.
-class KeyTree {
+class KeyTree : public std::enable_shared_from_this<KeyTree> {
  public:
   using Key = TGenericRegistryKeyImp;
 
@@ -108,10 +115,10 @@ class KeyTree {
   bool has_unsaved() const { return changed_; }
   /// Bytes of saved values that unsaved ones replace.
   std::uint64_t superseded() const { return superseded_; }
-  /// The record of the root with what is not saved; empty when there is nothing.
-  record::Buffer WriteUnsaved();
-  /// The record of the root with everything.
-  record::Buffer WriteAll();
+  /// Appends the record of the root with what is not saved.
+  void WriteUnsaved(record::Buffer& to);
+  /// Appends the record of the root with everything.
+  void WriteAll(record::Buffer& to) { WriteAll(to, *root_); }
   void MarkSaved();
 
   RegistryError error = kRegistryOk;
@@ -120,6 +127,7 @@ class KeyTree {
 
  private:
   struct Unsaved {
+    const unsigned char* copied = nullptr;  ///< a record that all of the key's content came from
     std::vector<ValueRecord> values;
     std::vector<Key*> keys;
   };
@@ -129,6 +137,7 @@ class KeyTree {
     return std::pmr::polymorphic_allocator<>(&memory_).new_object<T>(
         std::forward<Arguments>(arguments)...);
   }
+  const unsigned char* Keep(record::Bytes bytes);
   const unsigned char* MakeRecord(const record::Name& name, std::uint8_t dimension);
   void AddLayer(Key& key, const unsigned char* record);
   NamedList<ValueRecord>& TakeValues(Key& key);
@@ -138,10 +147,13 @@ class KeyTree {
   void WriteAll(record::Buffer& to, Key& key);
 
   os::Memory file_;
+  std::set<std::shared_ptr<KeyTree>> lenders_;  ///< the trees in whose memory copied records lie
   std::pmr::monotonic_buffer_resource memory_;
   Key* root_;
   VisitedValues visited_;
+  bool isAsLoaded_ = true;  ///< the layers of the keys are all there is
   bool changed_ = false;
+  std::size_t unsavedBytes_ = 0;  ///< what WriteUnsaved() will write at least
   std::uint64_t superseded_ = 0;
   std::unordered_map<const Key*, Unsaved> unsaved_;
 };

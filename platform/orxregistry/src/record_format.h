@@ -32,6 +32,11 @@ Integer Load(const unsigned char* at) {
 }
 
 template <class Integer>
+void Store(unsigned char* at, Integer value) {
+  std::memcpy(at, &value, sizeof value);
+}
+
+template <class Integer>
 void Append(Buffer& to, Integer value) {
   const auto* const bytes = reinterpret_cast<const unsigned char*>(&value);
   to.insert(to.end(), bytes, bytes + sizeof value);
@@ -157,6 +162,19 @@ inline std::optional<Key> TakeKey(Bytes& bytes) {
   if (values > rest || keys > rest - values) return std::nullopt;
   bytes.remove_prefix(kKeyHeader + name + values + keys);
   return KeyAt(record);
+}
+
+/// Bytes of the record of a key that TakeKey has accepted.
+inline std::size_t KeyRecordSize(const unsigned char* record) {
+  const Key key = KeyAt(record);
+  return kKeyHeader + key.name.bytes + key.values.size() + key.keys.size();
+}
+
+/// True when the bytes are one key and so is everything in it, no more than `depth` levels deep.
+bool IsWhole(Bytes bytes, int depth);
+
+inline void AppendBytes(Buffer& to, Bytes bytes) {
+  to.insert(to.end(), bytes.begin(), bytes.end());
 }
 
 void AppendValue(Buffer& to, const Value& value);

@@ -93,16 +93,18 @@ SegmentHeader SegmentHeaderAt(const unsigned char* header) {
           record::Load<std::uint64_t>(header + kTreeChecksumAt)};
 }
 
+/// Fills in a segment's header, for which there is room in front of its tree.
+/// \param start where in `bytes` the header is; the tree is all that comes behind it
 /// \param at where in the file the segment will be
-void AppendSegmentTo(Buffer& to, std::uint64_t at, const Buffer& tree, std::uint64_t superseded) {
-  const std::size_t start = to.size();
-  record::Append(to, kSegmentMark);
-  record::Append(to, std::uint32_t{0});
-  record::Append(to, std::uint64_t{tree.size()});
-  record::Append(to, superseded);
-  record::Append(to, Checksum(tree.data(), tree.size()));
-  record::Append(to, Checksum(to.data() + start, kHeaderChecksumAt, at));
-  to.insert(to.end(), tree.begin(), tree.end());
+void FinishSegment(Buffer& bytes, std::size_t start, std::uint64_t at, std::uint64_t superseded) {
+  unsigned char* const header = bytes.data() + start;
+  const unsigned char* const tree = header + kSegmentHeader;
+  const std::uint64_t treeSize = bytes.size() - start - kSegmentHeader;
+  record::Store(header, kSegmentMark);
+  record::Store(header + kTreeSizeAt, treeSize);
+  record::Store(header + kSupersededAt, superseded);
+  record::Store(header + kTreeChecksumAt, Checksum(tree, treeSize));
+  record::Store(header + kHeaderChecksumAt, Checksum(header, kHeaderChecksumAt, at));
 }
 
 /// Tells damage from a save that never finished: behind damage there is another segment.
@@ -169,14 +171,11 @@ FileContent ReadContent(const os::File& file) {
   return content;
 }
 
-/// The content of a file and one more segment, written anew without what is superseded.
-std::optional<Buffer> Compact(FileContent content, const Buffer& added) {
-  content.segments.emplace_back(added.data(), added.size());
-  const std::u16string description = content.description;
-  const auto merged = std::make_shared<KeyTree>(std::move(content));
-  const Buffer tree = merged->WriteAll();
-  if (merged->error != kRegistryOk) return std::nullopt;
-  return MakeRegistryFile(description, tree);
+/// The content of a file and one more tree, written anew without what is superseded.
+std::optional<Buffer> Compact(FileContent content, Bytes added) {
+  content.segments.push_back(added);
+  KeyTree merged(std::move(content));
+  return MakeRegistryFile(merged);
 }
 
 /// Brings the position up to what is in the locked file.
@@ -201,10 +200,13 @@ FileContent ReadRegistryFile(const std::filesystem::path& path) {
   return content;
 }
 
-Buffer MakeRegistryFile(const std::u16string& description, const Buffer& tree) {
-  Buffer bytes = MakeFileHeader(description);
-  bytes.reserve(bytes.size() + kSegmentHeader + tree.size());
-  AppendSegmentTo(bytes, bytes.size(), tree, 0);
+std::optional<Buffer> MakeRegistryFile(KeyTree& tree) {
+  Buffer bytes = MakeFileHeader(tree.description);
+  const std::size_t start = bytes.size();
+  bytes.resize(start + kSegmentHeader);
+  tree.WriteAll(bytes);
+  if (tree.error != kRegistryOk) return std::nullopt;
+  FinishSegment(bytes, start, start, 0);
   return bytes;
 }
 
@@ -224,25 +226,25 @@ std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, cons
   return std::nullopt;
 }
 
-AppendResult AppendSegment(const std::filesystem::path& path, FilePosition& position,
-                           const Buffer& tree, std::uint64_t superseded) {
+AppendResult AppendUnsaved(const std::filesystem::path& path, KeyTree& tree) {
   std::optional<os::File> file = os::File::OpenLocked(path, false);
   if (!file) return AppendResult::kFailed;
-  FilePosition at = position;
+  FilePosition at = tree.position;
   const AppendResult result = CatchUp(*file, at);
-  if (result == AppendResult::kFailed || tree.empty()) return result;
+  if (result == AppendResult::kFailed || !tree.has_unsaved()) return result;
 
-  at.superseded += superseded;
-  Buffer segment;
-  segment.reserve(kSegmentHeader + tree.size());
-  AppendSegmentTo(segment, at.end, tree, at.superseded);
+  Buffer segment(kSegmentHeader);
+  tree.WriteUnsaved(segment);
+  at.superseded += tree.superseded();
   if (at.superseded > (at.end + segment.size()) / 2) {
-    const std::optional<Buffer> whole = Compact(ReadContent(*file), tree);
+    const Bytes unsaved(segment.data() + kSegmentHeader, segment.size() - kSegmentHeader);
+    const std::optional<Buffer> whole = Compact(ReadContent(*file), unsaved);
     const auto stamp = whole ? PublishFile(path, *whole, true) : std::nullopt;
     if (!stamp) return AppendResult::kFailed;
-    position = {*stamp, whole->size(), 0};
+    tree.position = {*stamp, whole->size(), 0};
     return result;
   }
+  FinishSegment(segment, 0, at.end, at.superseded);
   const bool cutOff = at.stamp.size == at.end || file->Truncate(at.end);
   const bool written =
       cutOff && file->Write(at.end, segment.data(), segment.size()) && file->Flush();
@@ -252,7 +254,7 @@ AppendResult AppendSegment(const std::filesystem::path& path, FilePosition& posi
   }
   at.end += segment.size();
   at.stamp = file->Stamp().value_or(os::FileStamp());
-  position = at;
+  tree.position = at;
   return result;
 }
 

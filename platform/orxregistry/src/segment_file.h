@@ -14,6 +14,8 @@
 /// of one key tree's root. See docs/gff-format.md.
 namespace orx {
 
+class KeyTree;
+
 /// A file read into memory and what was found in it.
 struct FileContent {
   RegistryError error = kRegistryOk;
@@ -29,8 +31,9 @@ struct FileContent {
 /// left out; anything else that is wrong is damage, and the segments in front of it are given.
 FileContent ReadRegistryFile(const std::filesystem::path& path);
 
-/// The bytes of a whole file that holds one segment.
-record::Buffer MakeRegistryFile(const std::u16string& description, const record::Buffer& tree);
+/// The bytes of a whole file that holds all of a tree in one segment.
+/// \return nothing when the tree turns out to be damaged
+std::optional<record::Buffer> MakeRegistryFile(KeyTree& tree);
 
 /// Writes a file beside its place, makes it durable and gives it its name.
 /// \param replace false: fails when there is a file of that name
@@ -48,15 +51,12 @@ struct FilePosition {
 /// How an append ended.
 enum class AppendResult {
   kFailed,       ///< what was durable still is, and nothing else is in the file
-  kAppended,     ///< durable; `position` is that of the new end
-  kBehindOthers  ///< durable, behind segments that somebody else appended since `position`
+  kAppended,     ///< durable; the tree's position is that of the new end
+  kBehindOthers  ///< durable, behind segments that somebody else appended since that position
 };
 
-/// Appends a segment durably, or writes the file afresh when more than half of it is superseded.
-/// \param position where the file was last seen to end; moved on success
-/// \param tree record of the root with what is new; empty when there is nothing to write
-/// \param superseded bytes of values in the file that `tree` replaces
-AppendResult AppendSegment(const std::filesystem::path& path, FilePosition& position,
-                           const record::Buffer& tree, std::uint64_t superseded);
+/// Appends what is not saved of a tree to its file durably, or writes the file afresh when more
+/// than half of it is superseded.
+AppendResult AppendUnsaved(const std::filesystem::path& path, KeyTree& tree);
 
 }  // namespace orx
