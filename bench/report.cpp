@@ -34,6 +34,12 @@ std::string Times(double of, double by) {
 
 }  // namespace
 
+void Report::Add(const Row& row) {
+  const auto last = std::find_if(rows_.rbegin(), rows_.rend(),
+                                 [&](const Row& other) { return other.work == row.work; });
+  rows_.insert(last == rows_.rend() ? rows_.end() : last.base(), row);
+}
+
 std::string Report::NameOf(const std::string& work, std::int64_t entries, Side side) {
   return work + "/" + std::to_string(entries) + "/" + std::to_string(static_cast<int>(side));
 }

@@ -24,11 +24,12 @@ struct Row {
   double peer = 0.0;           ///< seconds of the peer; 0: none
 };
 
-/// Collects the rows of a run. A benchmark is known by the name that Register gives it.
+/// Collects the rows of a run.
 class Report : public benchmark::BenchmarkReporter {
  public:
-  /// Adds a row whose sides are benchmarks that are to be registered under the names returned.
-  void Add(const Row& row) { rows_.push_back(row); }
+  /// Adds a row behind those of the same work. What is timed for it is registered under the names
+  /// that NameOf gives.
+  void Add(const Row& row);
   static std::string NameOf(const std::string& work, std::int64_t entries, Side side);
 
   bool ReportContext(const Context&) override { return true; }

@@ -47,7 +47,7 @@ using Benchmark = std::function<void(benchmark::State&)>;
 
 class Suite {
  public:
-  Suite(Report& report, bool quick) : report_(report), repetitions_(quick ? 1 : 5) {}
+  Suite(Report& report, bool quick) : report_(report), repetitions_(quick ? 3 : 5) {}
 
   void Add(const Row& row, int iterations, const Benchmark& work, const Benchmark& limit,
            const Benchmark& peer = nullptr) {
@@ -276,7 +276,7 @@ int Run(bool quick, const std::string& json, const fs::path& directory) {
     const Files files = MakeFiles(directory, entries);
     const bool large = entries >= 100'000;
     AddMemory(report, files);
-    AddQueries(suite, files, large ? 1 : quick ? 5 : 50);
+    AddQueries(suite, files, large ? 1 : 50);
     AddMerging(suite, files, large ? 1 : 5);
     AddIngestion(suite, files, quick ? 20 : 100);
   }
