@@ -53,6 +53,9 @@ class LookupName {
   std::u16string units_;
 };
 
+inline record::Name UnitsOf(const record::Name& name) { return name; }
+inline record::Name UnitsOf(LookupName& name) { return name.Units(); }
+
 /// A value in memory: its record, in the file's bytes or in the tree's memory.
 using ValueRecord = const unsigned char*;
 
@@ -68,17 +71,16 @@ class NamedList {
 
   const std::pmr::vector<Item>& items() const { return items_; }
 
+  /// \param name a record::Name or a LookupName
   /// \return the place of the item of that name in `items()`, or their number
-  std::size_t Find(LookupName& name) const {
-    if (index_) return FindIndexed(name.Units());
+  template <class AnyName>
+  std::size_t Find(AnyName& name) const {
+    if (index_) {
+      const auto found = index_->find(UnitsOf(name));
+      return found == index_->end() ? items_.size() : *found;
+    }
     std::size_t place = 0;
     while (place < items_.size() && !(name == NameOf(items_[place]))) ++place;
-    return place;
-  }
-  std::size_t Find(const record::Name& name) const {
-    if (index_) return FindIndexed(name);
-    std::size_t place = 0;
-    while (place < items_.size() && !(NameOf(items_[place]) == name)) ++place;
     return place;
   }
 
@@ -125,11 +127,6 @@ class NamedList {
     }
   };
   using Index = std::pmr::unordered_set<std::size_t, Hash, Equal>;
-
-  std::size_t FindIndexed(const record::Name& name) const {
-    const auto found = index_->find(name);
-    return found == index_->end() ? items_.size() : *found;
-  }
 
   void MakeIndex() {
     std::pmr::polymorphic_allocator<> memory(items_.get_allocator().resource());
