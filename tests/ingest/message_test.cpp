@@ -23,7 +23,7 @@ TEST_F(MessageSetTest, IndicatorTellsWhatToWaitFor) {
 
 TEST_F(MessageSetTest, IsCheckedAndTakenInOrder) {
   Rtcm1021 bad, nameless = m1021_;
-  bad.computationIndicator = 4, nameless.targetName.clear();
+  bad.computationIndicator = 4, nameless.utilizedMsgIndicator = 0, nameless.targetName.clear();
   const Rtcm1025 unsupported;
   const Rtcm1026 ignored;
   using All = MsgUtilized;
@@ -31,7 +31,7 @@ TEST_F(MessageSetTest, IsCheckedAndTakenInOrder) {
   // then, and what is other than in a set of a 1021, its 1023 and its 1025.
   const std::tuple<ResultCode, const char*, std::function<void(All&)>> cases[] = {
       {kNoDatumMessage, "....", [](All& m) { m.msg1021 = nullptr; }},
-      {kMissing1023, "....", [](All& m) { m.msg1023 = nullptr; }},
+      {kMissing1023, "....", [&](All& m) { m.msg1021 = &nameless, m.msg1023 = nullptr; }},
       {kNoDatumName, "....", [&](All& m) { m.msg1021 = &nameless; }},
       {kSuccess, "d...", [](All& m) { m.info.use1025 = false; }},
       {kMissingProjectionPart, "d...", [](All& m) { m.msg1025 = nullptr; }},
@@ -62,7 +62,7 @@ TEST_F(MessageSetTest, IsCheckedAndTakenInOrder) {
 }
 
 TEST_F(MessageTest, FirstOfEachKindMakesAFileWithItsEntry) {
-  m1023_.vertShiftIndicator = false;
+  m1023_.vertShiftIndicator = false, m1023_.meanDPhi = -124, m1027_.diffARSG = -1212342;
   m1023_.horInterpolationMethod = 0x1FE, m1023_.vertInterpolationMethod = 3;
   // The 1021 has no rotation point and keeps that of the 1022.
   EXPECT_EQ(Ingest(kLocalSet) + Ingest(kDhdnSet), kSuccess);
@@ -73,7 +73,7 @@ TEST_F(MessageTest, FirstOfEachKindMakesAFileWithItsEntry) {
 }
 
 TEST_F(MessageTest, NamesAreCleanedAndKeptWhole) {
-  using Text = std::wstring;
+  using Text = const wchar_t*;
   const std::tuple<const char*, Text, const char*, Text, unsigned, Text> cases[] = {
       {"A  B", L"A_B", "xWGS84 ETRS89", L"WGS84", 0, L""},
       {"./.", L"_", "ITRF97/ETRS89", L"ETRS89", 1, L"Africa"},
@@ -125,12 +125,12 @@ TEST_F(MessageTest, RefusedDatumWritesNothing) {
 
 TEST_F(MessageTest, ParametersFollowTheProjectionType) {
   m1025_.fe = 0xFFFFFFFFFFFFFFFF, m1025_.fn = -5, m1025_.laNO = -7;
-  m1027_.rectificationFlag = false;
   const Json tests = Json::parse(ReadBytes(PROJECTION_TYPES));
   std::string name = "a";
   for (const Json& test : tests) {
     m1021_.targetName = m1022_.targetName = name;
-    m1025_.projectionType = test["projectionType"];
+    m1025_.projectionType = m1027_.projectionType = test["projectionType"];
+    m1027_.rectificationFlag = test.value("rectificationFlag", false);
     ASSERT_EQ(Ingest(test["message"] == 1025 ? kDhdnSet : kLocalSet), kSuccess);
     const Json standard = ReadGff(ProjectionFile(name)).back().back()["StandardPrj"];
     EXPECT_EQ(standard["PrjType"][kContent], test["PrjType"]);
@@ -144,7 +144,7 @@ TEST_F(MessageTest, UnsupportedProjectionIsRefusedAndNothingWritten) {
   EXPECT_EQ(support_.ParseProjectionMessages(m1027_, nullptr), kNoDatumName);
   EXPECT_EQ(support_.ParseProjectionMessages(Rtcm1026(), nullptr), kUnsupportedProjection);
   CustomProjectionData summary;
-  for (const std::uint32_t type : {0U, 3U, 4U, 5U, 11U, 99U, 101U, 0xFFFFFFFFU}) {
+  for (const std::uint32_t type : {0U, 5U, 3U, 4U, 11U, 99U, 101U, 0xFFFFFFFFU}) {
     m1025_.projectionType = type;
     EXPECT_EQ(Ingest(kDhdnSet), kUnsupportedProjection) << type;
     EXPECT_TRUE(support_.GetCustomProjectionData(summary));

@@ -21,8 +21,8 @@ Doubles All(const double (&array)[count]) {
 TEST(EllipsoidalGrid, IsScaledToTheLastBitAndTheNextReplacesIt) {
   constexpr double kHalf = 2.42406840554768e-06;
   Rtcm1023 message;
-  message.phi0 = 374415, message.lambda0 = 64815, message.dPhi = message.dLambda = 30;
-  message.horShiftIndicator = true;
+  message.horShiftIndicator = true, message.phi0 = 374415, message.lambda0 = 64815;
+  message.dPhi = message.dLambda = 30;
   TableData table;
   ConvertEllipsoidalGrid(message, table);
   EXPECT_EQ(All(table.bounds),

@@ -2,8 +2,6 @@
 
 #include <gtest/gtest.h>
 
-#include <string>
-
 #include "store/simple_value.h"
 #include "store/typed_value.h"
 

@@ -16,16 +16,17 @@ class WithoutSiblingTest : public testing::Test {
  protected:
   WithoutSiblingTest() { std::filesystem::remove(SIBLING_FILE); }
 
-  static void ExpectOfBothKinds(ResultCode loaded, ResultCode obtained) {
-    TCSInFileKey* file = nullptr;
-    EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(L"x.dff", &file), obtained);
-    EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrProjectionGFF(L"x.prj", &file), obtained);
+  void ExpectOfBothKinds(ResultCode loaded, ResultCode obtained) {
+    EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(L"x.dff", &file_), obtained);
+    EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrProjectionGFF(L"x.prj", &file_), obtained);
     EXPECT_EQ(RTCMDataSupport::GetDatumTransformationDLL(), loaded);
     EXPECT_EQ(RTCMDataSupport::GetPrjTransformationDLL(), loaded);
     RTCMDataSupport::ReleasePtrDatumGFF(L"x.dff");
     RTCMDataSupport::ReleasePtrProjectionGFF(L"x.prj");
-    EXPECT_EQ(file, nullptr);
+    EXPECT_EQ(file_, nullptr);
   }
+
+  TCSInFileKey* file_ = nullptr;
 };
 
 TEST_F(WithoutSiblingTest, AbsentLibraryIsReportedByTheFirstUse) {
@@ -36,8 +37,10 @@ TEST_F(WithoutSiblingTest, AbsentLibraryIsReportedByTheFirstUse) {
 
 TEST_F(WithoutSiblingTest, FileThatIsNoLibraryGivesTheLoadersStatus) {
   std::ofstream(SIBLING_FILE) << "no library";
-  ExpectOfBothKinds(kNotLoadable, kNotLoadable);
-  // Now the half-loaded library is held, and it is the entry point that is missing.
+  EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(L"x.dff", &file_), kNotLoadable);
+  EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrProjectionGFF(L"x.prj", &file_), kNotLoadable);
+  EXPECT_FALSE(RTCMDataSupport::DLLdatum || RTCMDataSupport::DLLprojection);
+  // Once the half-loaded library is held, it is the entry point that is missing.
   const RTCMDataSupport support;
   ExpectOfBothKinds(kNotLoadable, kNoSiblingLibrary);
 }
