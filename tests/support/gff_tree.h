@@ -33,13 +33,13 @@ inline Json ReadKey(const orx::TGenericRegistryKey& key) {
     orx::cs::velta::TSimpleBinValue value;
     key.GetValue(name, value, 0, false);
     const std::uint32_t size = value.GetSize();
-    content[orx::Narrow(name)] = {value.GetType(), size, key.GetValueDim(name), ""};
-    Json& held = content[orx::Narrow(name)][kContent];
-    if (size == 0) held = orx::Narrow(orx::GetRegValue(key, name, std::wstring(), 0));
+    content[orx::Narrow(name)] = {value.GetType(), size, key.GetValueDim(name),
+                                  orx::Narrow(orx::GetRegValue(key, name, std::wstring(), 0))};
+    if (size == 0) continue;
     WithNumberOf(size, [&](auto number) {
       std::vector<decltype(number)> numbers(size / sizeof number);
       std::memcpy(numbers.data(), value.GetData(), size);
-      if (size != 0) held = numbers;
+      content[orx::Narrow(name)][kContent] = numbers;
     });
   }
   for (orx::TGenRegKeyIterator walk(key); walk;) {
