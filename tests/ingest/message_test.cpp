@@ -1,38 +1,80 @@
-// What the fields of the messages become.
+// Which messages of a set are taken, in which order, and what their fields become.
 
-#include <limits>
+#include <functional>
 
 #include "support/rtcm_test.h"
 
 namespace velta_test {
 namespace {
 
-class MessageTest : public RtcmTest {
- protected:
-  GffKey Standard(const std::string& name) {
-    return ReadGff(DatumFile(name)).Entry()[L"StandardDatum"];
-  }
-  /// Type string and parameters of the last entry of a projection file.
-  std::string Projection(const std::string& name) {
-    GffKey standard = ReadGff(ProjectionFile(name)).Container().keys.back()[L"StandardPrj"];
-    GffValue& parameters = standard.Value(L"PrjStandardParameters");
-    EXPECT_EQ(parameters.bytes.substr(64), std::string(64, '\0'));
-    parameters.bytes.resize(64);
-    return standard.Value(L"PrjType").Content() + parameters.Content();
-  }
+using MessageSetTest = RtcmTest;
+using MessageTest = RtcmTest;
 
-  HelmertSet dhdn_ = Dhdn();
-};
+TEST_F(MessageSetTest, IndicatorTellsWhatToWaitFor) {
+  for (std::uint32_t indicator = 0xFFFFFFF0; indicator != 0x60; ++indicator) {
+    m1021_.systemId = m1021_.utilizedMsgIndicator = indicator;
+    const UtilizedMsgInfo& info = support_.GetUtilizedMessageInfo(m1021_);
+    EXPECT_EQ(info.use1023 + info.use1024 * 2U + info.use1025 * 4U + info.use1026 * 8U +
+                  info.use1027 * 16U,
+              indicator & 0x1F);
+    EXPECT_EQ(info.systemId, static_cast<std::int32_t>(indicator));
+  }
+}
+
+TEST_F(MessageSetTest, IsCheckedAndTakenInOrder) {
+  Rtcm1021 bad, nameless = m1021_;
+  bad.computationIndicator = 4, nameless.utilizedMsgIndicator = 0, nameless.targetName.clear();
+  const Rtcm1025 unsupported;
+  const Rtcm1026 ignored;
+  using All = MsgUtilized;
+  // The result, the datum and projection files of the DHDN and of the other datum that are there
+  // then, and what is other than in a set of a 1021, its 1023 and its 1025.
+  const std::tuple<ResultCode, const char*, std::function<void(All&)>> cases[] = {
+      {kNoDatumMessage, "....", [](All& m) { m.msg1021 = nullptr; }},
+      {kMissing1023, "....", [&](All& m) { m.msg1021 = &nameless, m.msg1023 = nullptr; }},
+      {kNoDatumName, "....", [&](All& m) { m.msg1021 = &nameless; }},
+      {kSuccess, "d...", [](All& m) { m.info.use1025 = false; }},
+      {kMissingProjectionPart, "d...", [](All& m) { m.msg1025 = nullptr; }},
+      {kMissingProjectionPart, "d...", [](All& m) { m.info.use1024 = true, m.msg1024 = nullptr; }},
+      {kSuccess, "d...",
+       [](All& m) {
+         m.info = {true, true}, m.msg1024 = nullptr;
+       }},
+      {kMissingProjectionPart, "dp..", [](All& m) { m.info.use1027 = true, m.msg1027 = nullptr; }},
+      {kSuccess, "dp..", [&](All& m) { m.info.use1026 = true, m.msg1026 = &ignored; }},
+      {kBadComputationIndicator, "....", [&](All& m) { m.msg1021 = &bad; }},
+      {kSuccess, "..dp", [&](All& m) { m.msg1021 = &bad, m.msg1022 = &m1022_; }},
+      {kUnsupportedProjection, "d...", [&](All& m) { m.msg1025 = &unsupported; }},
+      {kSuccess, "dp..", [&](All& m) { m.msg1025 = &unsupported, m.info.use1027 = true; }},
+  };
+  for (const auto& [result, expected, change] : cases) {
+    MsgUtilized set = Set(k1021 | k1023 | k1025);
+    change(set);
+    EXPECT_EQ(support_.ParseRTCMMEssages(set), result);
+    std::string files;
+    for (const char* const name : {kDhdn, kLocal}) {
+      files += std::filesystem::exists(DatumFile(name)) ? "d" : ".";
+      files += std::filesystem::exists(ProjectionFile(name)) ? "p" : ".";
+    }
+    EXPECT_EQ(files, expected) << result;
+    std::filesystem::remove_all(directory_ / "new");
+  }
+}
+
+TEST_F(MessageTest, FirstOfEachKindMakesAFileWithItsEntry) {
+  m1023_.vertShiftIndicator = false, m1023_.meanDPhi = -124, m1027_.diffARSG = -1212342;
+  m1023_.horInterpolationMethod = 0x1FE, m1023_.vertInterpolationMethod = 3;
+  // The 1021 has no rotation point and keeps that of the 1022.
+  EXPECT_EQ(Ingest(kLocalSet) + Ingest(kDhdnSet), kSuccess);
+  const Json files = Json::parse(ReadBytes(FIRST_ENTRIES));
+  for (const auto& [file, content] : files.items()) {
+    EXPECT_EQ(ReadGff(directory_ / "new" / file), content) << file;
+  }
+}
 
 TEST_F(MessageTest, NamesAreCleanedAndKeptWhole) {
-  const struct {
-    const char* target;
-    const wchar_t* cleanTarget;
-    const char* source;
-    const wchar_t* cleanSource;
-    std::uint32_t plate;
-    const wchar_t* region;
-  } cases[] = {
+  using Text = const wchar_t*;
+  const std::tuple<const char*, Text, const char*, Text, unsigned, Text> cases[] = {
       {"A  B", L"A_B", "xWGS84 ETRS89", L"WGS84", 0, L""},
       {"./.", L"_", "ITRF97/ETRS89", L"ETRS89", 1, L"Africa"},
       {"AABBCC11", L"ABC1", "in ITRF2014", L"ITRF", 9, L"North America"},
@@ -40,111 +82,75 @@ TEST_F(MessageTest, NamesAreCleanedAndKeptWhole) {
       {"Z", L"Z", "", L"", 16, L"Scotia"},
       {"Q", L"Q", "\xC9", L"\u00C9", 17, L""},
   };
-  constexpr auto kLowest = std::numeric_limits<std::int32_t>::min();
-  auto& [datum, grid, plane, projection] = dhdn_;
-  datum.phiV = datum.lambdaV = grid.phi0 = grid.lambda0 = kLowest;
-  for (const auto& c : cases) {
-    datum.targetName = c.target, datum.sourceName = c.source;
-    datum.sourceNameCounter = 99, datum.plateNumber = c.plate;
-    EXPECT_EQ(Ingest(dhdn_, kGrid), kSuccess) << c.target;
-    EXPECT_EQ(support_.GetTargetDatumName(), c.cleanTarget);
-    EXPECT_EQ(support_.GetSourceDatumName(), c.cleanSource);
-    EXPECT_EQ(support_.GetRegionName(), c.region);
-    EXPECT_EQ(ReadGff(datumPath_ + c.cleanTarget + L".dff").Entry().name,
-              L"S_-2147483648_-2147483648_T_-2147483648_-2147483648");
+  m1021_.phiV = m1021_.lambdaV = m1023_.phi0 = m1023_.lambda0 = INT32_MIN;
+  const char* const entry = "S_-2147483648_-2147483648_T_-2147483648_-2147483648";
+  for (const auto& [target, cleanTarget, source, cleanSource, plate, region] : cases) {
+    m1021_.targetName = target, m1021_.sourceName = source, m1021_.plateNumber = plate;
+    EXPECT_EQ(Ingest(k1021 | k1023), kSuccess) << target;
+    EXPECT_EQ(support_.GetTargetDatumName(), cleanTarget);
+    EXPECT_EQ(support_.GetSourceDatumName(), cleanSource);
+    EXPECT_EQ(support_.GetRegionName(), region);
+    EXPECT_TRUE(ReadGff(datumPath_ + cleanTarget + L".dff").back().contains(entry));
   }
-  datum.targetName.clear();
-  EXPECT_EQ(Ingest(dhdn_, kGrid), kNoDatumName);
-  EXPECT_EQ(ReadGff(DatumFile("")).Container().Value(L"rtcm_datumName").Content(), " ");
+  m1021_.targetName.clear();
+  EXPECT_EQ(Ingest(k1021 | k1023), kNoDatumName);
+  EXPECT_EQ(ReadGff(DatumFile("")).back()["rtcm_datumName"][kContent], "");
 }
 
 TEST_F(MessageTest, WithoutAGridADatumKeepsTheObjectsAndAProjectionHasNone) {
-  dhdn_.datum.utilizedMsgIndicator = 0xFE;
-  ASSERT_EQ(Ingest(dhdn_, kDatum), kSuccess);
-  ASSERT_EQ(Ingest(dhdn_, kAllParts), kSuccess);
-  dhdn_.datum.phiV = -5, dhdn_.projection.systemId = 99;
-  ASSERT_EQ(Ingest(dhdn_, kProjection), kSuccess);
-  GffKey root = ReadGff(DatumFile());
-  EXPECT_EQ(root.Entry(0).name, L"S_91984_18653");
-  EXPECT_EQ(root.Entry(0)[L"TargetDatum"].Value(L"NRowsT").Content(), " 4");
-  EXPECT_EQ(root.Entry(0)[L"TargetDatum"].Value(L"dMeanValue").Content(), " 0 0 0");
-  EXPECT_EQ(root.Entry(2).name, L"S_-5_18653");
-  EXPECT_EQ(root.Entry(2)[L"TargetDatum"], root.Entry(1)[L"TargetDatum"]);
-  root = ReadGff(ProjectionFile());
-  EXPECT_EQ(root.Entry(1).name, L"S_0_818181818");
-  EXPECT_EQ(root.Entry(1)[L"TableProj"].Value(L"dMeanValue").Content(), " 0 0 0");
-  EXPECT_EQ(root.Container().Value(L"system_identification_number").Content(), " 23");
-}
-
-TEST_F(MessageTest, BadekasAddsARotationPointThatTheNextHelmertKeeps) {
-  ASSERT_EQ(Ingest(Badekas(), kGrid), kSuccess);
-  GffKey standard = Standard(kBadekas);
-  EXPECT_EQ(standard.Value(L"StandardMethod").Content(), " 3");
-  EXPECT_EQ(standard.Value(L"HtIndicator").Content(), " 3");
-  EXPECT_EQ(standard.Value(L"RTCMRefDatumName").Content(), " WGS84");
-  // No extent is the whole globe, centred on the message's position.
-  EXPECT_EQ(standard.Value(L"BoundariesStandardDatum").Content(),
-            " -2.1645379457761234 3.141592653589793 -5.0819236644000005 6.283185307179586");
-  ASSERT_EQ(Ingest(dhdn_, kGrid), kSuccess);
-  for (const char* const name : {kBadekas, kDhdn}) {
-    const std::string parameters = Standard(name).Value(L"DatumStandardParameters").Content();
-    EXPECT_TRUE(parameters.ends_with(" -4123456.789 2987654.321 -1 0 0 0")) << parameters;
-  }
+  m1021_.utilizedMsgIndicator = 0xFE;
+  EXPECT_EQ(Ingest(k1021) + Ingest(kDhdnSet), kSuccess);
+  m1021_.phiV = -5, m1025_.systemId = 99;
+  EXPECT_EQ(Ingest(k1021 | k1025), kSuccess);
+  Json datum = ReadGff(DatumFile())[kDhdn], projection = ReadGff(ProjectionFile())[kDhdn];
+  const Json none = {0.0, 0.0, 0.0};
+  EXPECT_EQ(datum["S_91984_18653"]["TargetDatum"]["dMeanValue"][kContent], none);
+  EXPECT_EQ(datum["S_-5_18653"]["TargetDatum"],
+            datum["S_91984_18653_T_374415_64815"]["TargetDatum"]);
+  EXPECT_EQ(projection["S_0_818181818"]["TableProj"]["dMeanValue"][kContent], none);
+  EXPECT_EQ(projection["system_identification_number"][kContent], Json({23}));
 }
 
 TEST_F(MessageTest, RefusedDatumWritesNothing) {
-  BadekasSet badekas = Badekas();
-  for (const std::uint32_t indicator : {0U, 2U, 4U}) {
-    badekas.datum.computationIndicator = indicator;
-    EXPECT_EQ(Ingest(badekas, kGrid), kBadComputationIndicator);
+  for (const unsigned indicator : {0U, 2U, 4U}) {
+    m1022_.computationIndicator = m1021_.computationIndicator = indicator;
+    EXPECT_EQ(Ingest(kLocalSet), kBadComputationIndicator);
   }
-  EXPECT_EQ(Ingest(dhdn_, kDatum), kMissing1023);
+  EXPECT_EQ(Ingest(k1021), kMissing1023);
   EXPECT_EQ(support_.GetTargetDatumName() + support_.GetRegionName(), L"");
-  dhdn_.datum.computationIndicator = 4;
-  EXPECT_EQ(Ingest(dhdn_, kGrid), kBadComputationIndicator);
+  EXPECT_EQ(Ingest(kDhdnSet), kBadComputationIndicator);
   EXPECT_EQ(support_.GetTargetDatumName() + support_.GetRegionName(), L"AUTO_DHDN_BESELEurope");
   EXPECT_FALSE(std::filesystem::exists(datums_));
-  dhdn_.datum.computationIndicator = 3;
-  EXPECT_EQ(Ingest(dhdn_, kGrid), kSuccess);
 }
 
 TEST_F(MessageTest, ParametersFollowTheProjectionType) {
-  const std::string five = " 8.999999998 1 -7.699999999999999e-08 18446744073709552 -0.005 0 0 0";
-  const std::string four = " 8.999999998 -7.699999999999999e-08 18446744073709552 -0.005 0 0 0 0";
-  const std::pair<std::uint32_t, std::string> types[] = {
-      {1, " TMERC" + five}, {2, " TMERC" + five},    {6, " CASSINI" + four}, {7, " OM" + five},
-      {8, " STER" + five},  {9, " MERCATOR" + four}, {10, " STER" + five},   {100, " ROM" + five}};
-  auto& [datum, grid, plane, projection] = dhdn_;
-  projection.fe = 0xFFFFFFFFFFFFFFFF, projection.fn = -5, projection.laNO = -7;
-  for (const auto& [type, expected] : types) {
-    projection.projectionType = type;
-    datum.targetName = static_cast<char>('a' + type % 26);
-    ASSERT_EQ(Ingest(dhdn_, kGrid | kProjection), kSuccess);
-    EXPECT_EQ(Projection(datum.targetName), expected);
+  m1025_.fe = 0xFFFFFFFFFFFFFFFF, m1025_.fn = -5, m1025_.laNO = -7;
+  const Json tests = Json::parse(ReadBytes(PROJECTION_TYPES));
+  std::string name = "a";
+  for (const Json& test : tests) {
+    m1021_.targetName = m1022_.targetName = name;
+    m1025_.projectionType = m1027_.projectionType = test["projectionType"];
+    m1027_.rectificationFlag = test.value("rectificationFlag", false);
+    ASSERT_EQ(Ingest(test["message"] == 1025 ? kDhdnSet : kLocalSet), kSuccess);
+    const Json standard = ReadGff(ProjectionFile(name)).back().back()["StandardPrj"];
+    EXPECT_EQ(standard["PrjType"][kContent], test["PrjType"]);
+    EXPECT_EQ(standard["PrjStandardParameters"][kContent], test["PrjStandardParameters"]) << test;
+    ++name[0];
   }
-  BadekasSet oblique = Badekas();
-  const std::string six =
-      " 53.329999998 0.9995999999999999 -111.172222216 -34.019999991999995 5e+05 -10000";
-  ASSERT_EQ(Ingest(oblique, kGrid | kProjection), kSuccess);
-  EXPECT_EQ(Projection(kBadekas), " ROM" + six + " 53.316664202999995 0");
-  oblique.projection.rectificationFlag = false;
-  ASSERT_EQ(Ingest(oblique, kAllParts), kSuccess);
-  EXPECT_EQ(Projection(kBadekas), " OM" + six + " 0 0");
-  EXPECT_EQ(ReadGff(ProjectionFile(kBadekas)).Entry(1).name,
-            L"S_-3092727272_-10106565656_T_540000_340000");
 }
 
 TEST_F(MessageTest, UnsupportedProjectionIsRefusedAndNothingWritten) {
-  EXPECT_EQ(support_.ParseProjectionMessages(dhdn_.projection, nullptr), kNoDatumName);
-  EXPECT_EQ(support_.ParseProjectionMessages(Badekas().projection, nullptr), kNoDatumName);
-  for (const std::uint32_t type : {0U, 3U, 4U, 5U, 11U, 99U, 101U, 0xFFFFFFFFU}) {
-    dhdn_.projection.projectionType = type;
-    EXPECT_EQ(Ingest(dhdn_, kAllParts), kUnsupportedProjection) << type;
-    CustomProjectionData summary;
+  EXPECT_EQ(support_.ParseProjectionMessages(m1025_, nullptr), kNoDatumName);
+  EXPECT_EQ(support_.ParseProjectionMessages(m1027_, nullptr), kNoDatumName);
+  EXPECT_EQ(support_.ParseProjectionMessages(Rtcm1026(), nullptr), kUnsupportedProjection);
+  CustomProjectionData summary;
+  for (const std::uint32_t type : {0U, 5U, 3U, 4U, 11U, 99U, 101U, 0xFFFFFFFFU}) {
+    m1025_.projectionType = type;
+    EXPECT_EQ(Ingest(kDhdnSet), kUnsupportedProjection) << type;
     EXPECT_TRUE(support_.GetCustomProjectionData(summary));
+    EXPECT_EQ(summary.projectionName + summary.datumName, L"AUTO_DHDN_BESELAUTO_DHDN_BESEL");
     EXPECT_EQ(summary.projectionType, type == 0 ? L"" : L"LC");
   }
-  EXPECT_EQ(support_.ParseProjectionMessages(Rtcm1026(), nullptr), kUnsupportedProjection);
   EXPECT_FALSE(std::filesystem::exists(projections_));
 }
 

@@ -1,6 +1,7 @@
-// What becomes of a message in its file, which is the same for datums and projections.
+// What becomes of messages, and of other files, in a file: the same for datums and projections.
 
 #include <boost/thread/lock_types.hpp>
+#include <cmath>
 #include <thread>
 
 #include "projmath/geo_proj.h"
@@ -10,190 +11,195 @@
 namespace velta_test {
 namespace {
 
-constexpr const char* kDatumDump = R"([AUTO_DHDN_BESEL]
-rtcm_datumName 5 0 1 AUTO_DHDN_BESEL
-[S_91984_18653_T_374415_64815]
-Version 3 2 1 256
-[StandardDatum]
-Ellipsoid 1 16 1 6377397.155 6356078.963
-StandardMethod 1 4 1 1
-DatumStandardParameters 1 104 1 -584.957 -70.27 -405.17 1.11552 -0.165 -3.0890000000000004 -7.992170000000001 0 0 0 0 0 0
-RTCMRefDatumName 5 0 1 ETRF89_ETRF89
-RefEllipsoid 1 16 1 6378137 6356752.314
-BoundariesStandardDatum 1 32 1 0.8569954478237045 0.06981317007977318 0.14595800683483692 0.06981317007977318
-HtIndicator 2 1 1 1
-[TargetDatum]
-NRowsT 2 4 1 4
-NColsT 2 4 1 4
-BoundariesTargetDatum 1 48 1 0.9074984889848849 0.00021816615649929117 0.15700691062732325 0.00021816615649929117 7.27220521664304e-05 7.27220521664304e-05
-DoApplyHorShiftsForAreaIndex 3 1 1 1
-DoApplyVertShiftsForAreaIndex 3 1 1 0
-HorInterpolationForAreaIndex 2 1 1 -2
-VertInterpolationForAreaIndex 2 1 1 3
-dMeanValue 1 24 1 -1.454441043328608e-08 6.787391535533503e-08 0.33
-dNdLatData 1 128 1 1.5998851476614686e-09 1.3089969389957473e-09 1.0181087303300257e-09 -2.3271056693257727e-09
-dEdLonData 1 128 1 -1.4544410433286082e-09 -1.0181087303300257e-09 -5.817764173314432e-10 -5.817764173314432e-10
-dHData 1 128 1 -0.003 -0.004 -0.001 -0.003
-)";
-
-constexpr const char* kProjectionDump = R"([AUTO_DHDN_BESEL]
-rtcm_projectionName 5 0 1 AUTO_DHDN_BESEL
-system_identification_number 3 4 1 23
-[S_0_818181818_T_540000_340000]
-Version 3 2 1 256
-[StandardPrj]
-RTCMProjName 5 0 1 AUTO_DHDN_BESEL
-DatumName 5 0 1 AUTO_DHDN_BESEL
-Ellipsoid 1 16 1 6377397.155 6356078.963
-PrjType 5 0 1 TMERC
-PrjStandardParameters 1 128 1 8.999999998 1 0 0
-[TableProj]
-NRowsT 2 4 1 4
-NColsT 2 4 1 4
-BoundariesTableProj 1 48 1 5398500 3000 3398200 3600 1000 1200
-DoApplyHorShiftsForAreaIndex 3 1 1 0
-DoApplyVertShiftsForAreaIndex 3 1 1 1
-HorInterpolationForAreaIndex 2 1 1 1
-VertInterpolationForAreaIndex 2 1 1 2
-dMeanValue 1 24 1 0.07 -0.12 -3.45
-dNdLatData 1 128 1 -0.12 -0.10400000000000001 -0.088 0.12
-dEdLonData 1 128 1 0.1 0.08700000000000001 0.074 -0.095
-dHData 1 128 1 0.255 0.221 0.187 -0.255
-)";
-
-struct Kind {
-  ResultCode trouble;
-  orx::TCSInFileKey*& current;
-  const char* dump;
-};
-const Kind kDatumKind{kDatumFileTrouble, RTCMDataSupport::GFFDatumFile, kDatumDump};
-const Kind kProjectionKind{kProjectionFileTrouble, RTCMDataSupport::GFFProjectionFile,
-                           kProjectionDump};
-
 class RecordFileTest : public RtcmTest, public testing::WithParamInterface<bool> {
  protected:
-  bool isDatum_ = GetParam();
-  const Kind& kind_ = isDatum_ ? kDatumKind : kProjectionKind;
-  std::filesystem::path path_ = isDatum_ ? DatumFile() : ProjectionFile();
-  HelmertSet dhdn_ = Dhdn();
-
-  /// Ingests the set, or the same with another place for its entry.
+  /// Ingests the messages, or the same with another place for their entry.
   ResultCode IngestEntry(int number = 0) {
-    HelmertSet set = dhdn_;
-    (isDatum_ ? set.datum.phiV : set.planeGrid.north0) += number;
-    return Ingest(set, isDatum_ ? kGrid : kAllParts);
+    m1021_.phiV = number, m1024_.north0 = number;
+    return Ingest(isDatum_ ? k1021 | k1023 : kDhdnSet);
   }
-  /// Ingests three entries and damages what the second added.
-  std::string Damage() {
-    std::size_t sizes[3] = {};
-    for (const int number : {0, 1, 2}) {
-      EXPECT_EQ(IngestEntry(number), kSuccess);
-      sizes[number] = ReadBytes(path_).size();
+  /// A file of entries that hold the file's name and a value of its own.
+  void Make(const std::string& name, const std::vector<std::string>& entries) {
+    const Json value = {5, 0, 1, name};
+    Json container = {{"of", value}};
+    for (const std::string& entry : entries) {
+      container[entry] = {{"of", value}, {name, value}, {"sub", {{"of", value}}}};
     }
-    std::string bytes = ReadBytes(path_);
-    bytes[(sizes[0] + sizes[1]) / 2] ^= 1;
-    WriteBytes(path_, bytes);
-    return bytes;
+    WriteGff(directory_ / name, {{"container of " + name, container}});
   }
-  /// How many entries the file holds, when nobody holds its lock.
-  std::size_t Entries() {
+  ResultCode Merge(const std::string& target, const std::string& source) const {
+    const std::wstring to = (directory_ / target).wstring(), from = (directory_ / source).wstring();
+    return isDatum_ ? RTCMDataSupport::MergeRTCMDatumfiles(to, from)
+                    : RTCMDataSupport::MergeRTCMProjectionfiles(to, from);
+  }
+  void ExpectUnlocked() const {
     std::thread([this] {
-      boost::recursive_mutex& mutex = kind_.current->GetMutex();
-      EXPECT_TRUE(boost::unique_lock<boost::recursive_mutex>(mutex, boost::try_to_lock));
+      EXPECT_TRUE(boost::unique_lock(current_->GetMutex(), boost::try_to_lock));
     }).join();
-    return ReadGff(path_).Container().keys.size();
   }
+
+  const bool isDatum_ = GetParam();
+  const ResultCode trouble_ = isDatum_ ? kDatumFileTrouble : kProjectionFileTrouble;
+  const std::filesystem::path path_ = isDatum_ ? DatumFile() : ProjectionFile();
+  orx::TCSInFileKey*& current_ =
+      isDatum_ ? RTCMDataSupport::GFFDatumFile : RTCMDataSupport::GFFProjectionFile;
 };
 
-INSTANTIATE_TEST_SUITE_P(Kinds, RecordFileTest, testing::Bool(), [](const auto& isDatum) {
-  return isDatum.param ? "Datum" : "Projection";
-});
+INSTANTIATE_TEST_SUITE_P(IsDatum, RecordFileTest, testing::Bool(),
+                         testing::PrintToStringParamName());
 
-TEST_P(RecordFileTest, FirstMessageMakesTheFileWithItsEntry) {
-  dhdn_.grid.vertShiftIndicator = false;
-  dhdn_.grid.horInterpolationMethod = 0x1FE, dhdn_.grid.vertInterpolationMethod = 3;
+TEST_P(RecordFileTest, EntryAlreadyPresentIsLeftAloneAndAnotherAppendedToTheFirstContainer) {
   ASSERT_EQ(IngestEntry(), kSuccess);
-  EXPECT_EQ(ReadGff(path_).Dump(), kind_.dump);
-}
-
-TEST_P(RecordFileTest, EntryAlreadyPresentIsLeftAloneAndAnotherAppended) {
-  ASSERT_EQ(IngestEntry(), kSuccess);
-  GffKey root = ReadGff(path_);
-  root.Container().name = L"first of two", root.Container().dimension = 3;
-  root.keys.push_back({L"AUTO_DHDN_BESEL"});
-  WriteGff(path_, root);
+  Json root = ReadGff(path_);
+  root[kDhdn]["dimension"] = 3;
+  WriteGff(path_, {{"first of two", root[kDhdn]}, {kDhdn, Json::object()}});
   const std::string one = ReadBytes(path_);
-  dhdn_.datum.dX = 1, dhdn_.projection.fe = 1;
+  m1021_.dX = 1, m1025_.fe = 1;
   EXPECT_EQ(IngestEntry(), kSuccess);
   EXPECT_EQ(ReadBytes(path_), one);
-  ASSERT_EQ(IngestEntry(1), kSuccess);
-  ASSERT_EQ(IngestEntry(2), kSuccess);
-  const std::string three = ReadBytes(path_);
-  EXPECT_EQ(three.substr(0, one.size()), one);
-  EXPECT_LE(three.size(), 3 * one.size());
-  EXPECT_EQ(Entries(), 3U);
-  EXPECT_EQ(ReadGff(path_).Entry(2).dimension, 3);
+  EXPECT_EQ(IngestEntry(1) + IngestEntry(2), kSuccess);
+  ExpectUnlocked();
+  EXPECT_EQ(ReadBytes(path_).substr(0, one.size()), one);
+  root = ReadGff(path_)["first of two"];
+  EXPECT_EQ(root.back()["dimension"], 3);
+  EXPECT_EQ(root.size(), isDatum_ ? 5U : 6U);  // with its dimension, its name and the system
 }
 
 TEST_P(RecordFileTest, DirectoryOrFileThatCannotBeUsedIsReported) {
   const std::filesystem::path directory = path_.parent_path();
-  std::filesystem::create_directories(datums_);
-  std::filesystem::remove(directory);
+  std::filesystem::create_directories(directory.parent_path());
   WriteBytes(directory, "a file where the directory should be");
   EXPECT_EQ(IngestEntry(), kNoDirectory);
   std::filesystem::remove(directory);
   std::filesystem::create_directories(path_);
   EXPECT_EQ(IngestEntry(), kNoSuchFile);
   std::filesystem::remove(path_);
-  const std::string bytes = Damage();
-  EXPECT_EQ(IngestEntry(3), kind_.trouble);
-  EXPECT_EQ(ReadBytes(path_), bytes);
   WriteBytes(path_, "no registry file");
-  EXPECT_EQ(IngestEntry(), kind_.trouble);
+  EXPECT_EQ(IngestEntry(), trouble_);
+  std::filesystem::remove(path_);
+  EXPECT_EQ(IngestEntry() + IngestEntry(1) + IngestEntry(2), kSuccess);
+  Damage(path_, ReadBytes(path_).size() / 2);
+  const std::string bytes = ReadBytes(path_);
+  EXPECT_EQ(IngestEntry(3), trouble_);
+  EXPECT_EQ(ReadBytes(path_), bytes);
+}
+
+TEST_P(RecordFileTest, MergedEntriesAreLaidOverTheTargets) {
+  Make("target", {"B", "C"}), Make("source", {"A", "B"}), Make("empty", {});
+  EXPECT_EQ(Merge("target", "source"), kSuccess);
+  const Json t = {5, 0, 1, "target"}, s = {5, 0, 1, "source"};
+  const Json merged = {
+      {"of", t},
+      {"B", {{"of", s}, {"target", t}, {"source", s}, {"sub", {{"of", s}}}}},
+      {"C", {{"of", t}, {"target", t}, {"sub", {{"of", t}}}}},
+      {"A", {{"of", s}, {"source", s}, {"sub", {{"of", s}}}}},
+  };
+  EXPECT_EQ(Merge("target", "empty") + Merge("target", "target"), kSuccess);
+  EXPECT_EQ(ReadGff(directory_ / "target"), Json({{"container of target", merged}}));
+  EXPECT_EQ(Merge("empty", "target"), kSuccess);
+  EXPECT_EQ(ReadGff(directory_ / "empty")["container of empty"]["B"], merged["B"]);
+}
+
+TEST_P(RecordFileTest, MergeWithAFileThatCannotBeUsedLeavesTheTargetAlone) {
+  Make("target", {"B"}), Make("source", {"A"}), Make("damaged", {"C"});
+  const std::size_t size = ReadBytes(directory_ / "damaged").size();
+  EXPECT_EQ(Merge("damaged", "source") + Merge("damaged", "target"), kSuccess);
+  Damage(directory_ / "damaged", size + 80);  // in what the first merge added
+  WriteBytes(directory_ / "garbage", "no registry file");
+  WriteGff(directory_ / "rootless", Json::object());
+  const std::string before = ReadBytes(directory_ / "target");
+  for (const char* const source : {"damaged", "garbage", "rootless", "missing"}) {
+    EXPECT_EQ(Merge("target", source), trouble_) << source;
+    EXPECT_EQ(ReadBytes(directory_ / "target"), before) << source;
+  }
+  EXPECT_EQ(Merge("rootless", "source"), trouble_);
+  EXPECT_EQ(Merge("missing", "source"), kNoSuchFile);
+  EXPECT_FALSE(std::filesystem::exists(directory_ / "missing"));
 }
 
 #ifndef _WIN32
 TEST_P(RecordFileTest, FileThatCannotGrowKeepsItsContentAndRecovers) {
-  {
-    const FileSizeLimit nothing(0);
-    EXPECT_EQ(IngestEntry(), kNoSuchFile);
-  }
+  EXPECT_EQ(WithFilesUpTo(0, [this] { return IngestEntry(); }), kNoSuchFile);
   ASSERT_EQ(IngestEntry(), kSuccess);
   const std::string bytes = ReadBytes(path_);
-  {
-    const FileSizeLimit full(bytes.size());
-    EXPECT_EQ(IngestEntry(1), kEntryNotWritten);
-  }
-  EXPECT_EQ(Entries(), 1U);
-  EXPECT_EQ(ReadBytes(path_).substr(0, bytes.size()), bytes);
+  EXPECT_EQ(WithFilesUpTo(bytes.size(), [this] { return IngestEntry(1); }), kEntryNotWritten);
+  EXPECT_EQ(ReadBytes(path_), bytes);
   EXPECT_EQ(IngestEntry(1), kSuccess);  // a file not given back would still hold the entry
-  EXPECT_EQ(Entries(), 2U);
+  EXPECT_GT(ReadBytes(path_).size(), bytes.size());
+}
+
+TEST_P(RecordFileTest, MergeThatCannotBeSavedIsForgotten) {
+  Make("target", {"B"}), Make("source", {"A"}), Make("empty", {});
+  const std::string before = ReadBytes(directory_ / "target");
+  const auto merge = [this] { return Merge("target", "source"); };
+  EXPECT_EQ(WithFilesUpTo(before.size(), merge), trouble_);
+  EXPECT_EQ(ReadBytes(directory_ / "target"), before);
+  EXPECT_EQ(Merge("target", "empty"), kSuccess);  // a file not given back would still hold it
+  EXPECT_FALSE(ReadGff(directory_ / "target").back().contains("A"));
 }
 #endif
 
-TEST_P(RecordFileTest, OnlyTheCurrentDescriptionIsAdded) {
-  ASSERT_EQ(IngestEntry(), kSuccess);
-  ProjectionData projection;
-  projection.rtcmProjName = L"AUTO_DHDN_BESEL", projection.prjType = L"tmerc";
-  projection.geoProj = std::make_unique<orx::cs::projmath::TUTMProj>(
-      6377397.155, 6356078.963, 8.999999998, 1.0, 0.0, 3500000.0, 0.0);
-  DatumData datum(Ingest(dhdn_, kGrid) == kSuccess ? Generator().getAllDatums()[0] : DatumData());
-  datum.targetDatumName = L"auto_dhdn_besel";
-  const auto add = [&] {
-    return isDatum_ ? support_.AddDatumToGFF(datum) : support_.AddProjectionToGFF(projection);
-  };
-  EXPECT_EQ(add(), kSuccess);
-  std::filesystem::remove(path_);
-  Damage();
-  orx::TCSInFileKey bad(path_.wstring(), nullptr, nullptr, true, 97);
-  orx::TCSInFileKey empty(L"", nullptr, nullptr, false, 97);
-  for (orx::TCSInFileKey* const file : {&bad, &empty, static_cast<orx::TCSInFileKey*>(nullptr)}) {
-    kind_.current = file;
-    EXPECT_EQ(add(), kind_.trouble);
+class DescriptionTest : public RtcmTest {
+ protected:
+  const ResultCode ingested_ = Ingest(kDhdnSet);
+  const DatumData current_{Generator().getAllDatums().at(0)};
+
+  /// Adds the current datum after a change to it.
+  template <class Change>
+  ResultCode AddDatum(const Change& change) {
+    DatumData datum(current_);
+    change(datum);
+    return support_.AddDatumToGFF(datum);
   }
-  kind_.current = &empty;
-  datum.parameters[0] += 2e-5, projection.geoProj->SetParam(1e-6, 4, 3);
-  EXPECT_EQ(add(), kNotTheCurrentDescription);
+  template <class Change>
+  ResultCode AddProjection(const Change& change) {
+    ProjectionData projection;
+    projection.rtcmProjName = L"AUTO_DHDN_BESEL", projection.prjType = L"TMERC";
+    projection.geoProj = std::make_unique<orx::cs::projmath::TUTMProj>(
+        6377397.155, 6356078.963, 8.999999998, 1.0, 0.0, 3500000.0, 0.0);
+    change(projection);
+    return support_.AddProjectionToGFF(projection);
+  }
+};
+
+TEST_F(DescriptionTest, OnlyTheCurrentOneIsAddedWithinTolerances) {
+  constexpr ResultCode kOther = kNotTheCurrentDescription;
+  EXPECT_EQ(AddDatum([](auto& d) { d.parameters[3] += 5e-8; }), kSuccess);
+  EXPECT_EQ(AddDatum([](auto& d) { d.parameters[5] += 2e-7; }), kOther);
+  EXPECT_EQ(AddDatum([](auto& d) { d.parameters[2] += 9e-6; }), kSuccess);
+  EXPECT_EQ(AddDatum([](auto& d) { d.parameters[12] -= 2e-5; }), kOther);
+  EXPECT_EQ(AddDatum([](auto& d) { d.parameters[0] = std::nan(""); }), kOther);
+  EXPECT_EQ(AddDatum([](auto& d) { d.targetDatumName = L"auto_dhdn_besel"; }), kSuccess);
+  EXPECT_EQ(AddDatum([](auto& d) { d.sourceDatumName = L"etrf89_etrf89"; }), kSuccess);
+  EXPECT_EQ(AddDatum([](auto& d) { d.sourceDatumName += L" "; }), kOther);
+  EXPECT_EQ(AddDatum([](auto& d) { d.validityArea[0] = d.heightIndicator = 3; }), kSuccess);
+  EXPECT_EQ(AddDatum([](auto& d) { d.computationIndicator = 2; }), kOther);
+  EXPECT_EQ(AddDatum([](auto& d) { d.sourceEllipsoid.second += 1e-9; }), kOther);
+  EXPECT_EQ(AddDatum([](auto& d) { d.targetEllipsoid.a = std::nan(""); }), kOther);
+  EXPECT_EQ(AddProjection([](auto& p) { p.geoProj->SetParam(0.9e-7, 2, 3); }), kSuccess);
+  EXPECT_EQ(AddProjection([](auto& p) { p.geoProj->SetParam(1.1e-7, 4, 3); }), kOther);
+  EXPECT_EQ(AddProjection([](auto& p) { p.prjType = L"tmerc"; }), kSuccess);
+  EXPECT_EQ(AddProjection([](auto& p) { p.prjType = L"OM"; }), kOther);
+  EXPECT_EQ(AddProjection([](auto& p) { p.rtcmProjName = L"auto_dhdn_besel"; }), kOther);
+  EXPECT_EQ(AddProjection([](auto& p) { p.geoProj->parameterCount = 4; }), kOther);
+  EXPECT_EQ(AddProjection([](auto& p) { p.geoProj->semiMajorAxis += 1e-3; }), kOther);
+  EXPECT_EQ(AddProjection([](auto& p) { p.geoProj->ellipsoidSecond = std::nan(""); }), kOther);
+  // An unsupported one leaves no projection behind.
+  m1025_.projectionType = 3;
+  EXPECT_EQ(Ingest(kDhdnSet), kUnsupportedProjection);
+  EXPECT_EQ(AddProjection([](auto& p) { p.prjType = L"LC"; }), kOther);
+}
+
+TEST_F(DescriptionTest, IsNotAddedToATreeThatCannotBeUsed) {
+  for (const int phi : {1, 2, 91984}) m1021_.phiV = phi, Ingest(k1021 | k1023);
+  Damage(DatumFile(), ReadBytes(DatumFile()).size() / 2);
+  orx::TCSInFileKey damaged(DatumFile().wstring(), nullptr, nullptr, true, 97);
+  orx::TCSInFileKey empty(L"", nullptr, nullptr, false, 97);
+  for (auto* const file : {&damaged, &empty, static_cast<orx::TCSInFileKey*>(nullptr)}) {
+    RTCMDataSupport::GFFDatumFile = RTCMDataSupport::GFFProjectionFile = file;
+    EXPECT_EQ(AddDatum([](auto&) {}), kDatumFileTrouble);
+    EXPECT_EQ(AddProjection([](auto&) {}), kProjectionFileTrouble);
+  }
 }
 
 }  // namespace

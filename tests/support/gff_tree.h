@@ -1,143 +1,84 @@
 #pragma once
 
-#include <charconv>
-#include <cstdint>
 #include <cstring>
-#include <filesystem>
+#include <nlohmann/json.hpp>
 #include <stdexcept>
 #include <string>
-#include <vector>
 
 #include "orxregistry/in_file_key.h"
-#include "orxregistry/registry_key.h"
-#include "store/simple_value.h"
+#include "store/key_values.h"
 
 namespace velta_test {
 
-struct GffValue {
-  std::wstring name;
-  std::uint32_t type = 0;
-  std::uint32_t size = 0;  ///< 0: text
-  std::uint8_t dimension = 1;
-  std::string bytes = {};
+/// A registry key as JSON, to be compared and changed: a sub-key is an object, a value an array of
+/// type, size, dimension and content. The content is a text or all numbers. A key's own dimension
+/// is the number "dimension", left out where it is 0.
+using Json = nlohmann::ordered_json;
 
-  bool operator==(const GffValue&) const = default;
-  /// Text, an integer, or doubles: of more than 13 the first three and the last.
-  std::string Content() const {
-    if (size == 0) {
-      std::u16string units(bytes.size() / 2 - 1, u'\0');
-      std::memcpy(units.data(), bytes.data(), units.size() * 2);
-      return " " + orx::Narrow(orx::FromUtf16(units));
-    }
-    if (size == 1) return Numbers<std::int8_t>();
-    return size == 2 ? Numbers<std::int16_t>() : size == 4 ? Numbers<int>() : Numbers<double>();
-  }
+using Dimension = std::uint8_t;
+enum ValuePart { kType, kSize, kDimension, kContent };
 
- private:
-  template <class T>
-  std::string Numbers() const {
-    std::vector<T> numbers(bytes.size() / sizeof(T));
-    std::memcpy(numbers.data(), bytes.data(), bytes.size());
-    if (numbers.size() > 13) numbers.erase(numbers.begin() + 3, numbers.end() - 1);
-    std::string all;
-    for (const T number : numbers) {
-      char text[32] = {};
-      std::to_chars(std::begin(text), std::end(text), number);
-      all += std::string(" ") + text;
-    }
-    return all;
-  }
-};
-
-/// A key of a registry file, to be looked at and changed.
-struct GffKey {
-  std::wstring name = {};
-  std::uint8_t dimension = 0;
-  std::vector<GffValue> values = {};
-  std::vector<GffKey> keys = {};
-
-  bool operator==(const GffKey&) const = default;
-  GffKey& operator[](const std::wstring& sub) { return Find(keys, sub); }
-  GffValue& Value(const std::wstring& value) { return Find(values, value); }
-  /// Of the root of an RTCM file.
-  GffKey& Container() { return keys.at(0); }
-  GffKey& Entry(std::size_t place = 0) { return Container().keys.at(place); }
-
-  void Remove(const std::wstring& item) {
-    const auto isIt = [&](const auto& candidate) { return candidate.name == item; };
-    if (std::erase_if(values, isIt) + std::erase_if(keys, isIt) != 1) throw std::out_of_range("?");
-  }
-  template <class T>
-  void Set(const std::wstring& value, const std::vector<T>& content) {
-    GffValue& changed = Value(value);
-    changed.bytes.assign(reinterpret_cast<const char*>(content.data()), content.size() * sizeof(T));
-    if (changed.size != 0) changed.size = static_cast<std::uint32_t>(changed.bytes.size());
-  }
-  /// All there is below: a key in brackets, a value as "name type size dimension content".
-  std::string Dump() const {
-    std::string text;
-    for (const GffValue& value : values) {
-      text += orx::Narrow(value.name);
-      for (const std::uint32_t number : {value.type, value.size, std::uint32_t{value.dimension}}) {
-        text += " " + std::to_string(number);
-      }
-      text += value.Content() + "\n";
-    }
-    for (const GffKey& key : keys) text += "[" + orx::Narrow(key.name) + "]\n" + key.Dump();
-    return text;
-  }
-
- private:
-  template <class Item>
-  static Item& Find(std::vector<Item>& items, const std::wstring& sought) {
-    for (Item& item : items) {
-      if (item.name == sought) return item;
-    }
-    throw std::out_of_range(orx::Narrow(sought));
-  }
-};
-
-inline orx::TGenericRegistryKey RootOf(const orx::TInKey& tree) {
-  return orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree));
+/// Calls a function with a number of the kind that values of a size consist of.
+template <class Function>
+auto WithNumberOf(std::uint32_t size, const Function& function) {
+  if (size == 1) return function(std::int8_t());
+  if (size == 2) return function(std::uint16_t());
+  return size == 4 ? function(std::int32_t()) : function(double());
 }
 
-inline GffKey ReadKey(const orx::TGenericRegistryKey& key) {
-  GffKey content{key.GetName(), key.GetKeyDim()};
+inline Json ReadKey(const orx::TGenericRegistryKey& key) {
+  Json content = Json::object();
+  if (key.GetKeyDim() != 0) content["dimension"] = key.GetKeyDim();
   for (const std::wstring& name : key.GetValueNames()) {
     orx::cs::velta::TSimpleBinValue value;
     key.GetValue(name, value, 0, false);
-    content.values.push_back({name,
-                              value.GetType(),
-                              value.GetSize(),
-                              key.GetValueDim(name),
-                              {static_cast<const char*>(value.GetData()), value.GetByteSize()}});
+    const std::uint32_t size = value.GetSize();
+    content[orx::Narrow(name)] = {value.GetType(), size, key.GetValueDim(name),
+                                  orx::Narrow(orx::GetRegValue(key, name, std::wstring(), 0))};
+    if (size == 0) continue;
+    WithNumberOf(size, [&](auto number) {
+      std::vector<decltype(number)> numbers(size / sizeof number);
+      std::memcpy(numbers.data(), value.GetData(), size);
+      content[orx::Narrow(name)][kContent] = numbers;
+    });
   }
   for (orx::TGenRegKeyIterator walk(key); walk;) {
-    content.keys.push_back(ReadKey(orx::TGenericRegistryKey(walk++)));
+    const orx::TGenericRegistryKey sub(walk++);
+    content[orx::Narrow(sub.GetName())] = ReadKey(sub);
   }
   return content;
 }
 
-inline void FillKey(orx::TGenericRegistryKey key, const GffKey& content) {
-  for (const auto& [name, type, size, dimension, bytes] : content.values) {
-    const orx::cs::velta::TSimpleBinValue value(static_cast<std::uint8_t>(type), bytes.data(),
-                                                size);
-    if (!key.AddValue(name, value, dimension, true)) throw std::runtime_error("no such value");
+inline void FillKey(orx::TGenericRegistryKey key, const Json& content) {
+  for (const auto& [name, item] : content.items()) {
+    const std::wstring wide = orx::Widen(name);
+    if (item.is_object()) FillKey({key, wide, item.value("dimension", Dimension()), true}, item);
+    if (!item.is_array()) continue;
+    const Json& held = item[kContent];
+    const auto add = [&, &value = item](const auto* bytes) {
+      const orx::cs::velta::TSimpleBinValue adaptor(value[kType], bytes, value[kSize]);
+      key.AddValue(wide, adaptor, value[kDimension], true);
+    };
+    if (item[kSize] == 0) {
+      add(orx::ToUtf16(orx::Widen(held.get<std::string>())).c_str());
+    } else {
+      WithNumberOf(item[kSize],
+                   [&](auto number) { add(held.get<std::vector<decltype(number)>>().data()); });
+    }
   }
-  for (const GffKey& sub : content.keys) FillKey({key, sub.name, sub.dimension, true}, sub);
 }
 
-inline GffKey ReadGff(const std::filesystem::path& path) {
+inline Json ReadGff(const std::filesystem::path& path) {
   const orx::TInFileKey tree(path.wstring(), nullptr, nullptr, true, 97);
   if (tree.GetErrorState() != 0) throw std::runtime_error("unreadable: " + path.string());
-  return ReadKey(RootOf(tree));
+  return ReadKey(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)));
 }
 
 /// Puts a new file in the place of one.
-inline void WriteGff(const std::filesystem::path& path, const GffKey& root) {
+inline void WriteGff(const std::filesystem::path& path, const Json& root) {
   std::filesystem::remove(path);
   orx::TInFileKey tree(L"", L"test", nullptr, false, 97);
-  FillKey(RootOf(tree), root);
+  FillKey(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)), root);
   if (!tree.Save(path.wstring(), false, 512)) throw std::runtime_error("unwritable");
 }
 

@@ -14,28 +14,20 @@ struct NumberedSet {
   explicit NumberedSet(std::uint32_t number, const std::string& datumName = "ROVERS") {
     constexpr std::int32_t kCellsInARow = 1000, kHalvesInTwo = 4;
     constexpr std::int32_t kCell = 90, kSouth = 300'000, kWest = 36'000;  // half arc-seconds
-    constexpr std::uint32_t kSpacing = 30, kArea = 22;  // half and two arc-seconds
     const auto cell = static_cast<std::int32_t>(number);
     grid.phi0 = kSouth + cell / kCellsInARow * kCell;
     grid.lambda0 = kWest + cell % kCellsInARow * kCell;
-    grid.dPhi = grid.dLambda = kSpacing;
-    grid.horShiftIndicator = true;
+    grid.dPhi = grid.dLambda = 30, grid.horShiftIndicator = true;
     for (int i = 0; i < orx::cs::velta::kResidualGridPoints; ++i) {
       grid.residualPhi[i] = i * 3 - cell % 7;
       grid.residualLambda[i] = i * 5 - cell % 11;
       grid.residualH[i] = i - cell % 13;
     }
-    datum.messageType = 21;
-    datum.sourceName = "ETRF89_ETRF89";
-    datum.targetName = datumName;
-    datum.utilizedMsgIndicator = 1;
-    datum.computationIndicator = 1;
-    datum.phiV = grid.phi0 / kHalvesInTwo;
-    datum.lambdaV = grid.lambda0 / kHalvesInTwo;
-    datum.dPhiV = datum.dLambdaV = kArea;
-    datum.dX = -584957;
-    datum.addAs = datum.addAt = 8137000;
-    datum.addBs = datum.addBt = 6752314;
+    datum.messageType = 21, datum.utilizedMsgIndicator = datum.computationIndicator = 1;
+    datum.sourceName = "ETRF89_ETRF89", datum.targetName = datumName;
+    datum.phiV = grid.phi0 / kHalvesInTwo, datum.lambdaV = grid.lambda0 / kHalvesInTwo;
+    datum.dPhiV = datum.dLambdaV = 22, datum.dX = -584957;
+    datum.addAs = datum.addAt = 8137000, datum.addBs = datum.addBt = 6752314;
   }
 
   /// Name of the entry that the set becomes.

@@ -3,14 +3,12 @@
 #ifdef _WIN32
 #include <windows.h>
 #else
-#include <dlfcn.h>
 #include <link.h>
 #include <sys/resource.h>
 
 #include <csignal>
 #endif
 
-#include <cstddef>
 #include <string>
 
 namespace velta_test {
@@ -26,25 +24,19 @@ inline bool IsSiblingLoaded() {
   return dl_iterate_phdr(isIt, nullptr) != 0;
 }
 
-/// While it lives, no file of this process grows beyond so many bytes.
-class FileSizeLimit {
- public:
-  explicit FileSizeLimit(std::size_t bytes) : handler_(std::signal(SIGXFSZ, SIG_IGN)) {
-    getrlimit(RLIMIT_FSIZE, &before_);
-    const rlimit limit{bytes, before_.rlim_max};
-    setrlimit(RLIMIT_FSIZE, &limit);
-  }
-  FileSizeLimit(const FileSizeLimit&) = delete;
-  FileSizeLimit& operator=(const FileSizeLimit&) = delete;
-  ~FileSizeLimit() {
-    setrlimit(RLIMIT_FSIZE, &before_);
-    std::signal(SIGXFSZ, handler_);
-  }
-
- private:
-  void (*handler_)(int);
-  rlimit before_ = {};
-};
+/// Calls a function while no file of this process grows beyond so many bytes.
+template <class Function>
+auto WithFilesUpTo(std::size_t bytes, const Function& function) {
+  rlimit before = {};
+  getrlimit(RLIMIT_FSIZE, &before);
+  const rlimit limit = {bytes, before.rlim_max};
+  auto* const handler = std::signal(SIGXFSZ, SIG_IGN);
+  setrlimit(RLIMIT_FSIZE, &limit);
+  const auto result = function();
+  setrlimit(RLIMIT_FSIZE, &before);
+  std::signal(SIGXFSZ, handler);
+  return result;
+}
 #endif
 
 }  // namespace velta_test

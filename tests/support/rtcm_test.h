@@ -2,12 +2,9 @@
 
 #include <gtest/gtest.h>
 
-#include <string>
-#include <vector>
-
+#include "rtcm3/json_lines.h"
 #include "support/file_bytes.h"
 #include "support/gff_tree.h"
-#include "support/message_samples.h"
 #include "support/temporary_directory.h"
 #include "velta/rtcm_data_support.h"
 #include "velta/rtcm_generator.h"
@@ -17,44 +14,59 @@ namespace velta_test {
 using namespace orx::cs::velta;
 
 constexpr double kPi = 3.141592653589793;
-constexpr double kTwoSeconds = 9.69627362219072e-06;  // radians
 constexpr double kHalfSecond = 2.42406840554768e-06;  // radians
 constexpr auto kNoSuchFile = static_cast<ResultCode>(0x80070002);
 
-/// Names of the files that the samples become.
-constexpr const char* kDhdn = "AUTO_DHDN_BESEL";
-constexpr const char* kBadekas = "Local_B_O_7";
+/// Names of the files that the worked messages become.
+constexpr auto *kDhdn = "AUTO_DHDN_BESEL", *kLocal = "Local_B_O_7";
 
-/// What of a set is handed over beside the datum message.
-enum Parts : unsigned { kDatum = 0, kGrid = 1, kPlaneGrid = 2, kProjection = 4, kAllParts = 7 };
+/// What of the messages is handed over.
+enum Parts { k1021 = 1, k1022 = 2, k1023 = 4, k1024 = 8, k1025 = 16, k1027 = 32 };
+constexpr int kDhdnSet = k1021 | k1023 | k1024 | k1025, kLocalSet = k1022 | k1023 | k1024 | k1027;
 
-/// An ingestion object with directories of its own, which do not exist yet.
+/// Changes one byte of a file.
+inline void Damage(const std::filesystem::path& path, std::size_t place) {
+  std::string bytes = ReadBytes(path);
+  bytes.at(place) ^= 1;
+  WriteBytes(path, bytes);
+}
+
+/// A message's fields by their names; null when there is no message.
+inline Json ToJson(const RtcmMessage* message) {
+  if (!message) return nullptr;
+  std::string line;
+  velta_tool::rtcm3::AppendJsonLine(velta_tool::rtcm3::FromRecord(*message), line);
+  return Json::parse(line);
+}
+
+/// The worked message of a kind. The 1021 and the 1025 are of one system, the 1022 and the 1027 of
+/// another.
+template <class Message>
+Message Worked() {
+  std::ifstream lines(WORKED_MESSAGES);
+  std::string line;
+  velta_tool::rtcm3::Message message = Rtcm1026();
+  while (!std::holds_alternative<Message>(message) && std::getline(lines, line)) {
+    message = velta_tool::rtcm3::ParseJsonLine(line);
+  }
+  return std::get<Message>(message);
+}
+
+/// The worked messages, and an ingestion object with directories of its own, which do not exist
+/// yet.
 class RtcmTest : public testing::Test {
  protected:
-  TemporaryDirectory directory_;
-  std::filesystem::path datums_ = directory_ / "new" / "datums";
-  std::filesystem::path projections_ = directory_ / "new" / "projections";
-  std::wstring datumPath_ = datums_.wstring() + L"/";
-  std::wstring projectionPath_ = projections_.wstring() + L"/";
-  RTCMDataSupport support_{datumPath_.c_str(), projectionPath_.c_str()};
-
-  template <class Datum, class Projection>
-  ResultCode Ingest(const MessageSet<Datum, Projection>& set, unsigned parts) {
-    MsgUtilized messages;
-    if constexpr (std::is_same_v<Datum, Rtcm1021>) {
-      messages.msg1021 = &set.datum;
-      messages.msg1025 = &set.projection;
-      messages.info.use1025 = (parts & kProjection) != 0;
-    } else {
-      messages.msg1022 = &set.datum;
-      messages.msg1027 = &set.projection;
-      messages.info.use1027 = (parts & kProjection) != 0;
-    }
-    messages.msg1023 = &set.grid;
-    messages.msg1024 = &set.planeGrid;
-    messages.info.use1023 = (parts & kGrid) != 0;
-    messages.info.use1024 = (parts & kPlaneGrid) != 0;
-    return support_.ParseRTCMMEssages(messages);
+  MsgUtilized Set(int parts) const {
+    MsgUtilized set;
+    if (parts & k1021) set.msg1021 = &m1021_;
+    if (parts & k1022) set.msg1022 = &m1022_;
+    set.msg1023 = &m1023_, set.msg1024 = &m1024_, set.msg1025 = &m1025_, set.msg1027 = &m1027_;
+    set.info = {!!(parts & k1023), !!(parts & k1024), !!(parts & k1025), false, !!(parts & k1027)};
+    return set;
+  }
+  ResultCode Ingest(int parts) {
+    MsgUtilized set = Set(parts);
+    return support_.ParseRTCMMEssages(set);
   }
 
   std::filesystem::path DatumFile(const std::string& name = kDhdn) const {
@@ -66,6 +78,20 @@ class RtcmTest : public testing::Test {
   RTCMGenerator Generator(const std::string& name = kDhdn) const {
     return {77, DatumFile(name).wstring(), ProjectionFile(name).wstring()};
   }
+
+  TemporaryDirectory directory_;
+  const std::filesystem::path datums_ = directory_ / "new/datums";
+  const std::filesystem::path projections_ = directory_ / "new/projections";
+  const std::wstring datumPath_ = datums_.wstring() + L"/";
+  const std::wstring projectionPath_ = projections_.wstring() + L"/";
+  RTCMDataSupport support_{datumPath_.c_str(), projectionPath_.c_str()};
+
+  Rtcm1021 m1021_ = Worked<Rtcm1021>();
+  Rtcm1022 m1022_ = Worked<Rtcm1022>();
+  Rtcm1023 m1023_ = Worked<Rtcm1023>();
+  Rtcm1024 m1024_ = Worked<Rtcm1024>();
+  Rtcm1025 m1025_ = Worked<Rtcm1025>();
+  Rtcm1027 m1027_ = Worked<Rtcm1027>();
 };
 
 }  // namespace velta_test

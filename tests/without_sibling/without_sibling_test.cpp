@@ -15,41 +15,40 @@ constexpr auto kNotLoadable = static_cast<ResultCode>(0x8007000B);
 class WithoutSiblingTest : public testing::Test {
  protected:
   WithoutSiblingTest() { std::filesystem::remove(SIBLING_FILE); }
-  ~WithoutSiblingTest() override { std::filesystem::remove(SIBLING_FILE); }
 
-  static void ExpectBoth(ResultCode loaded, ResultCode obtained) {
-    TCSInFileKey* file = nullptr;
+  void ExpectOfBothKinds(ResultCode loaded, ResultCode obtained) {
+    EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(L"x.dff", &file_), obtained);
+    EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrProjectionGFF(L"x.prj", &file_), obtained);
     EXPECT_EQ(RTCMDataSupport::GetDatumTransformationDLL(), loaded);
     EXPECT_EQ(RTCMDataSupport::GetPrjTransformationDLL(), loaded);
-    EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(L"x.dff", &file), obtained);
-    EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrProjectionGFF(L"x.prj", &file), obtained);
     RTCMDataSupport::ReleasePtrDatumGFF(L"x.dff");
     RTCMDataSupport::ReleasePtrProjectionGFF(L"x.prj");
-    EXPECT_EQ(file, nullptr);
+    EXPECT_EQ(file_, nullptr);
   }
+
+  TCSInFileKey* file_ = nullptr;
 };
 
 TEST_F(WithoutSiblingTest, AbsentLibraryIsReportedByTheFirstUse) {
   const RTCMDataSupport support;
   EXPECT_FALSE(RTCMDataSupport::DLLdatum || RTCMDataSupport::DLLprojection);
-  ExpectBoth(kNoSiblingLibrary, kNoSiblingLibrary);
+  ExpectOfBothKinds(kNoSiblingLibrary, kNoSiblingLibrary);
 }
 
 TEST_F(WithoutSiblingTest, FileThatIsNoLibraryGivesTheLoadersStatus) {
   std::ofstream(SIBLING_FILE) << "no library";
-  TCSInFileKey* file = nullptr;
-  EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(L"x.dff", &file), kNotLoadable);
-  EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrProjectionGFF(L"x.prj", &file), kNotLoadable);
+  EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(L"x.dff", &file_), kNotLoadable);
+  EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrProjectionGFF(L"x.prj", &file_), kNotLoadable);
   EXPECT_FALSE(RTCMDataSupport::DLLdatum || RTCMDataSupport::DLLprojection);
   // Once the half-loaded library is held, it is the entry point that is missing.
   const RTCMDataSupport support;
-  ExpectBoth(kNotLoadable, kNoSiblingLibrary);
+  ExpectOfBothKinds(kNotLoadable, kNoSiblingLibrary);
 }
 
 TEST_F(WithoutSiblingTest, LibraryWithoutTheEntryPointsIsNoSibling) {
   std::filesystem::copy_file(OTHER_FILE, SIBLING_FILE);
   const RTCMDataSupport support;
-  ExpectBoth(kSuccess, kNoSiblingLibrary);
+  ExpectOfBothKinds(kSuccess, kNoSiblingLibrary);
 }
 
 }  // namespace
