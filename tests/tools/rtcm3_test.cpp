@@ -4,7 +4,6 @@
 #include <regex>
 #include <span>
 #include <sstream>
-#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -39,8 +38,7 @@ class FrameReaderTest : public testing::Test {
     counts = {};
     payloads.clear();
     FrameReader reader(stream, counts);
-    while (const auto payload = reader.Next())
-      payloads.emplace_back(payload->begin(), payload->end());
+    while (const auto found = reader.Next()) payloads.emplace_back(found->begin(), found->end());
   }
 
   FrameCounts counts;
@@ -49,21 +47,18 @@ class FrameReaderTest : public testing::Test {
 
 TEST_F(FrameReaderTest, FindsTheFramesAmongEverythingElse) {
   const std::string bad = kSecond.substr(0, kSecond.size() - 1) + "?";
-  const std::string reserved("\xD3\x04\0\x5B\x9B\x90", 6);
   const std::string longest(kMaxPayload, '\xD3');
   const struct {
     std::string stream;
     std::vector<std::string> payloads;
     std::uint64_t skippedBytes, badCrcs;
   } cases[] = {
-      {"", {}, 0, 0},
-      {kFirst + kSecond, kBoth, 0, 0},
       {"noise" + kFirst + "between" + kSecond + "\xD3", kBoth, 13, 0},
       {"\xD3" + kFirst + "\xD3" + kSecond, kBoth, 2, 0},
       {std::string("\xD3\0\x13", 3) + kFirst + kSecond, kBoth, 3, 1},      // swallows a frame
       {std::string("\xD3\x03\xFF", 3) + kFirst + kSecond, kBoth, 3, 0},    // beyond the end
       {std::string("\xD3\0\x02\xD3", 4) + kFirst + kSecond, kBoth, 4, 1},  // one in another
-      {reserved + kFirst + kSecond, kBoth, 6, 0},
+      {std::string("\xD3\x04\0\x5B\x9B\x90", 6) + kFirst + kSecond, kBoth, 6, 0},  // reserved bits
       {bad + kFirst + kSecond, kBoth, bad.size(), 1},
       {Frame("") + Frame(longest), {"", longest}, 0, 0},
   };
@@ -204,7 +199,6 @@ TEST(Json, NamesThatAreNotAsciiAreUtf8) {
   const std::string json = With(Worked(1021), "sourceName", R"("Straße \"1\"")");
   const auto datum = std::get<Rtcm1021>(ParseJsonLine(json));
   EXPECT_EQ(datum.sourceName, orx::Narrow(L"Stra\u00DFe \"1\""));
-  EXPECT_EQ(datum.sourceNameCounter, 10U);
   EXPECT_EQ(JsonOf(datum), json);
 }
 
