@@ -174,8 +174,7 @@ TEST(RegistryFile, ASaveAppendsWhatIsNewAndNothingElse) {
 TEST(RegistryKey, OutlivesItsTreeAndFindsManySubKeysInTheirOrder) {
   const orx::TGenericRegistryKey key = RootOf(RegistryFile::New());
   std::vector<std::wstring> names;
-  for (int i = 0; i < 300; ++i) names.push_back(std::to_wstring(i * 7919 % 300));
-  for (const std::wstring& name : names) Open(key, name);
+  for (int i = 0; i < 300; ++i) Open(key, names.emplace_back(std::to_wstring(i * 7919 % 300)));
   orx::TGenRegKeyIterator walk(key);
   for (const std::wstring& name : names) {
     EXPECT_EQ(orx::TGenericRegistryKey(walk++).GetName(), name);

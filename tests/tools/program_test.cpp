@@ -105,6 +105,7 @@ void ExpectParts(const std::string& text, const std::vector<std::string>& parts)
   for (const std::string& part : parts) {
     from = text.find(part, from);
     ASSERT_NE(from, std::string::npos) << part << "\nis not where it should be in\n" << text;
+    from += part.size();
   }
   EXPECT_EQ(text.empty(), parts.empty()) << text;
 }
