@@ -1,23 +1,24 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
+#include <limits>
+#include <numbers>
 
 #include "orxutils/dll_func_loader.h"
 #include "orxutils/file_funcs.h"
-#include "orxutils/path.h"
+#include "projmath/ellipsoid.h"
+#include "projmath/geo_proj.h"
+#include "projmath/rect_rgn.h"
 #include "registry_fixture.h"
 #include "userdirs/user_dirs.h"
 
 namespace velta_test {
 namespace {
 
-TEST(OrxString, ConvertsBothWays) {
-  EXPECT_EQ(orx::Widen("S\xFC"
-                       "d"),
-            L"S\u00FCd");
-  EXPECT_EQ(orx::Narrow(L"S\u00FCd \u20AC"),
-            "S\xFC"
-            "d ?");
+using namespace orx::cs::projmath;
+
+TEST(OrxString, KeepsEveryCharacterThatTheOtherFormHas) {
+  EXPECT_EQ(orx::Narrow(orx::Widen("S\xFC!") + L" \u20AC"), "S\xFC! ?");
   const std::wstring odd = std::wstring(L"a\U0001F4CD") + static_cast<wchar_t>(0xD800) + L"b";
   EXPECT_EQ(orx::ToUtf16(odd), std::u16string(u"a\U0001F4CD") + char16_t{0xD800} + u"b");
   EXPECT_EQ(orx::FromUtf16(orx::ToUtf16(odd)), odd);
@@ -25,104 +26,115 @@ TEST(OrxString, ConvertsBothWays) {
   EXPECT_FALSE(orx::EqualsIgnoringCase(L"DHDN", L"DHDN "));
 }
 
-TEST(FileFuncs, TellsFilesFromDirectories) {
-  const TemporaryDirectory directory;
-  const std::wstring made = orx::ToName(directory.path()) + L"/a/g\u00E9\u4E2D \U0001F4CD/c/";
-  EXPECT_FALSE(orx::FileFuncs::isDirExists(made));
-  EXPECT_TRUE(orx::FileFuncs::createDirectoryTree(made));
-  EXPECT_TRUE(orx::FileFuncs::createDirectoryTree(made)) << "there already";
-  EXPECT_TRUE(orx::FileFuncs::isDirExists(made));
-  EXPECT_FALSE(orx::FileFuncs::isFileExists(made));
-  WriteBytes(directory / "file", "x");
-  EXPECT_TRUE(orx::FileFuncs::isFileExists((directory / "file").wstring()));
-  EXPECT_FALSE(orx::FileFuncs::createDirectoryTree((directory / "file" / "d").wstring()));
-  EXPECT_FALSE(orx::FileFuncs::isFileExists(L""));
-}
+constexpr char8_t kAnyLanguage[] = u8"g\u00E9\u4E2D \U0001F4CD";
 
 TEST(UserDirs, TheVariableReplacesTheDirectoryWhole) {
-  const auto set = [](const char* value) {
-#ifdef _WIN32
-    _putenv_s("ORX_USER_GEO_DIR", value);
-#else
-    setenv("ORX_USER_GEO_DIR", value, 1);
-#endif
-  };
-  set("/geo/data/");
+  static char set[] = "ORX_USER_GEO_DIR=/geo/data/", empty[] = "ORX_USER_GEO_DIR=";
+  putenv(set);
   EXPECT_EQ(orx::GetUserGeoDir(), L"/geo/data");
-  set("");
-  const std::wstring directory = orx::GetUserGeoDir();
-  EXPECT_EQ(directory.substr(directory.size() - 11), L"orx/geodata");
+  putenv(empty);
+  EXPECT_TRUE(orx::GetUserGeoDir().ends_with(L"orx/geodata"));
 }
 
 /// The sibling library, called as the library does.
 class GridHost : public ::testing::Test {
  protected:
   using Get = std::int32_t(const wchar_t*, orx::TCSInFileKey**);
-  using Reset = void(const wchar_t*);
 
-  GridHost() { file.Create(); }
-
-  orx::TCSInFileKey* Obtain() { return Obtain(file.path.wstring()); }
-  orx::TCSInFileKey* Obtain(const std::wstring& name) {
+  GridHost() {
+    file.path = file.directory.path() / kAnyLanguage / "a" / kAnyLanguage;
+    EXPECT_TRUE(orx::FileFuncs::createDirectoryTree(orx::ToName(file.path.parent_path())));
+    file.Create();
+  }
+  orx::TCSInFileKey* Obtain(const std::filesystem::path& path) {
     orx::TCSInFileKey* tree = nullptr;
-    result = host->GetFunc<Get>("GetPtrDatumGFF")(name.c_str(), &tree);
+    result = host->GetFunc<Get>("GetPtrDatumGFF")(orx::ToName(path).c_str(), &tree);
     return tree;
   }
-  void GiveBack() { host->GetFunc<Reset>("ResetRTCMDatumFile")(file.path.wstring().c_str()); }
+  void GiveBack() {
+    host->GetFunc<void(const wchar_t*)>("ResetRTCMDatumFile")(file.Name().c_str());
+  }
 
   RegistryFile file;
   orx::TDLLFuncWrapper host = orx::TDLLFuncLoader::LoadDLL(L"RTCMGridHost.dll");
   std::int32_t result = 0;
 };
 
-TEST_F(GridHost, HandsOutOneTreeForOneFileByAnyOfItsNames) {
-  orx::TCSInFileKey* const tree = Obtain();
+TEST_F(GridHost, HandsOutOneTreeReadAgainWhenTheFileChangedOrNobodySaved) {
+  orx::TCSInFileKey* const tree = Obtain(file.path);
   ASSERT_NE(tree, nullptr);
-  GiveBack();
-  EXPECT_EQ(Obtain(), tree);
-  EXPECT_EQ(Obtain((file.directory / "x" / ".." / "tree.dff").wstring()), tree);
-}
-
-TEST_F(GridHost, TakesNamesOfAnyLanguage) {
-  const std::wstring name = orx::ToName(file.directory.path()) + L"/g\u00E9\u4E2D \U0001F4CD.dff";
-  EXPECT_TRUE(file.Load().Save(name, false, 512));
-  ASSERT_NE(Obtain(name), nullptr);
-  EXPECT_EQ(Describe(*Obtain(name)), Describe(file.Load()));
-}
-
-TEST_F(GridHost, ReadsAgainWhatChangedOnDiskAndWhatNobodySaved) {
-  orx::TCSInFileKey* const tree = Obtain();
   RegistryFile::AddEntry(*tree, L"mine", "unsaved");
   EXPECT_TRUE(file.Append(L"theirs", "saved"));
-  Obtain();
+  EXPECT_EQ(Obtain(file.path.parent_path() / "x" / ".." / kAnyLanguage), tree) << "another name";
   EXPECT_NE(Describe(*tree).find("mine"), std::string::npos) << "somebody works on it";
   GiveBack();
   GiveBack();
-  Obtain();
-  EXPECT_EQ(Describe(*tree).find("mine"), std::string::npos) << "given back unsaved";
-  EXPECT_NE(Describe(*tree).find("theirs"), std::string::npos);
+  Obtain(file.path);
+  EXPECT_EQ(Describe(*tree), Describe(file.Load())) << "given back unsaved";
 }
 
 TEST_F(GridHost, ReportsAMissingFileAndHandsOutADamagedOne) {
-  EXPECT_EQ(Obtain((file.directory / "none.dff").wstring()), nullptr);
+  EXPECT_EQ(Obtain(file.directory / "none.dff"), nullptr);
   EXPECT_LT(result, 0);
   file.SetBytes("damaged");
-  ASSERT_NE(Obtain(), nullptr);
-  EXPECT_EQ(result, 0);
-  EXPECT_EQ(Obtain()->GetErrorState(), orx::kNotARegistryFile);
+  orx::TCSInFileKey* const tree = Obtain(file.path);
+  ASSERT_NE(tree, nullptr);
+  EXPECT_EQ(tree->GetErrorState(), orx::kNotARegistryFile);
   std::filesystem::remove(file.path);
   file.Create();
-  EXPECT_EQ(Obtain()->GetErrorState(), orx::kRegistryOk) << "mended meanwhile";
+  EXPECT_EQ(Obtain(file.path)->GetErrorState(), orx::kRegistryOk) << "mended meanwhile";
 }
 
-TEST(DllLoader, MissingAndUnloadableAreTwoThings) {
-  EXPECT_EQ(orx::TDLLFuncLoader::LoadDLL(L"NoSuchLibrary.dll"), nullptr);
-  const orx::TDLLFuncWrapper host = orx::TDLLFuncLoader::LoadDLL(L"RTCMGridHost.dll");
-  ASSERT_NE(host, nullptr);
-  EXPECT_EQ(host->GetStatus(), 0);
-  EXPECT_EQ(host->GetFunc<void()>("NoSuchFunction"), nullptr);
-  host->ReleaseDLL();
-  EXPECT_EQ(host->GetFunc<void()>("GetPtrDatumGFF"), nullptr) << "released";
+TEST(Ellipsoid, IsCompletedFromEitherDefinitionWhichStaysAsItIs) {
+  const Ellipsoid wgs84 = Ellipsoid::Wgs84();
+  EXPECT_EQ(wgs84.second, 298.257223563);
+  EXPECT_NEAR(wgs84.semiMinorAxis, 6356752.314245, 1e-6);
+  EXPECT_NEAR(wgs84.eccentricitySquared, 0.00669437999014, 1e-14);
+  EXPECT_NEAR(1.0 / Ellipsoid::FromAxes(6377397.155, 6356078.963).flattening, 299.1528, 1e-4);
+}
+
+TEST(TGeoProj, HoldsItsParametersAndNoOthers) {
+  TMercatorProj mercator(1.0, 2.0, 0, 0, 0, 0);
+  for (int i = -1; i < 20; ++i) mercator.SetParam(i + 10.0, i, kDegreesMetresRatios);
+  TGeoProj copy;
+  copy.CopyGeoProj(mercator);
+  EXPECT_EQ(copy.ellipsoidSecond, 2.0);
+  EXPECT_EQ(copy.GetParam(3, kDegreesMetresRatios), 13.0);
+  for (const int none : {-1, 4}) EXPECT_EQ(copy.GetParam(none, kDegreesMetresRatios), 0.0);
+}
+
+TEST(TRectRgn, HoldsItsEdgesAndEveryNumberOfAMeridian) {
+  constexpr double kDegree = std::numbers::pi / 180,
+                   kNaN = std::numeric_limits<double>::quiet_NaN();
+  const struct {
+    const char* what;
+    TRectRgn region;  // degrees
+    double latitude, longitude;
+    bool inside, insidePlane;
+  } cases[] = {
+      {"north-east corner", {50, 2, 8, 3}, 52, 11, true, true},
+      {"south-west corner", {50, 2, 8, 3}, 50, 8, true, true},
+      {"north of it", {50, 2, 8, 3}, 52.0001, 9, false, false},
+      {"west of it", {50, 2, 8, 3}, 51, 7.9999, false, false},
+      {"east of it", {50, 2, 8, 3}, 51, 11.0001, false, false},
+      {"two turns back", {50, 2, 8, 3}, 51, -711, true, false},
+      {"west edge by another number", {50, 2, -1, 3}, 51, 359, true, false},
+      {"east edge by another number", {50, 2, -4, 3}, 51, 359, true, false},
+      {"across the 180th meridian", {50, 2, 179, 3}, 51, -179, true, false},
+      {"across the 180th meridian, beyond", {50, 2, 179, 3}, 51, -177.9, false, false},
+      {"every latitude", {10, 180, 0, 10}, -90, 5, true, false},
+      {"every longitude", {10, 5, 100, 360}, 12, 99, true, false},
+      {"not quite every longitude", {10, 5, 100, 359}, 12, 99.5, false, false},
+      {"no extent", {10, 0, 20, 0}, 10, 20, true, true},
+      {"no latitude", {0, 180, 0, 360}, kNaN, 5, false, false},
+      {"no longitude", {0, 180, 0, 360}, 5, kNaN, false, false},
+  };
+  for (const auto& [what, region, latitude, longitude, inside, insidePlane] : cases) {
+    const TRectRgn radians{region.south * kDegree, region.northExtent * kDegree,
+                           region.west * kDegree, region.eastExtent * kDegree};
+    EXPECT_EQ(radians.Inside(latitude * kDegree, longitude * kDegree, false), inside) << what;
+    EXPECT_EQ(region.Inside(latitude, longitude, true), insidePlane) << what;
+  }
 }
 
 }  // namespace

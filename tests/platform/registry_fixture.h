@@ -2,8 +2,10 @@
 
 #include <cstdint>
 #include <string>
+#include <string_view>
 
 #include "orxregistry/in_file_key.h"
+#include "orxutils/path.h"
 #include "support/file_bytes.h"
 #include "support/temporary_directory.h"
 
@@ -12,38 +14,35 @@ namespace velta_test {
 /// A value of any description, as a caller hands it to a key or takes it from one.
 class RawValue : public orx::bin_value {
  public:
-  RawValue() = default;
-  RawValue(std::uint32_t type, std::uint32_t elementSize, std::string bytes)
-      : type_(type), size_(elementSize), bytes_(std::move(bytes)) {}
-  static RawValue Block(std::string bytes) {
-    const auto size = static_cast<std::uint32_t>(bytes.size());
-    return {orx::kByteBlock, size, std::move(bytes)};
-  }
-  static RawValue Text(const std::wstring& text) {
-    const std::u16string units = orx::ToUtf16(text) + u'\0';
-    return {orx::kWideString, 0,
-            std::string(reinterpret_cast<const char*>(units.data()), units.size() * 2)};
+  explicit RawValue(std::uint32_t type = 0, std::uint32_t elementSize = 0, std::string bytes = "")
+      : descriptor_{type, elementSize, 1}, bytes_(std::move(bytes)) {}
+  static RawValue Block(const std::string& bytes) {
+    return RawValue(orx::kByteBlock, static_cast<std::uint32_t>(bytes.size()), bytes);
   }
 
   std::int32_t SetFromDescriptor(const orx::ValueDescriptor& descriptor, const void* data,
                                  bool) override {
-    type_ = descriptor.type;
-    size_ = descriptor.size;
-    bytes_.assign(static_cast<const char*>(data), size_);
+    descriptor_ = descriptor;
+    bytes_.assign(static_cast<const char*>(data), descriptor.size);
     return 0;
   }
-  orx::ValueDescriptor GetDescriptor() const override { return {type_, size_, 1}; }
-  const void* GetRawData() const override { return GetData(); }
+  orx::ValueDescriptor GetDescriptor() const override { return descriptor_; }
+  const void* GetRawData() const override { return descriptor_.type ? bytes_.data() : nullptr; }
   std::uint32_t GetByteSize() const override { return static_cast<std::uint32_t>(bytes_.size()); }
-  std::uint32_t GetType() const override { return type_; }
-  const void* GetData() const override { return type_ == 0 ? nullptr : bytes_.data(); }
-  std::uint32_t GetSize() const override { return size_; }
+  std::uint32_t GetType() const override { return descriptor_.type; }
+  const void* GetData() const override { return GetRawData(); }
+  std::uint32_t GetSize() const override { return descriptor_.size; }
+  const std::string& bytes() const { return bytes_; }
 
  private:
-  std::uint32_t type_ = 0;
-  std::uint32_t size_ = 0;
+  orx::ValueDescriptor descriptor_;
   std::string bytes_;
 };
+
+/// Text as it is stored.
+inline std::string Units(std::u16string_view text) {
+  return {reinterpret_cast<const char*>(text.data()), text.size() * 2};
+}
 
 inline orx::TGenericRegistryKey RootOf(const orx::TInFileKey& tree) {
   return orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree));
@@ -54,12 +53,10 @@ inline std::string Describe(const orx::TGenericRegistryKey& key) {
   std::string text = "(" + std::to_string(key.GetKeyDim());
   for (const std::wstring& name : key.GetValueNames()) {
     RawValue value;
-    const bool isText = key.GetValueType(name) == orx::kWideString;
-    if (!isText) key.GetValue(name, value, 0, false);
+    key.GetValue(name, value, 0, false);
     text += " " + orx::Narrow(name) + "=" + std::to_string(key.GetValueType(name)) + ":" +
-            std::to_string(key.GetValueDim(name)) + ":";
-    text += isText ? orx::Narrow(orx::GetRegValue<std::wstring>(key, name, L"", 0))
-                   : std::string(static_cast<const char*>(value.GetData()), value.GetByteSize());
+            std::to_string(key.GetValueDim(name)) + ":" + value.bytes() +
+            orx::Narrow(orx::GetRegValue<std::wstring>(key, name, L"", 0));
   }
   for (orx::TGenRegKeyIterator walk(key); walk;) {
     const orx::TGenericRegistryKey sub(walk++);
@@ -76,17 +73,15 @@ inline orx::TGenericRegistryKey Open(const orx::TGenericRegistryKey& parent,
 }
 
 /// A registry file in a directory of its own.
-class RegistryFile {
- public:
-  explicit RegistryFile(const std::string& name = "tree.dff") : path(directory / name) {}
-
+struct RegistryFile {
   static orx::TCSInFileKey New() { return {L"", L"a description", nullptr, false, 97}; }
-  orx::TCSInFileKey Load() const { return {path.wstring(), nullptr, nullptr, true, 97}; }
+  std::wstring Name() const { return orx::ToName(path); }
+  orx::TCSInFileKey Load() const { return {Name(), nullptr, nullptr, true, 97}; }
   /// Makes the file with a container that holds one value.
   void Create(const std::string& value = "first") const {
     orx::TCSInFileKey tree = New();
     AddEntry(tree, L"S_0", value);
-    tree.Save(path.wstring(), false, 512);
+    tree.Save(Name(), false, 512);
   }
   /// Adds an entry with one value to the container of a tree.
   static void AddEntry(const orx::TInFileKey& tree, const std::wstring& entry,
@@ -104,7 +99,7 @@ class RegistryFile {
   void SetBytes(const std::string& bytes) const { WriteBytes(path, bytes); }
 
   TemporaryDirectory directory;
-  std::filesystem::path path;
+  std::filesystem::path path = directory / "tree.dff";
 };
 
 }  // namespace velta_test

@@ -1,0 +1,244 @@
+// Files as the library writes them, and files that were cut, altered or made up: the writer here
+// follows docs/gff-format.md and shares no code with the library.
+
+#include <gtest/gtest.h>
+
+#include <cstring>
+
+#include "registry_fixture.h"
+
+#define XXH_INLINE_ALL
+#include <xxhash.h>
+
+namespace velta_test {
+namespace {
+
+using namespace std::string_view_literals;
+using orx::TCSInFileKey;
+
+template <class Integer>
+std::string Int(Integer value) {
+  std::string bytes(sizeof value, '\0');
+  std::memcpy(bytes.data(), &value, sizeof value);
+  return bytes;
+}
+
+std::string Checksum(const std::string& bytes, std::uint64_t seed = 0) {
+  return Int(XXH3_64bits_withSeed(bytes.data(), bytes.size(), seed));
+}
+
+std::string Key(const std::u16string& name, const std::string& values, const std::string& keys,
+                std::uint16_t dimension = 0) {
+  return Int(values.size()) + Int(keys.size()) + Int(static_cast<std::uint16_t>(name.size())) +
+         Int(dimension) + Units(name) + values + keys;
+}
+
+std::string Value(const std::u16string& name, int type, std::uint32_t elementSize,
+                  const std::string& data, char dimension = 1) {
+  return Int(static_cast<std::uint32_t>(data.size())) + Int(elementSize) +
+         Int(static_cast<std::uint16_t>(name.size())) + static_cast<char>(type) + dimension +
+         Units(name) + data;
+}
+
+/// A file of these trees, one a segment.
+std::string File(const std::vector<std::string>& trees) {
+  std::string file = "\x89ORX\r\n\x1A\n" + Int(512U) + Int(4U) + Units(u"ab");
+  file += Checksum(file);
+  for (const std::string& tree : trees) {
+    const std::string header =
+        "SEG1" + Int(0U) + Int(tree.size()) + Int(std::uint64_t{0}) + Checksum(tree);
+    file += header + Checksum(header, file.size()) + tree;
+  }
+  return file;
+}
+
+TEST(RegistryFormat, IsReadAndWrittenAsDocumented) {
+  const RegistryFile file;
+  const std::string a = Value(u"a", 1, 2, "xy");
+  const std::string text = Value(u"t", 5, 0, Units(u"S\u00FC! \U0001F4CD\0"sv));
+  const std::string replaced = Value(u"a", 2, 1, "z", 2);
+  file.SetBytes(File({Key(u"", a, Key(u"Z\u00FC", text, "", 7)),
+                      Key(u"", replaced, Key(u"l", "", "") + Key(u"Z\u00FC", a, "", 9))}));
+  TCSInFileKey tree = file.Load();
+  const std::string shown = orx::Narrow(L"S\u00FC! \U0001F4CD");
+  EXPECT_EQ(Describe(tree), "(0 a=2:2:z Z\xFC(7 t=5:1:" + shown + " a=1:1:xy) l(0))");
+  const orx::TGenericRegistryKey key = Open(RootOf(tree), L"Z\u00FC");
+  EXPECT_EQ(orx::GetRegValue<std::wstring>(key, L"t", L"", 0), L"S\u00FC! \U0001F4CD");
+  EXPECT_EQ(orx::GetRegValue<std::wstring>(key, L"a", L"no text", 0), L"no text");
+  EXPECT_EQ(key.GetValueSize(L"t"), 14U) << "4 characters, a pair of surrogates, the end";
+  EXPECT_FALSE(key.HasValue(L"T")) << "names are exact";
+
+  std::filesystem::remove(file.path);
+  EXPECT_TRUE(tree.Save(file.Name(), false, 512));
+  EXPECT_EQ(file.Bytes(),
+            File({Key(u"", replaced, Key(u"Z\u00FC", text + a, "", 7) + Key(u"l", "", ""))}));
+}
+
+TEST(RegistryDamage, AtAnyPlaceIsDamageOrASaveThatNeverFinished) {
+  const RegistryFile file;
+  file.Create();
+  const std::string first = Describe(file.Load());
+  const std::size_t firstEnd = file.Bytes().size();
+  ASSERT_TRUE(file.Append(L"S_1", "value"));
+  const std::string second = Describe(file.Load());
+  const std::size_t secondEnd = file.Bytes().size();
+  ASSERT_TRUE(file.Append(L"S_2", "value"));
+  const std::string whole = file.Bytes();
+  const auto check = [&](const std::string& bytes, bool isDamaged, const std::string& before) {
+    file.SetBytes(bytes);
+    TCSInFileKey tree = file.Load();
+    EXPECT_EQ(tree.GetErrorState() != orx::kRegistryOk, isDamaged);
+    const std::string seen = Describe(tree);
+    EXPECT_TRUE(seen == before || (isDamaged && seen == "(0)")) << seen;
+    RegistryFile::AddEntry(tree, L"S_9", "next");
+    EXPECT_EQ(tree.Save(false, 512), !isDamaged);
+    EXPECT_EQ(file.Bytes() == bytes, isDamaged);
+    EXPECT_EQ(Describe(file.Load()) == Describe(tree), !isDamaged);
+  };
+  for (std::size_t place = 0; place < whole.size() && !HasFailure(); ++place) {
+    SCOPED_TRACE(place);
+    const std::string& before = place < secondEnd ? first : second;
+    check(whole.substr(0, place), place < firstEnd, before);
+    std::string flipped = whole;
+    flipped[place] = static_cast<char>(flipped[place] ^ 1 << place % 8);
+    check(flipped, place < secondEnd, before);
+  }
+}
+
+TEST(RegistryRecords, ThatLieAreDamage) {
+  const std::string good = Value(u"a", 1, 2, "xy");
+  std::string deep;
+  for (int i = 0; i < 100; ++i) deep = Key(u"d", "", deep);
+  std::string longName = good;
+  longName[8] = '\x7F';
+  const std::pair<const char*, std::string> cases[] = {
+      {"text without an end", Key(u"", good + Value(u"t", 5, 0, "ab"), "")},
+      {"text of no bytes", Key(u"", good + Value(u"t", 5, 0, ""), "")},
+      {"size and bytes disagree", Key(u"", good + Value(u"t", 1, 3, "ab"), "")},
+      {"no type", Key(u"", good + Value(u"t", 0, 2, "ab"), "")},
+      {"name beyond the end", Key(u"", good + longName, "")},
+      {"half a value", Key(u"", good + good.substr(0, 13), "")},
+      {"half a key", Key(u"", good, Key(u"k", "", "").substr(0, 21))},
+      {"nested too deep", Key(u"", good, deep)},
+      {"sizes that wrap around", Int(~std::uint64_t{0}) + Int(std::uint64_t{1}) + Int(0U)},
+      {"bytes behind the root", Key(u"", good, "") + "x"},
+      {"no root", ""},
+  };
+  for (const auto& [what, bytes] : cases) {
+    const RegistryFile file;
+    file.SetBytes(File({bytes}));
+    const TCSInFileKey tree = file.Load();
+    const std::string seen = Describe(tree);
+    EXPECT_EQ(tree.GetErrorState(), orx::kDamaged) << what;
+    EXPECT_TRUE(seen == "(0)" || seen.starts_with("(0 a=1:1:xy")) << what << seen;
+  }
+}
+
+TEST(RegistryFormat, WhatIsNoRegistryFileSaysSo) {
+  RegistryFile file;
+  EXPECT_EQ(file.Load().GetErrorState(), orx::kCannotBeOpened);
+  file.SetBytes(std::string(100'000, '\0'));
+  EXPECT_EQ(file.Load().GetErrorState(), orx::kNotARegistryFile);
+  file.SetBytes(File({}));
+  EXPECT_EQ(file.Load().GetErrorState(), orx::kDamaged) << "a file comes with its first segment";
+  file.path = file.directory.path();
+  EXPECT_EQ(file.Load().GetErrorState(), orx::kCannotBeOpened) << "a directory";
+}
+
+TEST(RegistryFile, AValueWhoseDescriptionAndBytesDisagreeIsRefused) {
+  TCSInFileKey tree = RegistryFile::New();
+  orx::TGenericRegistryKey key = RootOf(tree);
+  EXPECT_FALSE(key.AddValue(L"v", RawValue(), 1, true)) << "empty adaptor";
+  EXPECT_FALSE(key.AddValue(L"v", RawValue(orx::kByteBlock, 4, "123"), 1, true));
+  EXPECT_FALSE(key.AddValue(L"v", RawValue(orx::kWideString, 0, "ab"), 1, true)) << "no end";
+  const std::wstring tooLong(70'000, L'n');
+  EXPECT_FALSE(key.AddValue(tooLong, RawValue::Block("1"), 1, true));
+  EXPECT_TRUE(orx::TGenericRegistryKey(key, tooLong, 0, true).IsNull());
+  EXPECT_EQ(Describe(tree), "(0)");
+}
+
+TEST(RegistryFile, ASaveAppendsWhatIsNewAndNothingElse) {
+  const RegistryFile file;
+  file.Create(std::string(10'000, 'x'));
+  const std::string before = file.Bytes();
+  ASSERT_TRUE(file.Append(L"S_1", "second"));
+  const std::string after = file.Bytes();
+  EXPECT_TRUE(after.starts_with(before));
+  EXPECT_LT(after.size() - before.size(), 250U);
+
+  EXPECT_TRUE(file.Append(L"S_1", "second"));
+  EXPECT_EQ(file.Bytes(), after) << "the same value again is no change";
+  EXPECT_FALSE(file.Load().Save(false, 511)) << "no such registry version";
+}
+
+TEST(RegistryKey, OutlivesItsTreeAndFindsManySubKeysInTheirOrder) {
+  const orx::TGenericRegistryKey key = RootOf(RegistryFile::New());
+  std::vector<std::wstring> names;
+  for (int i = 0; i < 300; ++i) Open(key, names.emplace_back(std::to_wstring(i * 7919 % 300)));
+  orx::TGenRegKeyIterator walk(key);
+  for (const std::wstring& name : names) {
+    EXPECT_EQ(orx::TGenericRegistryKey(walk++).GetName(), name);
+    EXPECT_TRUE(key.HasKey(name));
+  }
+  EXPECT_EQ(walk++, nullptr);
+  EXPECT_FALSE(key.HasKey(L"300"));
+}
+
+TEST(RegistryFile, TwoWritersLoseNothingWhileItIsWrittenAfreshNowAndThen) {
+  const RegistryFile file;
+  file.Create();
+  TCSInFileKey one = file.Load(), other = file.Load();
+  std::string entries;
+  for (const char letter : "abcdefghijklmnopqrst"sv) {
+    const std::string name(1, letter), replacing(1000, letter);
+    RegistryFile::AddEntry(one, orx::Widen(name), "1");
+    RegistryFile::AddEntry(other, L"S_0", replacing);
+    ASSERT_TRUE(one.Save(false, 512) && other.Save(false, 512));
+    entries += " " + name + "(0 value=1:1:1)";
+    EXPECT_EQ(Describe(file.Load()),
+              "(0 container(0 S_0(0 value=1:1:" + replacing + ")" + entries + "))");
+    EXPECT_LT(file.Bytes().size(), 6000U) << "half of it is superseded at most";
+  }
+}
+
+TEST(RegistryFile, ANewFileNeverReplacesOne) {
+  const RegistryFile file;
+  file.Create();
+  EXPECT_FALSE(RegistryFile::New().Save(file.Name(), false, 512));
+  EXPECT_FALSE(TCSInFileKey(file.Name(), nullptr, nullptr, false, 97).Save(false, 512));
+  EXPECT_EQ(Describe(file.Load()), "(0 container(0 S_0(0 value=1:1:first)))");
+  EXPECT_EQ(std::distance(std::filesystem::directory_iterator(file.directory.path()), {}), 1)
+      << "nothing is left beside it";
+}
+
+TEST(RegistryFile, ALostFileIsNotASuccess) {
+  const RegistryFile file;
+  TCSInFileKey tree(file.Name(), nullptr, nullptr, false, 97U);
+  EXPECT_TRUE(tree.Save(false, 512)) << "a new tree makes its file";
+  EXPECT_TRUE(tree.Save(false, 512)) << "and then goes on with it";
+  std::filesystem::remove(file.path);
+  EXPECT_FALSE(tree.Save(false, 512)) << "nothing to write, but nothing is safe either";
+  RegistryFile::AddEntry(tree, L"S_1", "new");
+  EXPECT_FALSE(tree.Save(false, 512));
+  file.Create();
+  EXPECT_TRUE(tree.Save(false, 512)) << "what a failed save left is kept for another try";
+  EXPECT_NE(Describe(file.Load()).find("S_1"), std::string::npos);
+}
+
+TEST(RegistryKey, DeepCopyLaysTheSourceOverTheTarget) {
+  const TCSInFileKey tree = RegistryFile::New(), other = RegistryFile::New();
+  RegistryFile::AddEntry(tree, L"both", "old");
+  RegistryFile::AddEntry(tree, L"mine", "kept");
+  RegistryFile::AddEntry(other, L"new", "new");
+  RegistryFile::AddEntry(other, L"both", "new");
+  orx::TGenericRegistryKey root = RootOf(tree);
+  root.DeepCopy(RootOf(other));
+  const std::string content =
+      "(0 container(0 both(0 value=1:1:new) mine(0 value=1:1:kept) new(0 value=1:1:new))";
+  EXPECT_EQ(Describe(tree), content + ")");
+  Open(root, L"inside").DeepCopy(root);
+  EXPECT_TRUE(Describe(Open(root, L"inside")).starts_with(content));
+}
+
+}  // namespace
+}  // namespace velta_test

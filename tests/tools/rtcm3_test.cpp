@@ -1,0 +1,206 @@
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <regex>
+#include <span>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include "orxutils/orx_string.h"
+#include "rtcm3/fields.h"
+#include "tools/worked_messages.h"
+
+namespace velta_test {
+namespace {
+
+using namespace velta_tool::rtcm3;
+
+std::string Frame(const std::string& payload) {
+  std::string frame;
+  AppendFrame(payload, frame);
+  return frame;
+}
+
+/// A stream that has no more to give for now: who asks waits for ever.
+struct LiveStream : std::stringbuf {
+  using std::stringbuf::stringbuf;
+  int_type underflow() override { throw std::logic_error("waits"); }
+};
+
+const std::string kFirst = Frame("first payload");
+const std::string kSecond = Frame("second");
+const std::vector<std::string> kBoth = {"first payload", "second"};
+
+class FrameReaderTest : public testing::Test {
+ protected:
+  void Read(std::streambuf&& stream) {
+    counts = {};
+    payloads.clear();
+    FrameReader reader(stream, counts);
+    while (const auto found = reader.Next()) payloads.emplace_back(found->begin(), found->end());
+  }
+
+  FrameCounts counts;
+  std::vector<std::string> payloads;
+};
+
+TEST_F(FrameReaderTest, FindsTheFramesAmongEverythingElse) {
+  const std::string bad = kSecond.substr(0, kSecond.size() - 1) + "?";
+  const std::string longest(kMaxPayload, '\xD3');
+  const struct {
+    std::string stream;
+    std::vector<std::string> payloads;
+    std::uint64_t skippedBytes, badCrcs;
+  } cases[] = {
+      {"noise" + kFirst + "between" + kSecond + "\xD3", kBoth, 13, 0},
+      {"\xD3" + kFirst + "\xD3" + kSecond, kBoth, 2, 0},
+      {std::string("\xD3\0\x13", 3) + kFirst + kSecond, kBoth, 3, 1},      // swallows a frame
+      {std::string("\xD3\x03\xFF", 3) + kFirst + kSecond, kBoth, 3, 0},    // beyond the end
+      {std::string("\xD3\0\x02\xD3", 4) + kFirst + kSecond, kBoth, 4, 1},  // one in another
+      {std::string("\xD3\x04\0\x5B\x9B\x90", 6) + kFirst + kSecond, kBoth, 6, 0},  // reserved bits
+      {bad + kFirst + kSecond, kBoth, bad.size(), 1},
+      {Frame("") + Frame(longest), {"", longest}, 0, 0},
+  };
+  for (const auto& test : cases) {
+    SCOPED_TRACE(testing::PrintToString(test.stream));
+    Read(std::stringbuf(test.stream));
+    EXPECT_EQ(payloads, test.payloads);
+    EXPECT_EQ(counts.bytes, test.stream.size());
+    EXPECT_EQ(counts.frames, test.payloads.size());
+    EXPECT_EQ(counts.skippedBytes, test.skippedBytes);
+    EXPECT_EQ(counts.badCrcs, test.badCrcs);
+  }
+}
+
+TEST_F(FrameReaderTest, ACutOrAFlippedBitAnywhereCostsThatFrameOnly) {
+  for (std::size_t bit = 0; bit < kFirst.size() * 8; ++bit) {
+    SCOPED_TRACE(bit);
+    std::string broken = kFirst;
+    broken[bit / 8] = static_cast<char>(broken[bit / 8] ^ 1 << bit % 8);
+    Read(std::stringbuf(broken + kSecond + kFirst.substr(0, bit / 8)));
+    EXPECT_EQ(payloads, std::vector{kBoth[1]});
+    EXPECT_EQ(counts.skippedBytes, kFirst.size() + bit / 8);
+  }
+}
+
+TEST_F(FrameReaderTest, LongStreamLosesNothingWhereItsBufferEnds) {
+  std::string stream;
+  std::vector<std::string> sent;
+  for (std::size_t i = 0; stream.size() < 300'000; ++i) {
+    sent.emplace_back(i * 37 % (kMaxPayload + 1), static_cast<char>(i));
+    stream += Frame(sent.back()) + std::string(i % 5, '.');
+  }
+  Read(std::stringbuf(stream));
+  EXPECT_EQ(payloads, sent);
+}
+
+TEST_F(FrameReaderTest, LiveFrameIsHandedOutBeforeMoreIsAwaited) {
+  EXPECT_THROW(Read(LiveStream(kFirst + "?" + kSecond)), std::logic_error);
+  EXPECT_EQ(payloads, kBoth);
+}
+
+std::string PayloadOf(const std::string& frame) { return frame.substr(3, frame.size() - 6); }
+
+std::string JsonOf(const Message& message) {
+  std::string line;
+  AppendJsonLine(message, line);
+  line.pop_back();
+  return line;
+}
+
+/// What comes out of a payload: the message's JSON, or nothing when it is too short.
+std::string JsonOfPayload(const std::string& payload) {
+  Message message;
+  const std::span bytes(reinterpret_cast<const std::uint8_t*>(payload.data()), payload.size());
+  return Decode(bytes, message) == Decoded::kMessage ? JsonOf(message) : "";
+}
+
+/// For each message from 1021 to 1027.
+class Codec : public testing::TestWithParam<unsigned> {
+ protected:
+  const std::string json = Worked(GetParam());
+};
+INSTANTIATE_TEST_SUITE_P(Of, Codec, testing::Range(1021U, 1028U));
+
+TEST_P(Codec, WorkedMessageIsItsFrameBothWaysUnlessItIsCut) {
+  EXPECT_EQ(FrameOf(json), FromHex(Worked(GetParam(), "worked_frames.hex")));
+  const std::string payload = PayloadOf(FrameOf(json));
+  for (std::size_t size = 0; size < payload.size(); ++size) {
+    EXPECT_EQ(JsonOfPayload(payload.substr(0, size)), "") << size;
+  }
+  EXPECT_EQ(JsonOfPayload(payload + "grown"), json);
+}
+
+std::string ErrorOf(const std::string& line) {
+  try {
+    return JsonOf(ParseJsonLine(line));
+  } catch (const FieldError& error) {
+    return error.what();
+  }
+}
+
+TEST_P(Codec, EveryFieldTravelsFromEndToEndOfItsRange) {
+  const std::regex fields(R"re("(\w+)": \[?(-?\d+))re"), ends("must be .* from (-?\\d+) to (\\d+)");
+  for (std::sregex_iterator field(json.begin(), json.end(), fields), none; field != none; ++field) {
+    if (field->str(1) == "message") continue;
+    const std::string before(json.begin(), (*field)[2].first);
+    const std::string behind((*field)[2].second, json.end());
+    const std::string error = ErrorOf(before + "99999999999" + behind);
+    std::smatch range;
+    ASSERT_TRUE(std::regex_search(error, range, ends)) << error;
+    for (const std::string& end : {range.str(1), range.str(2)}) {
+      const std::string changed = before + end + behind;
+      EXPECT_EQ(JsonOfPayload(PayloadOf(FrameOf(changed))), changed);
+    }
+  }
+}
+
+TEST(Encode, RecordThatDoesNotFitIsRefusedWhole) {
+  Rtcm1022 datum;
+  datum.targetName.assign(32, 'x');
+  Rtcm1023 grid;
+  grid.residualH[15] = 256;
+  std::string out = "before";
+  EXPECT_THROW(Encode(datum, out), FieldError);
+  EXPECT_THROW(Encode(grid, out), FieldError);
+  EXPECT_EQ(out, "before");
+}
+
+TEST(Json, WhatIsWrongIsNamedWithFieldAndRange) {
+  const struct {
+    unsigned message;
+    const char *field, *value;
+    std::string error;
+  } cases[] = {
+      {1021, "message", "1020", "message must be an integer from 1021 to 1027, not 1020"},
+      {1021, "message", "1025", "projectionType is missing"},
+      {1021, "sourceName", "5", "sourceName must be a text of at most 31 ISO 8859-1 characters"},
+      {1021, "targetName", "\"32345678901234567890123456789012\"", "targetName must be a text of"},
+      {1021, "targetName", "\"\u0141\"", "targetName must be a text of at most 31"},
+      {1023, "mjd", "0, \"mjD\": 1", "mjD is no field of the message"},
+      {1023, "phi0", "1048576", "phi0 must be an integer from -1048576 to 1048575, not 1048576"},
+      {1023, "mjd", "-1", "mjd must be an integer from 0 to 65535, not -1"},
+      {1023, "mjd", "1.0", "mjd must be an integer from 0 to 65535, not 1.0"},
+      {1023, "horShiftIndicator", "2", "horShiftIndicator must be an integer from 0 to 1, not 2"},
+      {1027, "laPC", "18446744073709551615", "laPC must be an integer from -8589934592 to"},
+      {1023, "residualPhi", "[1,2,3,4,5,6,7,8,9,0,1,2,3,4,5,6,7]", "residualPhi must be an array"},
+      {1023, "residualH", "[0,0,0,256,0,0,0,0,0,0,0,0,0,0,0,0]", "residualH[3] must be an integer"},
+  };
+  for (const auto& [message, field, value, error] : cases) {
+    EXPECT_EQ(ErrorOf(With(Worked(message), field, value)).substr(0, error.size()), error);
+  }
+  for (const char* line : {"", "[1021]", "{\"message\": 1021", "\"\xFF\""}) {
+    EXPECT_EQ(ErrorOf(line), "not a JSON object");
+  }
+}
+
+TEST(Json, NamesThatAreNotAsciiAreUtf8) {
+  const std::string json = With(Worked(1021), "sourceName", R"("Straße \"1\"")");
+  const auto datum = std::get<Rtcm1021>(ParseJsonLine(json));
+  EXPECT_EQ(datum.sourceName, orx::Narrow(L"Stra\u00DFe \"1\""));
+  EXPECT_EQ(JsonOf(datum), json);
+}
+
+}  // namespace
+}  // namespace velta_test
