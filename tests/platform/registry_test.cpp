@@ -240,5 +240,29 @@ TEST(RegistryKey, DeepCopyLaysTheSourceOverTheTarget) {
   EXPECT_TRUE(Describe(Open(root, L"inside")).starts_with(content));
 }
 
+TEST(RegistryKey, ACopyOutlivesItsFileAndIsSavedWithWhatWasChangedInIt) {
+  const RegistryFile source, target;
+  target.Create();
+  const std::string lie = Key(u"lie", Value(u"a", 1, 1, "x") + Value(u"b", 0, 1, "y"), "");
+  source.SetBytes(File({Key(u"", "", lie + Key(u"S_0", Value(u"value", 1, 1, "x"), "", 7))}));
+  TCSInFileKey tree = target.Load();
+  {
+    const TCSInFileKey other = source.Load();
+    for (const std::wstring name : {L"lie", L"S_0", L"S_1"}) {
+      Open(RootOf(tree), name).DeepCopy(Open(RootOf(other), name == L"lie" ? name : L"S_0"));
+    }
+    EXPECT_EQ(other.GetErrorState(), orx::kDamaged);
+  }
+  source.SetBytes("");
+  Open(RootOf(tree), L"S_1").AddValue(L"value", RawValue::Block("changed"), 1, true);
+  RegistryFile::AddEntry(tree, L"S_2", "new");
+  const std::string content = Describe(tree);
+  EXPECT_NE(content.find(" lie(0 a=1:1:x) S_0(0 value=1:1:x) S_1(0 value=1:1:changed)"),
+            std::string::npos)
+      << content;
+  EXPECT_TRUE(tree.Save(false, 512));
+  EXPECT_EQ(Describe(target.Load()), content);
+}
+
 }  // namespace
 }  // namespace velta_test

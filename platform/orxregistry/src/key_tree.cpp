@@ -196,7 +196,7 @@ void KeyTree::DeepCopy(Key& to, Key& from) {
     }
   }
   for (const ValueRecord value : source.Values(from)) SetValue(to, record::ValueAt(value));
-  // A key laid over one of its own sub-keys grows while it is walked: only what it held counts.
+  // A source inside the target can get new keys meanwhile.
   const std::size_t count = source.Keys(from).size();
   for (std::size_t i = 0; i < count; ++i) {
     Key* const key = source.Keys(from)[i];
