@@ -1,25 +1,54 @@
 # What "cmake --install" lays down: the libraries, the program, and the package that other projects
-# find with find_package(velta CONFIG). The tree can be moved as a whole.
+# find with find_package(velta CONFIG). The tree can be moved as a whole. In parts: "library" is
+# what a program needs to run, "development" what it needs besides to be built, and "program" the
+# companion program.
 
 include(CMakePackageConfigHelpers)
 
 set(platform_libraries orxutils userdirs projmath orxregistry)
+set(package_directory ${CMAKE_INSTALL_LIBDIR}/cmake/velta)
 set_target_properties(${platform_libraries} velta RTCMGridHost PROPERTIES INSTALL_RPATH "$ORIGIN")
-install(TARGETS ${platform_libraries} EXPORT orxTargets)
-install(TARGETS velta EXPORT veltaTargets)
+set_target_properties(${platform_libraries} velta PROPERTIES
+  VERSION ${PROJECT_VERSION}
+  SOVERSION ${PROJECT_VERSION_MAJOR})
+
+foreach(export orx velta)
+  set(targets ${export})
+  if(export STREQUAL orx)
+    set(targets ${platform_libraries})
+  endif()
+  install(TARGETS ${targets} EXPORT ${export}Targets
+          RUNTIME COMPONENT library
+          LIBRARY COMPONENT library NAMELINK_COMPONENT development
+          ARCHIVE COMPONENT development)
+  install(EXPORT ${export}Targets NAMESPACE ${export}:: DESTINATION ${package_directory}
+          COMPONENT development)
+endforeach()
 # Found at run time beside the library that asks for it.
-install(TARGETS RTCMGridHost
+install(TARGETS RTCMGridHost COMPONENT library
         LIBRARY DESTINATION $<IF:$<BOOL:${WIN32}>,${CMAKE_INSTALL_BINDIR},${CMAKE_INSTALL_LIBDIR}>)
 
-install(DIRECTORY include/ DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
-foreach(library ${platform_libraries})
-  install(DIRECTORY platform/${library}/include/ DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
-endforeach()
+install(TARGETS velta-tool EXPORT veltaProgramTargets RUNTIME COMPONENT program)
+install(EXPORT veltaProgramTargets NAMESPACE velta:: DESTINATION ${package_directory}
+        COMPONENT program)
 
-set(package_directory ${CMAKE_INSTALL_LIBDIR}/cmake/velta)
-install(EXPORT orxTargets NAMESPACE orx:: DESTINATION ${package_directory})
-install(EXPORT veltaTargets NAMESPACE velta:: DESTINATION ${package_directory})
+install(DIRECTORY include/ TYPE INCLUDE COMPONENT development)
+foreach(library ${platform_libraries})
+  install(DIRECTORY platform/${library}/include/ TYPE INCLUDE COMPONENT development)
+endforeach()
+configure_package_config_file(cmake/veltaConfig.cmake.in ${CMAKE_BINARY_DIR}/veltaConfig.cmake
+                              INSTALL_DESTINATION ${package_directory}
+                              PATH_VARS CMAKE_INSTALL_BINDIR)
 write_basic_package_version_file(${CMAKE_BINARY_DIR}/veltaConfigVersion.cmake
                                  COMPATIBILITY SameMajorVersion)
-install(FILES cmake/veltaConfig.cmake ${CMAKE_BINARY_DIR}/veltaConfigVersion.cmake
-        DESTINATION ${package_directory})
+install(FILES ${CMAKE_BINARY_DIR}/veltaConfig.cmake ${CMAKE_BINARY_DIR}/veltaConfigVersion.cmake
+        DESTINATION ${package_directory} COMPONENT development)
+
+install(FILES README.md DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT development)
+install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT development
+        FILES_MATCHING PATTERN *.md)
+install(FILES examples/library_usage.cpp DESTINATION ${CMAKE_INSTALL_DOCDIR}/examples
+        COMPONENT development)
+install(DIRECTORY examples/outside DESTINATION ${CMAKE_INSTALL_DOCDIR}/examples
+        COMPONENT development)
+install(DIRECTORY examples/streams DESTINATION ${CMAKE_INSTALL_DOCDIR}/examples COMPONENT program)

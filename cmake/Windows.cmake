@@ -13,4 +13,13 @@ foreach(name libstdc++-6.dll libgcc_s_seh-1.dll libwinpthread-1.dll)
   list(APPEND runtime_files ${file})
 endforeach()
 file(COPY ${runtime_files} DESTINATION ${CMAKE_RUNTIME_OUTPUT_DIRECTORY})
-install(FILES ${runtime_files} DESTINATION ${CMAKE_INSTALL_BINDIR})
+install(FILES ${runtime_files} DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT library)
+# For who builds against the package where this was built.
+install(FILES cmake/mingw-w64.cmake DESTINATION ${CMAKE_INSTALL_LIBDIR}/cmake/velta
+        COMPONENT development)
+
+# add_skipped_test(NAME REASON): stands for tests that cannot run here, and says why.
+function(add_skipped_test name reason)
+  add_test(NAME ${name} COMMAND ${CMAKE_COMMAND} -E echo "${name}: Skipped\n${reason}")
+  set_tests_properties(${name} PROPERTIES SKIP_REGULAR_EXPRESSION ": Skipped")
+endfunction()

@@ -61,9 +61,16 @@ build() {
   step "Building $preset" cmake --build --preset "$preset" ${1:+--target "$@"}
 }
 
+# at_exit COMMAND...: has it run when the script ends, after those that were named earlier.
+exit_commands=
+at_exit() {
+  exit_commands+="$(printf '%q ' "$@"); "
+  trap "$exit_commands" EXIT
+}
+
 # One Wine server for everything that the script runs: a start for each program takes seconds. It
 # ends with the script.
 start_wine() {
   step "Starting Wine" scripts/wine --start
-  trap 'scripts/wine --stop' EXIT
+  at_exit scripts/wine --stop
 }

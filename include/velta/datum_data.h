@@ -14,7 +14,7 @@ struct DatumData {
   projmath::Ellipsoid sourceEllipsoid = projmath::Ellipsoid::Wgs84();  ///< of the source system
   projmath::Ellipsoid targetEllipsoid = projmath::Ellipsoid::Wgs84();  ///< of the target system
   COrxStringT<wchar_t> targetDatumName;  ///< also the base name of the datum's file
-  COrxStringT<wchar_t> sourceDatumName;
+  COrxStringT<wchar_t> sourceDatumName;  ///< "WGS84", "ETRS89", "ITRF", or as received
   /// dX, dY, dZ (m); R1, R2, R3 (arc-seconds); dS (ppm); XP, YP, ZP of the rotation point (m);
   /// three that are always 0.
   double parameters[13] = {};
@@ -22,8 +22,8 @@ struct DatumData {
   double validityArea[4] = {};
   double validityCentre[2] = {};           ///< latitude, longitude
   std::uint32_t computationIndicator = 0;  ///< method, 0 to 3; 3 is Molodenski-Badekas
-  std::uint32_t heightIndicator = 0;
-  TableData grid;  ///< ellipsoidal residual grid of a 1023
+  std::uint32_t heightIndicator = 0;       ///< height indicator code, as received
+  TableData grid;                          ///< ellipsoidal residual grid of a 1023
   /// Name under which the caller knows the datum's ellipsoid; empty until the caller sets it.
   COrxStringT<wchar_t> ellipsoidName;
 
@@ -60,8 +60,8 @@ struct DatumData {
 
 /// Summary of a datum for the caller's own list of datums.
 struct CustomDatumData {
-  COrxStringT<wchar_t> ellipsoidName;
-  COrxStringT<wchar_t> datumName;
+  COrxStringT<wchar_t> ellipsoidName;      ///< as the caller named it; empty before
+  COrxStringT<wchar_t> datumName;          ///< name of the target datum
   COrxStringT<wchar_t> datumGroup;         ///< always "RTCM"
   COrxStringT<wchar_t> transformationDll;  ///< always "RTCMGridHost.dll"
 };

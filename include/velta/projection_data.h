@@ -57,12 +57,12 @@ struct ProjectionData {
 
 /// Summary of a projection for the caller's own list of projections.
 struct CustomProjectionData {
-  COrxStringT<wchar_t> projectionName;
+  COrxStringT<wchar_t> projectionName;     ///< name that the projection goes by
   COrxStringT<wchar_t> projectionGroup;    ///< always "RTCM"
   COrxStringT<wchar_t> transformationDll;  ///< always "RTCMGridHost.dll"
-  COrxStringT<wchar_t> datumName;
-  COrxStringT<wchar_t> projectionType;
-  COrxStringT<wchar_t> unitName;  ///< always "Meters"
+  COrxStringT<wchar_t> datumName;          ///< datum that the projection belongs to
+  COrxStringT<wchar_t> projectionType;     ///< as in `ProjectionData::prjType`
+  COrxStringT<wchar_t> unitName;           ///< always "Meters"
 };
 
 }  // namespace orx::cs::velta

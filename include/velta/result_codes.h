@@ -10,23 +10,37 @@ using ResultCode = std::int32_t;
 
 /// A result code and what it says to a person.
 struct ResultMeaning {
-  ResultCode code;
-  const char* meaning;
+  ResultCode code;      ///< as an operation answers it
+  const char* meaning;  ///< in English; static text
 };
 
+/// Done, or the entry was already there.
 inline constexpr ResultCode kSuccess = 0;
+/// The description is not the object's current one; nothing is written.
 inline constexpr ResultCode kNotTheCurrentDescription = 1;
+/// A stored value is of another type or size than the adaptor that reads it.
 inline constexpr ResultCode kValueRefused = static_cast<ResultCode>(0x80040401);
+/// The datum file is damaged, missing, without its container key, or not saved.
 inline constexpr ResultCode kDatumFileTrouble = static_cast<ResultCode>(0x80040632);
+/// The datum message announces a 1023, and there is none.
 inline constexpr ResultCode kMissing1023 = static_cast<ResultCode>(0x80040633);
+/// The entry could not be written or the file not saved.
 inline constexpr ResultCode kEntryNotWritten = static_cast<ResultCode>(0x80040634);
+/// The computation indicator is above 3, or not 3 in a 1022.
 inline constexpr ResultCode kBadComputationIndicator = static_cast<ResultCode>(0x80040635);
+/// The directory of the files does not exist and cannot be made.
 inline constexpr ResultCode kNoDirectory = static_cast<ResultCode>(0x80040636);
+/// The projection type is not supported.
 inline constexpr ResultCode kUnsupportedProjection = static_cast<ResultCode>(0x80040638);
+/// The set requires a 1024, 1025 or 1027, and there is none.
 inline constexpr ResultCode kMissingProjectionPart = static_cast<ResultCode>(0x80040639);
+/// The projection file is damaged, missing, without its container key, or not saved.
 inline constexpr ResultCode kProjectionFileTrouble = static_cast<ResultCode>(0x80040640);
+/// The set has neither a 1021 nor a 1022.
 inline constexpr ResultCode kNoDatumMessage = static_cast<ResultCode>(0x80040642);
+/// There is no target datum name.
 inline constexpr ResultCode kNoDatumName = static_cast<ResultCode>(0x80040643);
+/// RTCMGridHost cannot be loaded or lacks an entry point.
 inline constexpr ResultCode kNoSiblingLibrary = static_cast<ResultCode>(0x80040644);
 
 /// Every result code of this library with its meaning.

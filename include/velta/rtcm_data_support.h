@@ -73,11 +73,15 @@ class RTCMDataSupport {
   /// Gives a projection file back to the sibling library. Never fails.
   VELTA_EXPORT static void ReleasePtrProjectionGFF(const COrxStringT<wchar_t>& fileName);
 
+  /// Directory of the datum files, as given to the constructor.
   VELTA_EXPORT COrxStringT<wchar_t> GetDatumPath() const;
+  /// Directory of the projection files, as given to the constructor.
   VELTA_EXPORT COrxStringT<wchar_t> GetProjectionPath() const;
   /// Region of the last datum message's tectonic plate; empty before the first.
   VELTA_EXPORT COrxStringT<wchar_t> GetRegionName();
+  /// The current datum's source system; empty before the first.
   VELTA_EXPORT COrxStringT<wchar_t> GetSourceDatumName() const;
+  /// The current datum's name, also the base name of its file; empty before the first.
   VELTA_EXPORT COrxStringT<wchar_t> GetTargetDatumName() const;
   /// The current datum's source ellipsoid; the reference lives as long as the object.
   VELTA_EXPORT projmath::Ellipsoid& GetDatumSourceEllipsoid();
@@ -106,6 +110,7 @@ class RTCMDataSupport {
   VELTA_EXPORT UtilizedMsgInfo& GetUtilizedMessageInfo(RtcmBasicTransformMessage& message);
 
   /// Makes a 1021 the current datum and adds it to the datum file of its target datum.
+  /// \param message the 1021
   /// \param grid the 1023 that belongs to it, or null
   /// \return 0 (also when the entry was there), kMissing1023, kBadComputationIndicator,
   ///     kNoDirectory, kDatumFileTrouble, kEntryNotWritten, kNoSiblingLibrary, the loader's status,
@@ -120,6 +125,7 @@ class RTCMDataSupport {
   VELTA_EXPORT ResultCode AddDatumToGFF(DatumData& description);
 
   /// Makes a 1025 the current projection and adds it to the projection file of the current datum.
+  /// \param message the 1025
   /// \param grid the 1024 that belongs to it, or null
   /// \return 0 (also when the entry was there), kNoDatumName, kUnsupportedProjection,
   ///     kNoDirectory, kProjectionFileTrouble, kEntryNotWritten, kNoSiblingLibrary, the loader's

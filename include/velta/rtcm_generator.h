@@ -26,7 +26,9 @@ class VELTA_EXPORT RTCMGenerator {
   /// \param projFileName full path of the projection file; it need not exist
   RTCMGenerator(std::int32_t id, const COrxStringT<wchar_t>& datumFileName,
                 const COrxStringT<wchar_t>& projFileName);
+  /// A copy takes over the number and the two names.
   RTCMGenerator(const RTCMGenerator& other);
+  /// Takes over the number and the two names.
   RTCMGenerator& operator=(const RTCMGenerator& other);
   virtual ~RTCMGenerator();
 
@@ -67,7 +69,9 @@ class VELTA_EXPORT RTCMGenerator {
   /// The projection type of a stored type string, ignoring case; NONE for an unknown one.
   static ProjectionData::projList getRtcmPrjTypeFromString(const COrxStringT<wchar_t>& type);
 
+  /// The datum file that queries read.
   COrxStringT<wchar_t> datumFileName() const;
+  /// The projection file that queries read.
   COrxStringT<wchar_t> projFileName() const;
   /// Names the datum file that the next query reads.
   void setDatumFileName(const COrxStringT<wchar_t>& name);

@@ -157,11 +157,11 @@ struct Rtcm1027 : RtcmMessage {
 
 /// Which further messages belong to a datum message.
 struct UtilizedMsgInfo {
-  bool use1023 = false;
-  bool use1024 = false;
-  bool use1025 = false;
-  bool use1026 = false;
-  bool use1027 = false;
+  bool use1023 = false;  ///< bit 0 of the datum message's indicator
+  bool use1024 = false;  ///< bit 1
+  bool use1025 = false;  ///< bit 2
+  bool use1026 = false;  ///< bit 3
+  bool use1027 = false;  ///< bit 4
   /// System Identification Number of the datum message, -1 when there is none.
   std::int32_t systemId = -1;
 };
@@ -169,14 +169,14 @@ struct UtilizedMsgInfo {
 /// The messages received for one transformation. The records stay the caller's; a copy of the
 /// set points at the same records.
 struct MsgUtilized {
-  const Rtcm1021* msg1021 = nullptr;
-  const Rtcm1022* msg1022 = nullptr;
-  const Rtcm1023* msg1023 = nullptr;
-  const Rtcm1024* msg1024 = nullptr;
-  const Rtcm1025* msg1025 = nullptr;
-  const Rtcm1026* msg1026 = nullptr;
-  const Rtcm1027* msg1027 = nullptr;
-  UtilizedMsgInfo info;
+  const Rtcm1021* msg1021 = nullptr;  ///< the datum message, or null
+  const Rtcm1022* msg1022 = nullptr;  ///< the datum message, or null
+  const Rtcm1023* msg1023 = nullptr;  ///< the datum's residual grid, or null
+  const Rtcm1024* msg1024 = nullptr;  ///< the projection's residual grid, or null
+  const Rtcm1025* msg1025 = nullptr;  ///< the projection, or null
+  const Rtcm1026* msg1026 = nullptr;  ///< the projection, or null
+  const Rtcm1027* msg1027 = nullptr;  ///< the projection, or null
+  UtilizedMsgInfo info;               ///< what GetUtilizedMessageInfo() says of the datum message
 };
 
 }  // namespace orx::cs::velta

@@ -136,8 +136,8 @@ void AddDump(CLI::App& program, Action& action) {
       "texts say. Of a damaged file it prints what can be read.\n"
       "\n"
       "Example:\n"
-      "  velta ingest --dir out examples/streams/dhdn.rtcm3\n"
-      "  velta dump out/datums/rtcmdata/AUTO_DHDN_BESEL.dff");
+      "  velta ingest --datum-dir . --projection-dir . examples/streams/dhdn.rtcm3\n"
+      "  velta dump AUTO_DHDN_BESEL.dff");
   command->callback([&action, file] { action = [file] { return Run(*file); }; });
 }
 

@@ -10,6 +10,7 @@
 #include "orxregistry/in_file_key.h"
 #include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
+#include "orxutils/path.h"
 #include "text.h"
 
 namespace velta_tool {
@@ -74,13 +75,16 @@ Input::Input(const std::string& name) : memory_(kInputBuffer), buffer_(std::cin.
   const fs::path path = ToPath(name);
   if (fs::is_directory(path)) throw std::runtime_error(name + ": is a directory");
   file_.pubsetbuf(memory_.data(), static_cast<std::streamsize>(memory_.size()));
-  if (!file_.open(path, std::ios::in | std::ios::binary)) throw FileError(name, "cannot be read");
+  if (!file_.open(orx::ToSystemPath(path), std::ios::in | std::ios::binary)) {
+    throw FileError(name, "cannot be read");
+  }
   buffer_ = &file_;
 }
 
 Output::Output(const std::string& name) : name_(name), buffer_(std::cout.rdbuf()) {
   if (name == kStandardStream) return;
-  if (!file_.open(ToPath(name), std::ios::out | std::ios::binary | std::ios::trunc)) {
+  const fs::path path = orx::ToSystemPath(ToPath(name));
+  if (!file_.open(path, std::ios::out | std::ios::binary | std::ios::trunc)) {
     throw FileError(name, "cannot be written");
   }
   buffer_ = &file_;

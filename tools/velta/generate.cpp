@@ -170,10 +170,9 @@ void AddGenerate(CLI::App& program, Action& action) {
       "or 1027 from the projection file. The datum message announces what is sent with it.\n"
       "\n"
       "Example:\n"
-      "  velta ingest --dir out examples/streams/dhdn.rtcm3\n"
-      "  velta generate --datum out/datums/rtcmdata/AUTO_DHDN_BESEL.dff \\\n"
-      "      --projection out/projections/rtcmdata/AUTO_DHDN_BESEL.prj \\\n"
-      "      --lat 52.002 --lon 9.002 --json");
+      "  velta ingest --datum-dir . --projection-dir . examples/streams/dhdn.rtcm3\n"
+      "  velta generate --datum AUTO_DHDN_BESEL.dff --projection AUTO_DHDN_BESEL.prj --lat 52.002 "
+      "--lon 9.002 --json");
   command->callback([&action, options] {
     if (options->datum.empty() && options->projection.empty()) {
       throw CLI::RequiredError("--datum or --projection");

@@ -1,7 +1,11 @@
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <cstdio>
 #include <exception>
 #include <iostream>
+#include <string>
+#include <utility>
+#include <vector>
 
 #include "command.h"
 #include "orxutils/file_funcs.h"
@@ -17,12 +21,16 @@ constexpr char kFooter[] =
     "\"-\" is standard input; as an output it is standard output.\n"
     "Exit status: 0 everything was done, 1 something of it failed, 2 a wrong call.\n"
     "\n"
+    "The examples are typed where the folder \"examples\" is: in the source tree, or beside a copy "
+    "of\n"
+    "the one that the package has in share/doc/velta.\n"
+    "\n"
     "Example: what is in a stream\n"
     "  velta decode examples/streams/dhdn.rtcm3";
 
 using namespace velta_tool;
 
-int Run(int argc, char** argv) {
+int Run(std::vector<std::string> arguments) {
   CLI::App program(kHelp, "velta");
   program.allow_windows_style_options(false);  // "/" begins a file name
   program.footer(kFooter);
@@ -34,7 +42,10 @@ int Run(int argc, char** argv) {
     add(program, action);
   }
   try {
-    program.parse(argc, argv);
+    // Takes them from the last to the first, without the program's name.
+    std::reverse(arguments.begin(), arguments.end());
+    arguments.pop_back();
+    program.parse(std::move(arguments));
   } catch (const CLI::ParseError& error) {
     return program.exit(error) == 0 ? kDone : kWrongCall;
   }
@@ -47,7 +58,7 @@ int main(int argc, char** argv) {
   try {
     std::ios::sync_with_stdio(false);
     for (std::FILE* stream : {stdin, stdout, stderr}) orx::FileFuncs::setBinaryMode(stream);
-    return Run(argc, argv);
+    return Run(orx::FileFuncs::programArguments(argc, argv));
   } catch (const std::exception& error) {
     std::fprintf(stderr, "velta: %s\n", error.what());
     return kFailed;

@@ -58,10 +58,10 @@ void AddMerge(CLI::App& program, Action& action) {
   command->footer(
       "Entries of the same name are replaced by the source's; what only the target has stays.\n"
       "\n"
-      "Example: a file into itself, which changes nothing\n"
-      "  velta ingest --dir out examples/streams/dhdn.rtcm3\n"
-      "  velta merge out/datums/rtcmdata/AUTO_DHDN_BESEL.dff \\\n"
-      "      out/datums/rtcmdata/AUTO_DHDN_BESEL.dff");
+      "Example:\n"
+      "  velta ingest --datum-dir . --projection-dir . examples/streams/dhdn.rtcm3\n"
+      "  velta ingest --datum-dir . --projection-dir . examples/streams/molodenski.rtcm3\n"
+      "  velta merge AUTO_DHDN_BESEL.dff Local_B_O_7.dff");
   command->callback([&action, merge] {
     if (KindOf(merge->target) != KindOf(merge->source)) {
       throw CLI::ValidationError("SOURCE", "a datum file and a projection file do not mix");

@@ -3,20 +3,17 @@
 
 #include <boost/thread/lock_types.hpp>
 #include <cstdint>
-#include <filesystem>
-#include <functional>
 #include <map>
 #include <memory>
 #include <mutex>
-#include <optional>
 #include <string>
 #include <string_view>
-#include <system_error>
 
 #include "orxregistry/in_file_key.h"
 #include "orxutils/path.h"
 
 #ifdef _WIN32
+#include <windows.h>
 #define GRIDHOST_EXPORT extern "C" __declspec(dllexport)
 #else
 #define GRIDHOST_EXPORT extern "C" __attribute__((visibility("default")))
@@ -43,7 +40,20 @@ class SharedFile : public orx::TCSInFileKey {
   }
 };
 
-/// The table of shared files, by normalised name.
+/// The order of file names, which are the same in either case of their letters on Windows.
+struct NameOrder {
+  using is_transparent = void;
+  bool operator()(std::wstring_view a, std::wstring_view b) const {
+#ifdef _WIN32
+    return CompareStringOrdinal(a.data(), static_cast<int>(a.size()), b.data(),
+                                static_cast<int>(b.size()), TRUE) == CSTR_LESS_THAN;
+#else
+    return a < b;
+#endif
+  }
+};
+
+/// The table of shared files, by whole name.
 class SharedFiles {
  public:
   std::int32_t Get(const wchar_t* name, orx::TCSInFileKey** file) {
@@ -52,8 +62,9 @@ class SharedFiles {
     bool inUse = false;
     {
       const std::lock_guard<std::mutex> lock(mutex_);
-      std::unique_ptr<SharedFile>& entry = files_[Normalise(name)];
-      if (!entry) entry = std::make_unique<SharedFile>(Normalise(name));
+      const std::wstring whole = orx::ToWholeName(name);
+      std::unique_ptr<SharedFile>& entry = files_[whole];
+      if (!entry) entry = std::make_unique<SharedFile>(whole);
       shared = entry.get();
       inUse = shared->users > 0;
     }
@@ -69,26 +80,17 @@ class SharedFiles {
   }
 
   /// The caller may still hold the file's lock, so the tree stays as it is. Needs no memory for a
-  /// name that is normalised, as it must work when memory is out.
+  /// whole name, as it must work when memory is out.
   void Reset(const wchar_t* name) {
     const std::lock_guard<std::mutex> lock(mutex_);
     auto entry = files_.find(std::wstring_view(name));
-    if (entry == files_.end()) entry = files_.find(Normalise(name));
+    if (entry == files_.end()) entry = files_.find(orx::ToWholeName(name));
     if (entry != files_.end() && entry->second->users > 0) --entry->second->users;
   }
 
  private:
-  static std::wstring Normalise(const wchar_t* name) {
-    const std::optional<std::filesystem::path> path = orx::ToPath(name);
-    std::error_code error;
-    const std::filesystem::path whole =
-        path ? std::filesystem::absolute(*path, error) : std::filesystem::path();
-    // Opening what is no path of this system will fail.
-    return path && !error ? orx::ToName(whole.lexically_normal()) : name;
-  }
-
   std::mutex mutex_;
-  std::map<std::wstring, std::unique_ptr<SharedFile>, std::less<>> files_;
+  std::map<std::wstring, std::unique_ptr<SharedFile>, NameOrder> files_;
 };
 
 SharedFiles& Files() {

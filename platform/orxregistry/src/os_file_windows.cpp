@@ -6,6 +6,7 @@
 #include <string>
 #include <vector>
 
+#include "orxutils/path.h"
 #include "os_file.h"
 
 namespace orx::os {
@@ -23,18 +24,10 @@ constexpr auto kFileRenameInfoEx = static_cast<FILE_INFO_BY_HANDLE_CLASS>(22);
 constexpr DWORD kReplaceIfExists = 1;
 constexpr DWORD kPosixSemantics = 2;
 
-/// The absolute form that may be longer than MAX_PATH.
-std::wstring Native(const std::filesystem::path& path) {
-  std::error_code error;
-  const std::filesystem::path absolute = std::filesystem::absolute(path, error);
-  const std::wstring name = (error ? path : absolute).lexically_normal().make_preferred().wstring();
-  if (name.size() < MAX_PATH - 12 || name.starts_with(L"\\\\?\\")) return name;
-  return name.starts_with(L"\\\\") ? L"\\\\?\\UNC" + name.substr(1) : L"\\\\?\\" + name;
-}
-
-HANDLE Open(const std::filesystem::path& path, DWORD access, DWORD disposition) {
-  const HANDLE handle = CreateFileW(Native(path).c_str(), access, kShareAll, nullptr, disposition,
-                                    FILE_ATTRIBUTE_NORMAL, nullptr);
+HANDLE Open(const std::filesystem::path& path, DWORD access, DWORD disposition,
+            DWORD flags = FILE_ATTRIBUTE_NORMAL) {
+  const HANDLE handle =
+      CreateFileW(path.c_str(), access, kShareAll, nullptr, disposition, flags, nullptr);
   return handle == INVALID_HANDLE_VALUE ? nullptr : handle;
 }
 
@@ -49,31 +42,36 @@ OVERLAPPED At(std::uint64_t offset) {
 
 /// Replaces a file that others have open: they keep the old one.
 bool RenameOver(const std::filesystem::path& from, const std::filesystem::path& to) {
-  const HANDLE handle = Open(from, DELETE | SYNCHRONIZE, OPEN_EXISTING);
+  // Through such a handle the change of the directory is durable, too.
+  const HANDLE handle = Open(from, DELETE | SYNCHRONIZE, OPEN_EXISTING, FILE_FLAG_WRITE_THROUGH);
   if (!handle) return false;
-  const std::wstring name = Native(to);
+  const std::wstring name = ToWholeName(to.wstring());
   std::vector<unsigned char> buffer(sizeof(FILE_RENAME_INFO) + name.size() * sizeof(wchar_t));
   auto* const info = reinterpret_cast<FILE_RENAME_INFO*>(buffer.data());
   *reinterpret_cast<DWORD*>(info) = kReplaceIfExists | kPosixSemantics;
   info->FileNameLength = static_cast<DWORD>(name.size() * sizeof(wchar_t));
   std::copy(name.begin(), name.end(), info->FileName);
   const bool renamed = SetFileInformationByHandle(handle, kFileRenameInfoEx, info,
-                                                  static_cast<DWORD>(buffer.size())) != 0;
+                                                  static_cast<DWORD>(buffer.size()));
   CloseHandle(handle);
   return renamed;
 }
 
-/// The same where the file system has no such rename, as on a network share. A file that is open
-/// can only be moved out of the way: for a moment there is none of that name.
+bool Move(const std::filesystem::path& from, const std::filesystem::path& to, DWORD flags) {
+  return MoveFileExW(from.c_str(), to.c_str(), flags | MOVEFILE_WRITE_THROUGH) != 0;
+}
+
+/// Replaces a file that others have open where the file system cannot do so at once, as on a
+/// network share: moves it out of the way first, so that for a moment there is none of that name.
 bool SwapIn(const std::filesystem::path& from, const std::filesystem::path& to) {
-  const std::wstring name = Native(to);
-  const std::wstring old = name + L".old";
-  if (!MoveFileExW(name.c_str(), old.c_str(), MOVEFILE_REPLACE_EXISTING)) return false;
-  if (!MoveFileExW(Native(from).c_str(), name.c_str(), MOVEFILE_WRITE_THROUGH)) {
-    MoveFileExW(old.c_str(), name.c_str(), 0);
+  std::filesystem::path old = to;
+  old += ".old";
+  if (!Move(to, old, MOVEFILE_REPLACE_EXISTING)) return false;
+  if (!Move(from, to, 0)) {
+    Move(old, to, 0);
     return false;
   }
-  DeleteFileW(old.c_str());
+  Remove(old);
   return true;
 }
 
@@ -165,11 +163,10 @@ std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
 }
 
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
-  if (replace && (RenameOver(from, to) || SwapIn(from, to))) return true;
-  const DWORD flags = MOVEFILE_WRITE_THROUGH | (replace ? MOVEFILE_REPLACE_EXISTING : 0U);
-  return MoveFileExW(Native(from).c_str(), Native(to).c_str(), flags) != 0;
+  if (!replace) return Move(from, to, 0);
+  return RenameOver(from, to) || Move(from, to, MOVEFILE_REPLACE_EXISTING) || SwapIn(from, to);
 }
 
-void Remove(const std::filesystem::path& path) { DeleteFileW(Native(path).c_str()); }
+void Remove(const std::filesystem::path& path) { DeleteFileW(path.c_str()); }
 
 }  // namespace orx::os

@@ -26,16 +26,19 @@ class bin_value {
  public:
   virtual ~bin_value() = default;
   /// Takes a stored value over.
+  /// \param descriptor what the value is
   /// \param data the value's bytes; they stay valid as long as the tree they come from
   /// \param copy true: take a copy; false: the bytes may be kept by reference
   /// \return 0, or a code that says why the value was refused
   virtual std::int32_t SetFromDescriptor(const ValueDescriptor& descriptor, const void* data,
                                          bool copy) = 0;
+  /// What the value is; type kNoValue when there is none.
   virtual ValueDescriptor GetDescriptor() const = 0;
   /// The value's bytes, or null.
   virtual const void* GetRawData() const = 0;
   /// Number of bytes to store.
   virtual std::uint32_t GetByteSize() const = 0;
+  /// A ValueType.
   virtual std::uint32_t GetType() const = 0;
   /// The value's bytes, or null.
   virtual const void* GetData() const = 0;

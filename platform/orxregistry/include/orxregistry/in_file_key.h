@@ -36,9 +36,10 @@ class ORXREGISTRY_EXPORT TInKey {
   std::uint32_t GetErrorState() const;
 
  protected:
+  /// \param tree not null
   explicit TInKey(std::shared_ptr<KeyTree> tree);
 
-  std::shared_ptr<KeyTree> tree_;
+  std::shared_ptr<KeyTree> tree_;  ///< the tree, which keys of it keep alive, too
 
  private:
   friend class TGenericRegistryKeyPtr;
@@ -60,11 +61,16 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
   /// Appends what changed since the last save to the tree's own file, which is made for a new tree,
   /// or writes the file afresh when more than half of it is superseded. Durable when it returns
   /// true. When it returns false, what was durable stays loadable and the tree keeps its changes
-  /// for another try. \param flag no meaning here \param registryVersion kRegistryVersion
+  /// for another try.
+  /// \param flag no meaning here
+  /// \param registryVersion kRegistryVersion
   bool Save(bool flag, unsigned registryVersion);
 
   /// Writes the whole tree to a new file, whole or not at all; durable when it returns true. A
   /// file that exists is not replaced: false. The tree's own file stays what it was.
+  /// \param fileName the new file
+  /// \param flag no meaning here
+  /// \param registryVersion kRegistryVersion
   bool Save(const COrxStringT<wchar_t>& fileName, bool flag, unsigned registryVersion);
 
  protected:

@@ -22,7 +22,9 @@ using TGenericRegistryKeyImpPtr = std::shared_ptr<TGenericRegistryKeyImp>;
 /// The root of a tree.
 class ORXREGISTRY_EXPORT TGenericRegistryKeyPtr {
  public:
+  /// The root of a tree, which may go before this does.
   explicit TGenericRegistryKeyPtr(const TInKey& tree);
+  /// The root as the key's constructor takes it.
   operator TGenericRegistryKeyImpPtr() const;
 
  private:
@@ -30,6 +32,9 @@ class ORXREGISTRY_EXPORT TGenericRegistryKeyPtr {
 };
 
 /// Reads a value by its C++ type.
+/// \param key the key that has the value
+/// \param name the value's
+/// \param fallback what to return instead
 /// \param index 0, the only one there is
 /// \return the stored value, or `fallback` when it cannot be read
 template <class T>
@@ -46,6 +51,7 @@ ORXREGISTRY_EXPORT COrxStringT<wchar_t> GetRegValue(const TGenericRegistryKey& k
 /// one tree must not be used by two threads at once, not even to read.
 class ORXREGISTRY_EXPORT TGenericRegistryKey {
  public:
+  /// \param imp a root, what an iterator gave, or null
   explicit TGenericRegistryKey(TGenericRegistryKeyImpPtr imp);
   /// Opens the sub-key `name` of `parent`. One that does not exist is made, with that dimension,
   /// when `create` is true, and is null otherwise.
@@ -54,8 +60,11 @@ class ORXREGISTRY_EXPORT TGenericRegistryKey {
 
   /// True when there is no key behind this; it then has no values and no sub-keys.
   bool IsNull() const { return imp_ == nullptr; }
+  /// The key's name; empty for a root and for a null key.
   COrxStringT<wchar_t> GetName() const;
+  /// The dimension that the key was made with, 0 for a null key.
   std::uint8_t GetKeyDim() const;
+  /// True when there is a sub-key of that name.
   bool HasKey(std::wstring_view name) const;
 
   /// Lays `source` over this key: its values and sub-keys, recursively. What only this key holds
@@ -63,6 +72,8 @@ class ORXREGISTRY_EXPORT TGenericRegistryKey {
   void DeepCopy(const TGenericRegistryKey& source);
 
   /// Stores a copy of the adaptor's value.
+  /// \param name replaces a value of the same name
+  /// \param value the adaptor
   /// \param dimension stored with the value
   /// \param flag no meaning here
   /// \return non-zero on success; 0 when the key is null, the adaptor is empty, or the adaptor's
@@ -79,6 +90,8 @@ class ORXREGISTRY_EXPORT TGenericRegistryKey {
   std::uint8_t GetValueDim(std::wstring_view name) const;
 
   /// Hands a value to the adaptor.
+  /// \param name the value's
+  /// \param value the adaptor
   /// \param index 0, the only one there is
   /// \param copy true: the adaptor is to take a copy; false: it may refer to the tree's memory,
   ///     which lives as long as the tree and every key of it
@@ -100,6 +113,7 @@ class ORXREGISTRY_EXPORT TGenericRegistryKey {
 /// Walks the sub-keys of a key, which must not get new ones meanwhile.
 class ORXREGISTRY_EXPORT TGenRegKeyIterator {
  public:
+  /// Begins with the first sub-key of `key`.
   explicit TGenRegKeyIterator(const TGenericRegistryKey& key);
 
   /// True while a sub-key is left.

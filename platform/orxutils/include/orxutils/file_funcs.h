@@ -1,11 +1,14 @@
 #pragma once
 
 #include <cstdio>
+#include <string>
+#include <vector>
 
 #include "orxutils/export.h"
 #include "orxutils/orx_string.h"
 
-/// Questions to the file system. Nothing here throws for a name that the system does not take.
+/// Questions to the file system and about what a program is started with. Nothing here throws for a
+/// name that the system does not take.
 namespace orx::FileFuncs {
 
 /// True when a regular file of that name exists.
@@ -21,7 +24,12 @@ ORXUTILS_EXPORT bool createDirectoryTree(const COrxStringT<wchar_t>& name);
 /// True when an open file is a terminal.
 ORXUTILS_EXPORT bool isTerminal(std::FILE* file);
 
-/// Has an open file's bytes pass as they are, line ends included.
+/// Has an open file's bytes pass as they are, line ends included; a console takes them for UTF-8
+/// until the program ends.
 ORXUTILS_EXPORT void setBinaryMode(std::FILE* file);
+
+/// The arguments of the program, its own name first, as main() gets them; on Windows in UTF-8,
+/// whatever the system's code page.
+ORXUTILS_EXPORT std::vector<std::string> programArguments(int count, char** arguments);
 
 }  // namespace orx::FileFuncs

@@ -11,9 +11,9 @@ struct Ellipsoid {
   /// What `second` means.
   enum Kind : std::uint8_t { kInverseFlattening = 0, kSemiMinorAxis = 2 };
 
-  double a = 0.0;       ///< semi-major axis, metres
-  double second = 0.0;  ///< second defining value, see `kind`
-  std::uint8_t kind = kInverseFlattening;
+  double a = 0.0;                          ///< semi-major axis, metres
+  double second = 0.0;                     ///< second defining value, see `kind`
+  std::uint8_t kind = kInverseFlattening;  ///< a Kind
 
   double semiMinorAxis = 0.0;        ///< b, metres; derived
   double flattening = 0.0;           ///< f = (a - b) / a; derived

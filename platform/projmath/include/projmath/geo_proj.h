@@ -20,6 +20,8 @@ class PROJMATH_EXPORT TGeoProj {
   virtual ~TGeoProj();
 
   /// Sets a parameter; does nothing outside the projection's range of parameters.
+  /// \param value in the unit that the selector says
+  /// \param index of the parameter, from 0
   /// \param unitSelector kDegreesMetresRatios, the only one there is
   virtual void SetParam(double value, int index, int unitSelector);
   /// \return the parameter, 0 outside the projection's range of parameters
@@ -28,11 +30,12 @@ class PROJMATH_EXPORT TGeoProj {
   /// Takes over another projection's ellipsoid and parameters.
   void CopyGeoProj(const TGeoProj& other);
 
-  int parameterCount = 0;
+  int parameterCount = 0;        ///< number of parameters
   double semiMajorAxis = 0.0;    ///< metres
   double ellipsoidSecond = 0.0;  ///< the ellipsoid's second defining value
 
  protected:
+  /// The parameters by index, behind the ellipsoid's two numbers.
   TGeoProj(double a, double second, std::initializer_list<double> parameters);
 
  private:
@@ -45,6 +48,7 @@ class PROJMATH_EXPORT TGeoProj {
 /// Transverse Mercator.
 class PROJMATH_EXPORT TUTMProj : public TGeoProj {
  public:
+  /// Angles in degrees, lengths in metres.
   TUTMProj(double a, double second, double longitude, double scale, double latitude,
            double falseEasting, double falseNorthing);
 };
@@ -52,6 +56,7 @@ class PROJMATH_EXPORT TUTMProj : public TGeoProj {
 /// Stereographic.
 class PROJMATH_EXPORT TSterProj : public TGeoProj {
  public:
+  /// Angles in degrees, lengths in metres.
   TSterProj(double a, double second, double longitude, double latitude, double scale,
             double falseEasting, double falseNorthing);
 };
@@ -61,6 +66,7 @@ class PROJMATH_EXPORT TSterProj : public TGeoProj {
 /// Mercator.
 class PROJMATH_EXPORT TMercatorProj : public TGeoProj {
  public:
+  /// Angles in degrees, lengths in metres.
   TMercatorProj(double a, double second, double longitude, double latitude, double falseEasting,
                 double falseNorthing);
 };
@@ -68,6 +74,7 @@ class PROJMATH_EXPORT TMercatorProj : public TGeoProj {
 /// Cassini-Soldner. The last constructor argument is kept for callers and has no parameter.
 class PROJMATH_EXPORT TCassiniProj : public TGeoProj {
  public:
+  /// Angles in degrees, lengths in metres.
   TCassiniProj(double a, double second, double longitude, double latitude, double falseEasting,
                double falseNorthing, double unused);
 };
@@ -79,6 +86,7 @@ class PROJMATH_EXPORT TCassiniProj : public TGeoProj {
 /// Oblique Mercator. The last constructor argument is kept for callers and has no parameter.
 class PROJMATH_EXPORT TOMercatorProj : public TGeoProj {
  public:
+  /// Angles in degrees, lengths in metres.
   TOMercatorProj(double a, double second, double azimuth, double scale, double longitude,
                  double latitude, double easting, double northing, double unused);
 };
@@ -86,6 +94,7 @@ class PROJMATH_EXPORT TOMercatorProj : public TGeoProj {
 /// Rectified oblique Mercator.
 class PROJMATH_EXPORT TROMercatorProj : public TGeoProj {
  public:
+  /// Angles in degrees, lengths in metres.
   TROMercatorProj(double a, double second, double azimuth, double scale, double longitude,
                   double latitude, double easting, double northing, double rectifiedToSkew);
 };

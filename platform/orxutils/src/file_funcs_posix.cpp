@@ -1,17 +1,11 @@
-#include "orxutils/file_funcs.h"
+#include <unistd.h>
 
 #include <filesystem>
 #include <optional>
 #include <system_error>
 
+#include "orxutils/file_funcs.h"
 #include "orxutils/path.h"
-
-#ifdef _WIN32
-#include <fcntl.h>
-#include <io.h>
-#else
-#include <unistd.h>
-#endif
 
 namespace orx::FileFuncs {
 namespace fs = std::filesystem;
@@ -46,14 +40,12 @@ bool createDirectoryTree(const COrxStringT<wchar_t>& name) {
   });
 }
 
-#ifdef _WIN32
-bool isTerminal(std::FILE* file) { return _isatty(_fileno(file)) != 0; }
-
-void setBinaryMode(std::FILE* file) { _setmode(_fileno(file), _O_BINARY); }
-#else
 bool isTerminal(std::FILE* file) { return isatty(fileno(file)) != 0; }
 
 void setBinaryMode(std::FILE*) {}
-#endif
+
+std::vector<std::string> programArguments(int count, char** arguments) {
+  return {arguments, arguments + count};
+}
 
 }  // namespace orx::FileFuncs
