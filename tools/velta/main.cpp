@@ -21,9 +21,8 @@ constexpr char kFooter[] =
     "\"-\" is standard input; as an output it is standard output.\n"
     "Exit status: 0 everything was done, 1 something of it failed, 2 a wrong call.\n"
     "\n"
-    "The examples are typed where the folder \"examples\" is: in the source tree, or beside a copy "
-    "of\n"
-    "the one that the package has in share/doc/velta.\n"
+    "The examples are typed beside a folder \"examples\": that of the source tree, or a copy of\n"
+    "the package's, share/doc/velta/examples.\n"
     "\n"
     "Example: what is in a stream\n"
     "  velta decode examples/streams/dhdn.rtcm3";
