@@ -10,9 +10,11 @@ set(runtime_files)
 foreach(name libstdc++-6.dll libgcc_s_seh-1.dll libwinpthread-1.dll)
   execute_process(COMMAND ${CMAKE_CXX_COMPILER} -print-file-name=${name}
                   OUTPUT_VARIABLE file OUTPUT_STRIP_TRAILING_WHITESPACE)
-  list(APPEND runtime_files ${file})
+  file(COPY ${file} DESTINATION ${CMAKE_RUNTIME_OUTPUT_DIRECTORY})
+  list(APPEND runtime_files ${CMAKE_RUNTIME_OUTPUT_DIRECTORY}/${name})
 endforeach()
-file(COPY ${runtime_files} DESTINATION ${CMAKE_RUNTIME_OUTPUT_DIRECTORY})
+# Nine tenths of it are for a debugger.
+execute_process(COMMAND ${CMAKE_STRIP} --strip-unneeded ${runtime_files})
 install(FILES ${runtime_files} DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT library)
 # For who builds against the package where this was built.
 install(FILES cmake/mingw-w64.cmake DESTINATION ${CMAKE_INSTALL_LIBDIR}/cmake/velta
