@@ -59,8 +59,8 @@ bool isTerminal(std::FILE* file) { return _isatty(_fileno(file)) != 0; }
 
 void setBinaryMode(std::FILE* file) {
   _setmode(_fileno(file), _O_BINARY);
-  if (isTerminal(file)) [[maybe_unused]]
-    static const bool once = UseUtf8Console();
+  if (!isTerminal(file)) return;
+  [[maybe_unused]] static const bool once = UseUtf8Console();
 }
 
 std::vector<std::string> programArguments(int, char**) {
