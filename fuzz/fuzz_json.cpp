@@ -9,12 +9,14 @@
 #include "rtcm3/frame.h"
 #include "rtcm3/json_lines.h"
 
+namespace velta_fuzz {
+namespace {
+
 namespace rtcm3 = velta_tool::rtcm3;
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+void Try(std::string_view line) {
   constexpr std::size_t kFrameHeader = 3;
   constexpr std::size_t kFrameOverhead = 6;
-  const std::string_view line(reinterpret_cast<const char*>(data), size);
   try {
     const rtcm3::Message message = rtcm3::ParseJsonLine(line);
     std::string frame;
@@ -29,6 +31,18 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     if (written != again) std::abort();
   } catch (const rtcm3::FieldError&) {
     // The answer to a line that is no message.
+  }
+}
+
+}  // namespace
+}  // namespace velta_fuzz
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  std::string_view input(reinterpret_cast<const char*>(data), size);
+  while (!input.empty()) {
+    const std::size_t end = std::min(input.find('\n'), input.size());
+    velta_fuzz::Try(input.substr(0, end));
+    input.remove_prefix(std::min(end + 1, input.size()));
   }
   return 0;
 }

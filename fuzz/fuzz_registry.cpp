@@ -1,98 +1,117 @@
-// Arbitrary bytes as a registry file: loaded, walked, queried and merged.
+// Arbitrary bytes as a registry file: loaded, walked, queried, saved and merged.
 
 #include <cmath>
 #include <cstdlib>
 #include <cstring>
 
-#include "orxregistry/in_file_key.h"
-#include "scratch_directory.h"
+#include "platform/registry_fixture.h"
+#include "record_tree.h"
 #include "velta/rtcm_data_support.h"
 #include "velta/rtcm_generator.h"
 
-#define XXH_INLINE_ALL
-#include <xxhash.h>
+extern "C" std::size_t LLVMFuzzerMutate(std::uint8_t* data, std::size_t size, std::size_t maxSize);
 
 namespace velta_fuzz {
 namespace {
 
-namespace velta = orx::cs::velta;
+using orx::TCSInFileKey;
+using orx::cs::velta::RTCMDataSupport;
+using orx::cs::velta::RTCMGenerator;
+using velta_test::Describe;
+using velta_test::RegistryFile;
+using velta_test::RootOf;
 
-void AppendChecksum(std::string& to, const char* bytes, std::size_t size, std::uint64_t seed = 0) {
-  const std::uint64_t checksum = XXH3_64bits_withSeed(bytes, size, seed);
-  to.append(reinterpret_cast<const char*>(&checksum), sizeof checksum);
+void Require(bool holds) {
+  if (!holds) std::abort();
 }
 
-void AppendSegment(std::string& file, std::string_view tree) {
-  const std::size_t at = file.size();
-  const std::uint64_t sizes[] = {0x31474553, tree.size(), 0};  // the mark, the tree, superseded
-  file.append(reinterpret_cast<const char*>(sizes), sizeof sizes);
-  AppendChecksum(file, tree.data(), tree.size());
-  AppendChecksum(file, std::string(file, at).data(), file.size() - at, at);
-  file.append(tree);
+TCSInFileKey Load(const std::filesystem::path& path) {
+  return {path.wstring(), nullptr, nullptr, true, 97};
 }
 
-/// Right checksums around the input, so that it is the records that are tried. A byte 0xFE followed
-/// by another divides segments.
-std::string Wrap(std::string_view input) {
-  std::string file("\x89ORX\r\n\x1A\n\0\2\0\0\0\0\0\0", 16);
-  AppendChecksum(file, std::string(file).data(), file.size());
-  for (;;) {
-    const std::size_t end = input.find("\xFE\xFE");
-    AppendSegment(file, input.substr(0, end));
-    if (end == input.npos) return file;
-    input.remove_prefix(end + 2);
-  }
-}
-
-std::size_t Walk(const orx::TGenericRegistryKey& key) {
-  std::size_t seen = 1;
+/// What is listed is found, and what looks like an area gives a position to ask for.
+void Walk(const orx::TGenericRegistryKey& key, std::vector<std::pair<double, double>>& positions) {
   for (const std::wstring& name : key.GetValueNames()) {
-    seen += key.GetValueSize(name) + orx::GetRegValue<std::wstring>(key, name, L"", 0).size();
+    Require(key.HasValue(name) != 0);
+    velta_test::RawValue value;
+    double area[4];
+    if (positions.size() < 3 && key.GetValue(name, value, 0, true) &&
+        value.GetByteSize() >= sizeof area) {
+      std::memcpy(area, value.GetData(), sizeof area);
+      positions.emplace_back(area[0], area[2]);
+    }
   }
-  for (orx::TGenRegKeyIterator walk(key); walk;) seen += Walk(orx::TGenericRegistryKey(walk++));
-  return seen;
+  for (orx::TGenRegKeyIterator walk(key); walk;) {
+    const orx::TGenericRegistryKey sub(walk++);
+    Require(key.HasKey(sub.GetName()));
+    Walk(sub, positions);
+  }
 }
 
-void Query(const std::wstring& path) {
-  const velta::RTCMGenerator generator(1, path, path);
-  for (const double at : {0.0, 0.9, NAN}) {
-    generator.getRtcmDatumMessage(at, 0.15, 0);
-    generator.get1023(at, 0.15, 0);
-    generator.get1024(at * 5e6, 3.5e6, 0);
-  }
-  generator.getRtcmProjMessage();
+void Query(const std::wstring& path, const std::vector<std::pair<double, double>>& positions) {
+  const RTCMGenerator generator(1, path, path);
   generator.getAllDatums();
+  generator.getRtcmProjMessage();
+  for (const auto& [north, east] : positions) {
+    generator.getRtcmDatumMessage(north, east, 0);
+    generator.get1023(north, east, 0);
+    generator.get1024(north, east, 0);
+  }
+}
+
+/// What was taken for good is good when it is written and read again; what was not is left alone.
+void Save(const RegistryFile& file, TCSInFileKey& tree, bool isGood) {
+  const std::filesystem::path copy = file.directory / "copy.dff";
+  const std::string before = isGood ? Describe(tree) : file.Bytes();
+  Require(tree.Save(copy.wstring(), false, 512) == isGood);
+  Require(!isGood || Describe(Load(copy)) == before);
+  std::filesystem::remove(copy);
+  velta_test::Open(RootOf(tree), L"added");
+  Require(tree.Save(false, 512) == isGood);
+  Require(isGood ? Describe(file.Load()) == Describe(tree) : file.Bytes() == before);
+}
+
+/// Merges the file into another one, and that one into the file.
+void Merge(const RegistryFile& file, bool isGood) {
+  static const RegistryFile other;
+  static const std::string before = (other.Create("kept"), other.Bytes());
+  other.SetBytes(before);
+  const std::wstring path = file.path.wstring();
+  const bool merged = RTCMDataSupport::MergeRTCMDatumfiles(other.path.wstring(), path) == 0;
+  Require(other.Load().GetErrorState() == orx::kRegistryOk);
+  if (!merged) {
+    Require(other.Bytes() == before);
+    Require(!isGood || !orx::TGenRegKeyIterator(RootOf(file.Load())));
+  }
+  RTCMDataSupport::MergeRTCMProjectionfiles(path, other.path.wstring());
 }
 
 void Try(const std::string& bytes) {
-  static const ScratchDirectory directory;
-  directory.Empty();
-  const std::wstring path = (directory / "input.dff").wstring();
-  const std::wstring other = (directory / "other.dff").wstring();
-  WriteFile(directory / "input.dff", bytes);
-  orx::TCSInFileKey tree(path, nullptr, nullptr, true, 97);
-  Walk(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)));
-  tree.Save(other, false, orx::kRegistryVersion);
-  if (tree.GetErrorState() == orx::kRegistryOk) {
-    // What was taken for good must be good when it is written and read again.
-    const orx::TCSInFileKey again(other, nullptr, nullptr, true, 97);
-    const auto size = [](const orx::TCSInFileKey& t) {
-      return Walk(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(t)));
-    };
-    if (again.GetErrorState() != orx::kRegistryOk || size(again) != size(tree)) std::abort();
-  }
-  Query(path);
-  const velta::RTCMDataSupport unloadsTheSharedFiles(L"", L"");
-  velta::RTCMDataSupport::MergeRTCMDatumfiles(other, path);
-  velta::RTCMDataSupport::MergeRTCMProjectionfiles(path, other);
+  static const RegistryFile file;
+  file.SetBytes(bytes);
+  TCSInFileKey tree = file.Load();
+  std::vector<std::pair<double, double>> positions{{NAN, 0.15}};
+  Walk(RootOf(tree), positions);
+  const bool isGood = tree.GetErrorState() == orx::kRegistryOk;
+  Query(file.path.wstring(), positions);
+  Save(file, tree, isGood);
+  if (tree.GetErrorState() != orx::kNotARegistryFile) Merge(file, isGood);
 }
 
 }  // namespace
 }  // namespace velta_fuzz
 
+extern "C" std::size_t LLVMFuzzerCustomMutator(std::uint8_t* data, std::size_t size,
+                                               std::size_t maxSize, unsigned seed) {
+  if (seed % 4 == 0) return LLVMFuzzerMutate(data, size, maxSize);
+  velta_fuzz::Spoiler spoil(seed, &LLVMFuzzerMutate);
+  const std::string spoiled = spoil({reinterpret_cast<const char*>(data), size});
+  if (spoiled.size() > maxSize) return LLVMFuzzerMutate(data, size, maxSize);
+  std::memcpy(data, spoiled.data(), spoiled.size());
+  return spoiled.size();
+}
+
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  if (size == 0) return 0;
-  const std::string_view input(reinterpret_cast<const char*>(data) + 1, size - 1);
-  velta_fuzz::Try(data[0] % 4 == 0 ? std::string(input) : velta_fuzz::Wrap(input));
+  velta_fuzz::Try({reinterpret_cast<const char*>(data), size});
   return 0;
 }

@@ -1,15 +1,22 @@
 // Arbitrary bytes as a stream: decoded, and its complete message sets ingested and generated again.
 
 #include <cstdlib>
+#include <cstring>
 #include <map>
+#include <random>
 #include <sstream>
 #include <string>
+#include <vector>
 
 #include "message_set.h"
+#include "rtcm3/codec.h"
 #include "rtcm3/frame.h"
+#include "rtcm3/json_lines.h"
 #include "rtcm3/message_reader.h"
-#include "scratch_directory.h"
+#include "support/temporary_directory.h"
 #include "velta/rtcm_generator.h"
+
+extern "C" std::size_t LLVMFuzzerMutate(std::uint8_t* data, std::size_t size, std::size_t maxSize);
 
 namespace velta_fuzz {
 namespace {
@@ -17,16 +24,51 @@ namespace {
 namespace velta = orx::cs::velta;
 namespace rtcm3 = velta_tool::rtcm3;
 
-/// The input cut into payloads, each a byte count and so many bytes, with right frames around them.
-std::string Frame(std::string_view input) {
-  std::string stream;
-  while (!input.empty()) {
-    const std::size_t size = std::min<std::size_t>(static_cast<unsigned char>(input.front()), 255);
-    input.remove_prefix(1);
-    rtcm3::AppendFrame(input.substr(0, size), stream);
-    input.remove_prefix(std::min(size, input.size()));
+void Require(bool holds) {
+  if (!holds) std::abort();
+}
+
+/// Spoils one of the frames of a stream and puts right frames around all of them.
+std::string Spoil(const std::string& stream, unsigned seed) {
+  constexpr std::size_t kLongestPayload = 1023;
+  std::minstd_rand random(seed);
+  std::vector<std::string> payloads;
+  std::stringbuf in(stream);
+  rtcm3::FrameCounts counts;
+  rtcm3::FrameReader reader(in, counts);
+  while (const auto payload = reader.Next())
+    payloads.emplace_back(payload->begin(), payload->end());
+  if (payloads.empty()) payloads.emplace_back(stream, 0, kLongestPayload);
+  std::string& one = payloads[random() % payloads.size()];
+  std::string& other = payloads[random() % payloads.size()];
+  switch (random() % 8) {
+    case 0:
+      payloads.push_back(one);
+      break;
+    case 1:
+      std::swap(one, other);
+      break;
+    case 2:
+      one = std::move(payloads.back());
+      payloads.pop_back();
+      break;
+    default:
+      const std::size_t size = one.size();
+      one.resize(kLongestPayload);
+      one.resize(LLVMFuzzerMutate(reinterpret_cast<std::uint8_t*>(one.data()), size, one.size()));
   }
-  return stream;
+  std::string spoiled;
+  for (const std::string& payload : payloads) rtcm3::AppendFrame(payload, spoiled);
+  return spoiled;
+}
+
+/// A message shown as JSON is the same message when it is read again.
+void Show(const rtcm3::Message& message) {
+  std::string line;
+  std::string again;
+  rtcm3::AppendJsonLine(message, line);
+  rtcm3::AppendJsonLine(rtcm3::ParseJsonLine(line), again);
+  Require(line == again);
 }
 
 void Generate(const velta::RTCMDataSupport& support) {
@@ -42,8 +84,7 @@ void Generate(const velta::RTCMDataSupport& support) {
 }
 
 void Ingest(const std::string& stream) {
-  static const ScratchDirectory directory;
-  directory.Empty();
+  const velta_test::TemporaryDirectory directory;
   const std::wstring path = (directory / "").wstring();
   velta::RTCMDataSupport support(path.c_str(), path.c_str());
   std::map<std::uint32_t, velta_tool::MessageSet> sets;
@@ -51,6 +92,7 @@ void Ingest(const std::string& stream) {
   rtcm3::StreamCounts counts;
   rtcm3::MessageReader reader(in, counts);
   while (const rtcm3::Message* message = reader.Next()) {
+    Show(*message);
     const std::uint32_t system = rtcm3::SystemIdOf(*message);
     velta_tool::MessageSet& set = sets[system];
     set.Put(*message, support);
@@ -58,7 +100,8 @@ void Ingest(const std::string& stream) {
     velta::MsgUtilized records = set.Records();
     const velta::ResultCode result = support.ParseRTCMMEssages(records);
     // Whatever comes over the wire can be refused; a file that does not take it is a fault.
-    if (result == velta::kDatumFileTrouble || result == velta::kProjectionFileTrouble) std::abort();
+    Require(result != velta::kDatumFileTrouble && result != velta::kProjectionFileTrouble &&
+            result != velta::kEntryNotWritten);
     Generate(support);
     sets.erase(system);
   }
@@ -67,9 +110,16 @@ void Ingest(const std::string& stream) {
 }  // namespace
 }  // namespace velta_fuzz
 
+extern "C" std::size_t LLVMFuzzerCustomMutator(std::uint8_t* data, std::size_t size,
+                                               std::size_t maxSize, unsigned seed) {
+  if (seed % 4 == 0) return LLVMFuzzerMutate(data, size, maxSize);
+  const std::string spoiled = velta_fuzz::Spoil({reinterpret_cast<const char*>(data), size}, seed);
+  if (spoiled.size() > maxSize) return LLVMFuzzerMutate(data, size, maxSize);
+  std::memcpy(data, spoiled.data(), spoiled.size());
+  return spoiled.size();
+}
+
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  if (size == 0) return 0;
-  const std::string_view input(reinterpret_cast<const char*>(data) + 1, size - 1);
-  velta_fuzz::Ingest(data[0] % 4 == 0 ? std::string(input) : velta_fuzz::Frame(input));
+  velta_fuzz::Ingest({reinterpret_cast<const char*>(data), size});
   return 0;
 }
