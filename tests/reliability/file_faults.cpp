@@ -6,125 +6,110 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <cerrno>
 #include <csignal>
 #include <cstdarg>
 #include <cstdio>
+#include <utility>
 
 namespace velta_test {
 namespace {
 
 struct Machine {
-  bool armed = false;
-  int place = -1;
+  bool isArmed = false;
   Fault fault = Fault::kFail;
-  int error = EIO;
+  int place = 0;
   int seen = 0;
-  bool shortened = false;
+  bool isFull = false;
+  bool isFileFlushed = true;
+  bool isDirectoryFlushed = true;
+  bool wasFlushedInTime = true;
 };
 Machine machine;
 
-enum class Verdict { kWork, kFail, kShorten };
+enum class Verdict { kWork, kFail, kHalf };
 
 /// Counts an operation and says what becomes of it.
-Verdict Judge(bool isWrite) {
-  if (!machine.armed) return Verdict::kWork;
-  const int now = machine.seen++;
-  if (machine.shortened && isWrite) {
-    machine.shortened = false;
-    errno = machine.error;
-    return Verdict::kFail;
+Verdict Judge(bool isWrite = false) {
+  const int place = machine.isArmed ? machine.seen++ - machine.place : -1;
+  if (place < 0) return Verdict::kWork;
+  errno = machine.fault == Fault::kFull ? ENOSPC : EIO;
+  if (machine.fault == Fault::kBroken) return Verdict::kFail;
+  if (machine.fault == Fault::kFull && isWrite) {
+    return std::exchange(machine.isFull, true) ? Verdict::kFail : Verdict::kHalf;
   }
-  const bool hit = now == machine.place ||
-                   (machine.fault == Fault::kFailOn && machine.place >= 0 && now > machine.place);
-  if (!hit) return Verdict::kWork;
+  if (place > 0) return Verdict::kWork;
   if (machine.fault == Fault::kKill) raise(SIGKILL);
-  if (machine.fault == Fault::kShort && isWrite) {
-    machine.shortened = true;
-    return Verdict::kShorten;
-  }
-  errno = machine.error;
-  return Verdict::kFail;
+  if (machine.fault == Fault::kFail) return Verdict::kFail;
+  return isWrite ? Verdict::kHalf : Verdict::kWork;
 }
 
-template <class Function>
-Function* Real(const char* name) {
-  return reinterpret_cast<Function*>(dlsym(RTLD_NEXT, name));
+int NoteRename(int result) {
+  if (result != 0) return result;
+  machine.wasFlushedInTime &= machine.isFileFlushed;
+  machine.isDirectoryFlushed = false;
+  return result;
 }
 
 }  // namespace
 
-FileFaults::FileFaults(int place, Fault fault, int error) {
-  machine = Machine{true, place, fault, error, 0, false};
+FileFaults::FileFaults(Fault fault, int place) { machine = {true, fault, place}; }
+FileFaults::~FileFaults() { machine.isArmed = false; }
+int FileFaults::Count() { return machine.seen; }
+bool FileFaults::IsDurable() {
+  return machine.isFileFlushed && machine.isDirectoryFlushed && machine.wasFlushedInTime;
 }
-FileFaults::~FileFaults() { machine.armed = false; }
-int FileFaults::count() const { return machine.seen; }
 
 }  // namespace velta_test
 
-// The operations that the registry calls, in front of the C library's own.
+// The operations that the libraries call, in front of the C library's own.
 
-using velta_test::Judge;
-using velta_test::Real;
-using velta_test::Verdict;
+using namespace velta_test;
 
-extern "C" {
+#define EXPORTED extern "C" __attribute__((visibility("default")))
+#define FAILS (Judge() != Verdict::kWork)
+#define REAL(name) reinterpret_cast<decltype(&name)>(dlsym(RTLD_NEXT, #name))
 
-__attribute__((visibility("default"))) int open(const char* path, int flags, ...) {
-  mode_t mode = 0;
-  if ((flags & O_CREAT) != 0) {
-    va_list arguments;
-    va_start(arguments, flags);
-    mode = va_arg(arguments, mode_t);
-    va_end(arguments);
-  }
-  if (Judge(false) != Verdict::kWork) return -1;
-  return Real<int(const char*, int, ...)>("open")(path, flags, mode);
+EXPORTED int open(const char* path, int flags, ...) {
+  va_list arguments;
+  va_start(arguments, flags);
+  const mode_t mode = (flags & O_CREAT) != 0 ? va_arg(arguments, mode_t) : 0;
+  va_end(arguments);
+  return FAILS ? -1 : REAL(open)(path, flags, mode);
 }
-
-__attribute__((visibility("default"))) int flock(int file, int operation) noexcept {
-  return Judge(false) == Verdict::kWork ? Real<int(int, int)>("flock")(file, operation) : -1;
+EXPORTED int stat(const char* path, struct stat* status) noexcept {
+  return FAILS ? -1 : REAL(stat)(path, status);
 }
-
-__attribute__((visibility("default"))) int fstat(int file, struct stat* status) noexcept {
-  return Judge(false) == Verdict::kWork ? Real<int(int, struct stat*)>("fstat")(file, status) : -1;
+EXPORTED int fstat(int file, struct stat* status) noexcept {
+  return FAILS ? -1 : REAL(fstat)(file, status);
 }
-
-__attribute__((visibility("default"))) ssize_t pread(int file, void* to, size_t size,
-                                                     off_t offset) {
-  if (Judge(false) != Verdict::kWork) return -1;
-  return Real<ssize_t(int, void*, size_t, off_t)>("pread")(file, to, size, offset);
+EXPORTED int flock(int file, int operation) noexcept {
+  return FAILS ? -1 : REAL(flock)(file, operation);
 }
-
-__attribute__((visibility("default"))) ssize_t pwrite(int file, const void* from, size_t size,
-                                                      off_t offset) {
+EXPORTED ssize_t pread(int file, void* to, size_t size, off_t offset) {
+  return FAILS ? -1 : REAL(pread)(file, to, size, offset);
+}
+EXPORTED ssize_t pwrite(int file, const void* from, size_t size, off_t offset) {
   const Verdict verdict = Judge(true);
+  machine.isFileFlushed = false;
   if (verdict == Verdict::kFail) return -1;
-  if (verdict == Verdict::kShorten) size /= 2;
-  return Real<ssize_t(int, const void*, size_t, off_t)>("pwrite")(file, from, size, offset);
+  return REAL(pwrite)(file, from, verdict == Verdict::kHalf ? size / 2 : size, offset);
 }
-
-__attribute__((visibility("default"))) int ftruncate(int file, off_t size) noexcept {
-  return Judge(false) == Verdict::kWork ? Real<int(int, off_t)>("ftruncate")(file, size) : -1;
+EXPORTED int ftruncate(int file, off_t size) noexcept {
+  machine.isFileFlushed = false;
+  return FAILS ? -1 : REAL(ftruncate)(file, size);
 }
-
-__attribute__((visibility("default"))) int fdatasync(int file) {
-  return Judge(false) == Verdict::kWork ? Real<int(int)>("fdatasync")(file) : -1;
+// Nobody waits for the disk.
+EXPORTED int fdatasync(int) { return FAILS ? -1 : (machine.isFileFlushed = true, 0); }
+EXPORTED int fsync(int) { return FAILS ? -1 : (machine.isDirectoryFlushed = true, 0); }
+EXPORTED int link(const char* from, const char* to) noexcept {
+  return FAILS ? -1 : NoteRename(REAL(link)(from, to));
 }
-
-__attribute__((visibility("default"))) int fsync(int file) {
-  return Judge(false) == Verdict::kWork ? Real<int(int)>("fsync")(file) : -1;
+EXPORTED int unlink(const char* path) noexcept { return FAILS ? -1 : REAL(unlink)(path); }
+EXPORTED int rename(const char* from, const char* to) noexcept {
+  return FAILS ? -1 : NoteRename(REAL(rename)(from, to));
 }
-
-__attribute__((visibility("default"))) int rename(const char* from, const char* to) noexcept {
-  if (Judge(false) != Verdict::kWork) return -1;
-  return Real<int(const char*, const char*)>("rename")(from, to);
+EXPORTED int renameat2(int from, const char* old, int to, const char* name,
+                       unsigned flags) noexcept {
+  return FAILS ? -1 : NoteRename(REAL(renameat2)(from, old, to, name, flags));
 }
-
-__attribute__((visibility("default"))) int renameat2(int fromAt, const char* from, int toAt,
-                                                     const char* to, unsigned flags) noexcept {
-  if (Judge(false) != Verdict::kWork) return -1;
-  return Real<int(int, const char*, int, const char*, unsigned)>("renameat2")(fromAt, from, toAt,
-                                                                              to, flags);
-}
-
-}  // extern "C"

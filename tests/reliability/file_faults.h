@@ -1,30 +1,31 @@
 #pragma once
 
-#include <cerrno>
-
 namespace velta_test {
 
-/// What happens at a file operation of the registry.
+/// What happens at a file operation of the libraries.
 enum class Fault {
-  kFail,    ///< this operation fails, the others work
-  kFailOn,  ///< this one and all that follow fail
-  kShort,   ///< a write stops half-way, and the next one fails; other operations fail
+  kFail,    ///< it fails, the others work
+  kShort,   ///< it stops half-way when it is a write; nothing fails
+  kFull,    ///< from here on the disk has room for half a write
+  kBroken,  ///< it and all that follow fail
   kKill     ///< the process is killed in front of it
 };
+constexpr Fault kFaults[] = {Fault::kFail, Fault::kShort, Fault::kFull, Fault::kBroken,
+                             Fault::kKill};
 
 /// The fault machine: stands between the libraries and the system's file operations. It counts
-/// them while it is armed, and spoils one.
-class FileFaults {
- public:
-  /// Arms the machine until the object goes.
-  /// \param place number of the operation to spoil; negative: only count
-  explicit FileFaults(int place, Fault fault = Fault::kFail, int error = EIO);
+/// them until it goes, and spoils one.
+struct FileFaults {
+  /// \param place number of the operation to spoil
+  FileFaults(Fault fault, int place);
   FileFaults(const FileFaults&) = delete;
   FileFaults& operator=(const FileFaults&) = delete;
   ~FileFaults();
 
-  /// Operations seen so far.
-  int count() const;
+  static int Count();
+  /// A power cut now would lose nothing: what was written was flushed, before its file got its
+  /// name; and so was the directory after that.
+  static bool IsDurable();
 };
 
 }  // namespace velta_test

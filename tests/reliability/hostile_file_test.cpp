@@ -1,85 +1,143 @@
 // Files that are large, or large inside, for no good reason: bounded time and memory, and a clear
-// answer. The times are far above what is needed and far below a hang.
+// answer. The bounds are some times what is needed and far below what hurts.
 
 #include <gtest/gtest.h>
+#include <malloc.h>
+#include <sys/resource.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
-#include <chrono>
-#include <filesystem>
+#include <functional>
 
+#include "fuzz/record_tree.h"
 #include "platform/registry_fixture.h"
 #include "velta/rtcm_generator.h"
 
 namespace velta_test {
 namespace {
 
-using Clock = std::chrono::steady_clock;
-using orx::TCSInFileKey;
+using velta_fuzz::Key;
 
-constexpr int kMany = 1'000'000;
+constexpr unsigned kMaxSeconds = 60;
+constexpr double kMaxExtraMemory = 16e6;  // bytes
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+constexpr bool kMemoryIsOurs = false;
+#else
+constexpr bool kMemoryIsOurs = true;
+#endif
 
-class HostileFile : public ::testing::Test {
- protected:
-  ~HostileFile() override {
-    EXPECT_LT(Clock::now() - start_, std::chrono::seconds(60)) << "this is a hang";
+std::string FileOf(const std::string& tree) { return velta_fuzz::PutTogether({{0, tree}}); }
+
+/// A container of so many keys with so many values each, the names of both by their number.
+std::string Keys(int count, int values, const std::function<std::string(int)>& name) {
+  Key container;
+  for (int i = 0; i < count; ++i) {
+    Key& key = container.keys.emplace_back(Key{0, name(i), {}, {}});
+    for (int j = 0; j < values; ++j) key.values.push_back({1, 1, 1, name(j), "x"});
   }
-  /// What a generator makes of it.
-  void Query() const {
-    const orx::cs::velta::RTCMGenerator generator(1, file.path.wstring(), file.path.wstring());
-    EXPECT_TRUE(generator.getAllDatums().empty());
-    EXPECT_EQ(generator.getRtcmDatumMessage(0.9, 0.15, 0), nullptr);
-    EXPECT_EQ(generator.get1024(5e6, 3e6, 0), nullptr);
-    EXPECT_EQ(generator.getRtcmProjMessage(), nullptr);
+  std::string tree;
+  velta_fuzz::AppendKey(tree, Key{0, "", {}, {container}});
+  return FileOf(tree);
+}
+std::string Number(int i) { return {reinterpret_cast<const char*>(&i), sizeof i}; }
+std::string Unit(int i) { return Number(i).substr(0, 2); }
+std::string Same(int) { return "same"; }
+std::string Long(int i) { return std::string(0x1FFFE, static_cast<char>(i)); }
+
+std::string Nested(std::uint64_t depth) {
+  std::string tree;
+  while (depth-- > 0) {
+    velta_fuzz::Append(tree, std::uint64_t{0});
+    velta_fuzz::Append(tree, depth * 20);
+    velta_fuzz::Append(tree, 0);
   }
+  return FileOf(tree);
+}
+/// A key with a value; of one of the two the sizes are the largest there are.
+std::string Lying(std::size_t place, std::size_t bytes) {
+  std::string tree;
+  velta_fuzz::AppendKey(tree, Key{0, "", {{1, 1, 1, "", "x"}}, {}});
+  return FileOf(tree.replace(place, bytes, bytes, '\xFF'));
+}
 
-  RegistryFile file;
-
- private:
-  Clock::time_point start_ = Clock::now();
+const struct Hostile {
+  const char* what;
+  std::function<std::string()> bytes;
+  std::uintmax_t zeros;  ///< behind the bytes
+  orx::RegistryError answer;
+  double memory;  ///< at most so many times the file's size, and kMaxExtraMemory
+} kFiles[] = {
+    {"Zeros", [] { return ""; }, 1U << 30, orx::kNotARegistryFile, 0},
+    {"ZerosBehindASegment", [] { return Nested(1); }, 1U << 28, orx::kRegistryOk, 1},
+    {"EmptyKeys", [] { return Keys(1'000'000, 0, Number); }, 0, orx::kRegistryOk, 12},
+    {"KeysOfOneName", [] { return Keys(1'000'000, 0, Same); }, 0, orx::kRegistryOk, 4},
+    {"Values", [] { return Keys(1, 300'000, Number); }, 0, orx::kRegistryOk, 12},
+    {"ValuesOfOneName", [] { return Keys(300, 1000, Same); }, 0, orx::kRegistryOk, 4},
+    {"EveryUnitAsAName", [] { return Keys(0x10000, 1, Unit); }, 0, orx::kRegistryOk, 12},
+    {"LongestNames", [] { return Keys(100, 1, Long); }, 0, orx::kRegistryOk, 4},
+    {"DeepNesting", [] { return Nested(100'000); }, 0, orx::kDamaged, 4},
+    {"FourGigabytesInAValue", [] { return Lying(20, 8); }, 0, orx::kDamaged, 0},
+    {"ExabytesInAKey", [] { return Lying(0, 15); }, 0, orx::kDamaged, 0},
 };
 
-TEST_F(HostileFile, AGibibyteOfZerosIsNotReadToItsEnd) {
-  file.SetBytes("");
-  std::filesystem::resize_file(file.path, std::uintmax_t{1} << 30);
-  EXPECT_EQ(file.Load().GetErrorState(), orx::kNotARegistryFile);
-  Query();
-}
-
-TEST_F(HostileFile, ZerosBehindGoodSegmentsAreASaveThatNeverFinished) {
-  file.Create("kept");
-  std::filesystem::resize_file(file.path, std::uintmax_t{1} << 28);
-  TCSInFileKey tree = file.Load();
-  EXPECT_EQ(tree.GetErrorState(), orx::kRegistryOk);
-  RegistryFile::AddEntry(tree, L"S_1", "next");
-  EXPECT_TRUE(tree.Save(false, 512));
-  EXPECT_LT(std::filesystem::file_size(file.path), 1000U) << "and is cut off";
-}
-
-TEST_F(HostileFile, AMillionEmptyKeysAreWalkedAndFound) {
-  TCSInFileKey made = RegistryFile::New();
-  const orx::TGenericRegistryKey container = Open(RootOf(made), L"container");
-  for (int i = 0; i < kMany; ++i) Open(container, std::to_wstring(i));
-  ASSERT_TRUE(made.Save(file.path.wstring(), false, 512));
-  const TCSInFileKey tree = file.Load();
-  const orx::TGenericRegistryKey loaded = Open(RootOf(tree), L"container");
-  EXPECT_TRUE(loaded.HasKey(L"999999"));
-  int count = 0;
-  for (orx::TGenRegKeyIterator walk(loaded); walk; ++count) walk++;
-  EXPECT_EQ(count, kMany);
-  Query();
-}
-
-TEST_F(HostileFile, AHundredThousandValuesInOneKeyAreNoHang) {
-  TCSInFileKey made = RegistryFile::New();
-  orx::TGenericRegistryKey key = Open(Open(RootOf(made), L"container"), L"entry");
-  for (int i = 0; i < kMany / 10; ++i) {
-    key.AddValue(std::to_wstring(i), RawValue::Block("x"), 1, true);
+bool Finds(const orx::TGenericRegistryKey& key) {
+  for (const std::wstring& name : key.GetValueNames()) {
+    if (!key.HasValue(name)) return false;
   }
-  ASSERT_TRUE(made.Save(file.path.wstring(), false, 512));
-  const TCSInFileKey tree = file.Load();
-  EXPECT_EQ(Open(Open(RootOf(tree), L"container"), L"entry").GetValueNames().size(),
-            static_cast<std::size_t>(kMany / 10));
-  Query();
+  for (orx::TGenRegKeyIterator walk(key); walk;) {
+    const orx::TGenericRegistryKey sub(walk++);
+    if (!key.HasKey(sub.GetName()) || !Finds(sub)) return false;
+  }
+  return true;
 }
+
+/// Asks for everything and looks at everything.
+void Look(const RegistryFile& file, orx::RegistryError answer) {
+  const orx::cs::velta::RTCMGenerator generator(1, file.path.wstring(), file.path.wstring());
+  EXPECT_TRUE(generator.getAllDatums().empty());
+  EXPECT_FALSE(generator.getRtcmDatumMessage(0.9, 0.15, 0) || generator.get1023(0.9, 0.15, 0));
+  EXPECT_FALSE(generator.get1024(5e6, 3e6, 0) || generator.getRtcmProjMessage());
+  orx::TCSInFileKey tree = file.Load();
+  EXPECT_TRUE(Finds(RootOf(tree))) << "what is listed";
+  EXPECT_EQ(tree.GetErrorState(), answer);
+  RegistryFile::AddEntry(tree, L"S_1", "next");
+  EXPECT_EQ(tree.Save(false, 512), answer == orx::kRegistryOk);
+}
+
+/// \return peak memory in bytes of a process that does this, and fails when it does
+double PeakMemory(const std::function<void()>& work) {
+  malloc_trim(0);
+  const pid_t child = fork();
+  if (child == 0) {
+    alarm(kMaxSeconds);
+    work();
+    _exit(testing::Test::HasFailure() ? 1 : 0);
+  }
+  int status = 0;
+  rusage used = {};
+  wait4(child, &status, 0, &used);
+  EXPECT_TRUE(WIFEXITED(status)) << "a hang, or a crash";
+  EXPECT_EQ(WEXITSTATUS(status), 0);
+  return 1024.0 * static_cast<double>(used.ru_maxrss);
+}
+
+class HostileFile : public testing::TestWithParam<Hostile> {};
+
+TEST_P(HostileFile, IsAnsweredInBoundedTimeAndMemory) {
+  const auto& [what, bytes, zeros, answer, memory] = GetParam();
+  const RegistryFile file;
+  file.SetBytes(bytes());
+  const auto size = std::max(std::filesystem::file_size(file.path), zeros);
+  std::filesystem::resize_file(file.path, size);
+  const double idle = PeakMemory([] {});
+  const double used = PeakMemory([&, right = answer] { Look(file, right); }) - idle;
+  const auto allowed = memory * static_cast<double>(size) + kMaxExtraMemory;
+  RecordProperty("bytes", std::to_string(used) + " of " + std::to_string(allowed));
+  EXPECT_TRUE(used < allowed || !kMemoryIsOurs) << used << " bytes, not " << allowed;
+}
+
+INSTANTIATE_TEST_SUITE_P(With, HostileFile, testing::ValuesIn(kFiles),
+                         [](const auto& test) { return test.param.what; });
 
 }  // namespace
 }  // namespace velta_test

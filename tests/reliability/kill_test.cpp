@@ -1,181 +1,164 @@
-// Processes that ingest and read the same file, killed at random: what one of them was told is safe
-// stays, and no reader sees a broken tree. `--seconds=N` makes it run for N seconds, `--seed=N`
-// repeats a run.
+// Processes that write and read the same files, killed at random: what one of them was told is safe
+// stays, and no reader sees a broken tree.
+//
+// A round takes three seconds; kill_tests --gtest_repeat=N runs N, each with the next seed, and
+// --gtest_random_seed=N begins with that one.
 
-#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <chrono>
 #include <csignal>
-#include <functional>
 #include <iostream>
 #include <random>
-#include <set>
 #include <vector>
 
-#include "fleet_file.h"
+#include "fleet.h"
+#include "platform/registry_fixture.h"
 
 namespace velta_test {
 namespace {
 
 using Clock = std::chrono::steady_clock;
 
-double seconds = 3.0;
-unsigned seed = 1;
+constexpr std::chrono::seconds kRound{3};
+constexpr std::uint32_t kNumbersOfAProcess = 10'000;
 
-/// Numbers are unique over all writers of a run.
-constexpr std::uint32_t kNumbersOfAWriter = 10'000;
+/// What a process does over and over, with another number each time.
+struct Role {
+  const char* name;
+  /// \return true when it was told that the number is safe, or saw whole trees
+  bool (*work)(const std::wstring& directory, std::uint32_t number);
+  bool (*isSafe)(const orx::TInFileKey& datums, const orx::TInFileKey& projections,
+                 std::uint32_t number);
+};
 
-constexpr int kBrokenTree = 3;
-constexpr int kRefused = 4;
+const Role kRoles[] = {
+    {"ingest",
+     [](const std::wstring& directory, std::uint32_t number) {
+       static Fleet fleet(directory);
+       return fleet.IngestBoth(number);
+     },
+     [](const auto& datums, const auto& projections, std::uint32_t number) {
+       return HoldsDatum(datums, number) && HoldsProjection(projections, number);
+     }},
+    {"merge",
+     [](const std::wstring& directory, std::uint32_t number) {
+       static Fleet own(directory + std::to_wstring(getpid()) + L"/");
+       std::filesystem::remove(own.datums);
+       return own.Ingest(number) &&
+              RTCMDataSupport::MergeRTCMDatumfiles(directory + L"ROVERS.dff", own.datums) == 0;
+     },
+     [](const auto& datums, const auto&, auto number) { return HoldsDatum(datums, number); }},
+    {"replace",  // a large value, so that the file is written afresh again and again
+     [](const std::wstring& directory, std::uint32_t number) {
+       orx::TCSInFileKey tree = LoadTree(directory + L"ROVERS.dff");
+       const std::wstring text = std::to_wstring(number) + std::wstring(5000, L' ');
+       ContainerOf(tree).AddValue(L"replaced", RawValue::Text(text), 1, true);
+       return tree.Save(false, 512);
+     },
+     [](const auto& datums, const auto&, std::uint32_t number) {
+       const auto text = orx::GetRegValue<std::wstring>(ContainerOf(datums), L"replaced", L"0", 0);
+       return std::stoul(text) >= number;
+     }},
+    {"read",
+     [](const std::wstring& directory, std::uint32_t) {
+       static const Fleet fleet(directory);
+       for (const std::wstring& path : {fleet.datums, fleet.projections}) {
+         const orx::TCSInFileKey tree = LoadTree(path);
+         if (Describe(tree).empty() || tree.GetErrorState() != orx::kRegistryOk) return false;
+       }
+       return fleet.Answers();
+     },
+     [](const auto&, const auto&, auto) { return true; }},
+};
 
 class KillMachine {
  public:
-  explicit KillMachine(unsigned seedOfRun) : random_(seedOfRun) {}
+  explicit KillMachine(unsigned seed) : random_(seed) {
+    EXPECT_TRUE(Fleet(path_).IngestBoth(0));
+    for (const Role& role : kRoles) Start(role);
+    Start(kRoles[0]);
+  }
   ~KillMachine() {
-    for (const Process& process : processes_) kill(process.id, SIGKILL);
-    while (!processes_.empty()) Reap(processes_.size() - 1);
+    for (const Process& process : processes_) Kill(process);
   }
 
-  /// Starts a process that ingests new sets and reports each that it was told is safe.
-  void StartWriter() {
-    const std::uint32_t first = nextWriter_++ * kNumbersOfAWriter;
-    Start(true, [this, first](int report) {
-      const std::wstring directory = file_.directory();
-      orx::cs::velta::RTCMDataSupport support(directory.c_str(), directory.c_str());
-      orx::cs::velta::Rtcm1025 projection;
-      projection.projectionType = 1;
-      for (std::uint32_t number = first;; ++number) {
-        projection.laNO = number;
-        if (FleetFile::Ingest(support, number) != 0) _exit(kRefused);
-        if (support.ParseProjectionMessages(projection, nullptr) != 0) _exit(kRefused);
-        if (write(report, &number, sizeof number) != sizeof number) _exit(0);
-      }
-    });
-  }
-
-  /// Starts a process that reads the file over and over; it ends by itself only when it sees a
-  /// broken tree, or fewer entries than before.
-  void StartReader() {
-    Start(false, [this](int) {
-      std::size_t seen = 0;
-      for (;;) {
-        if (!std::filesystem::exists(file_.path())) continue;
-        if (file_.Load().GetErrorState() != orx::kRegistryOk) _exit(kBrokenTree);
-        const std::size_t now =
-            orx::cs::velta::RTCMGenerator(1, file_.path(), L"").getAllDatums().size();
-        if (now < seen) _exit(kBrokenTree);
-        seen = now;
-      }
-    });
-  }
-
-  /// Lets the processes work a little while, then kills one of them.
+  /// Lets the processes work a little while, then kills one of them and starts another.
   void KillOne() {
     usleep(std::uniform_int_distribution<useconds_t>(500, 30'000)(random_));
-    const std::size_t victim = random_() % processes_.size();
-    const bool wasWriter = processes_[victim].isWriter;
-    kill(processes_[victim].id, SIGKILL);
-    Reap(victim);
-    if (wasWriter) {
-      StartWriter();
-    } else {
-      StartReader();
-    }
+    const auto victim = processes_.begin() + static_cast<int>(random_() % processes_.size());
+    const Process killed = *victim;
+    processes_.erase(victim);
+    Kill(killed);
+    Start(*killed.role);
   }
 
-  /// Everything that a process reported, up to now or up to its end, is in the file.
-  void CheckAcknowledged() {
-    for (const Process& process : processes_) Collect(process);
-    if (acknowledged_.empty()) return;
-    const orx::TCSInFileKey datums = file_.Load();
-    const orx::TCSInFileKey projections(file_.directory() + L"ROVERS.prj", nullptr, nullptr, true,
-                                        97);
-    ASSERT_EQ(datums.GetErrorState(), orx::kRegistryOk);
-    ASSERT_EQ(projections.GetErrorState(), orx::kRegistryOk);
-    for (const std::uint32_t number : acknowledged_) {
-      ASSERT_TRUE(FleetFile::Holds(datums, number)) << "lost: " << number;
-      const std::wstring entry = L"S_" + std::to_wstring(number) + L"_0";
-      ASSERT_TRUE(FleetFile::Holds(projections, entry)) << "lost projection: " << number;
+  /// Everything that was reported is in the files.
+  std::size_t Check() const {
+    const orx::TCSInFileKey datums = LoadTree(path_ + L"ROVERS.dff");
+    const orx::TCSInFileKey projections = LoadTree(path_ + L"ROVERS.prj");
+    for (const auto& [role, number] : reported_) {
+      EXPECT_TRUE(role->isSafe(datums, projections, number)) << role->name << " lost " << number;
     }
+    return reported_.size();
   }
-
-  std::size_t acknowledged() const { return acknowledged_.size(); }
 
  private:
   struct Process {
+    const Role* role;
     pid_t id;
     int reports;
-    bool isWriter;
   };
 
-  void Start(bool isWriter, const std::function<void(int report)>& work) {
+  void Start(const Role& role) {
+    std::uint32_t number = nextNumber_ += kNumbersOfAProcess;
     int ends[2];
-    ASSERT_EQ(pipe2(ends, O_NONBLOCK), 0);
+    ASSERT_EQ(pipe(ends), 0);
     const pid_t id = fork();
     if (id == 0) {
-      close(ends[0]);
-      work(ends[1]);
+      for (; role.work(path_, number); ++number) {
+        if (write(ends[1], &number, sizeof number) < 0) break;
+      }
+      _exit(1);
     }
     close(ends[1]);
-    processes_.push_back({id, ends[0], isWriter});
+    processes_.push_back({&role, id, ends[0]});
   }
 
-  void Collect(const Process& process) {
-    std::uint32_t number = 0;
-    while (read(process.reports, &number, sizeof number) == sizeof number) {
-      acknowledged_.insert(number);
-    }
-  }
-
-  void Reap(std::size_t place) {
-    const Process process = processes_[place];
-    processes_.erase(processes_.begin() + static_cast<std::ptrdiff_t>(place));
+  void Kill(const Process& process) {
+    kill(process.id, SIGKILL);
     int status = 0;
     waitpid(process.id, &status, 0);
-    Collect(process);
+    EXPECT_TRUE(WIFSIGNALED(status)) << process.role->name << " was refused or saw a broken tree";
+    std::uint32_t number = 0;
+    while (read(process.reports, &number, sizeof number) == sizeof number) {
+      reported_.emplace_back(process.role, number);
+    }
     close(process.reports);
-    const int answer = WIFEXITED(status) ? WEXITSTATUS(status) : 0;
-    EXPECT_NE(answer, kBrokenTree) << "a reader saw a broken tree";
-    EXPECT_NE(answer, kRefused) << "a writer was refused";
   }
 
-  FleetFile file_;
+  const TemporaryDirectory directory_;
+  const std::wstring path_ = (directory_ / "").wstring();
   std::mt19937 random_;
-  std::uint32_t nextWriter_ = 0;
+  std::uint32_t nextNumber_ = 0;
   std::vector<Process> processes_;
-  std::set<std::uint32_t> acknowledged_;
+  std::vector<std::pair<const Role*, std::uint32_t>> reported_;
 };
 
-TEST(Killed, NothingAcknowledgedIsLostAndNoReaderSeesABrokenTree) {
-  KillMachine machine(seed);
-  machine.StartWriter();
-  machine.StartWriter();
-  machine.StartReader();
-  const auto end = Clock::now() + std::chrono::duration<double>(seconds);
-  int kills = 0;
-  while (Clock::now() < end && !HasFailure()) {
+TEST(Killed, NothingReportedIsLostAndNoReaderSeesABrokenTree) {
+  const int seed = testing::UnitTest::GetInstance()->random_seed();
+  KillMachine machine(static_cast<unsigned>(seed));
+  std::size_t kills = 0;
+  for (const auto end = Clock::now() + kRound; Clock::now() < end && !HasFailure(); ++kills) {
     machine.KillOne();
-    machine.CheckAcknowledged();
-    ++kills;
+    machine.Check();
   }
-  std::cout << kills << " processes killed, " << machine.acknowledged() << " entries safe\n";
-  EXPECT_GT(machine.acknowledged(), 10U) << "the machine did some work";
+  std::cout << kills << " processes killed, " << machine.Check() << " reports, seed " << seed
+            << "\n";
+  EXPECT_GT(machine.Check(), kills) << "the machine did some work";
 }
 
 }  // namespace
 }  // namespace velta_test
-
-int main(int argc, char** argv) {
-  ::testing::InitGoogleTest(&argc, argv);
-  for (int i = 1; i < argc; ++i) {
-    const std::string option = argv[i];
-    if (option.rfind("--seconds=", 0) == 0) velta_test::seconds = std::stod(option.substr(10));
-    if (option.rfind("--seed=", 0) == 0) {
-      velta_test::seed = static_cast<unsigned>(std::stoul(option.substr(7)));
-    }
-  }
-  return RUN_ALL_TESTS();
-}

@@ -4,75 +4,69 @@
 #include <gtest/gtest.h>
 
 #include <atomic>
-#include <functional>
+#include <boost/thread/lock_types.hpp>
 #include <mutex>
 #include <thread>
 #include <vector>
 
-#include "fleet_file.h"
+#include "fleet.h"
+#include "support/temporary_directory.h"
 
 namespace velta_test {
 namespace {
 
-namespace velta = orx::cs::velta;
+TEST(Threads, IngestMergeLookAndQueryWithoutLoss) {
+  constexpr std::uint32_t kSets = 25;
+  const TemporaryDirectory directory;
+  Fleet fleet((directory / "").wstring());
+  ASSERT_TRUE(fleet.IngestBoth(0));
+  for (std::uint32_t i = 1; i <= kSets; ++i) ASSERT_TRUE(fleet.Ingest(1000 + i, "SOURCE"));
 
-constexpr std::uint32_t kSets = 25;
-
-TEST(Threads, IngestMergeAndQueryOneFileWithoutLoss) {
-  const FleetFile file;
-  velta::RTCMDataSupport support(file.directory().c_str(), nullptr);
-  ASSERT_EQ(FleetFile::Ingest(support, 0), 0);
-  std::mutex ingestion;
-  // Merged in by the merging threads; made beforehand, as other programs' files are.
-  for (const std::uint32_t source : {0U, 1U}) {
-    for (std::uint32_t i = 0; i < kSets; ++i) {
-      ASSERT_EQ(
-          FleetFile::Ingest(support, 2000 + source * kSets + i, "SOURCE" + std::to_string(source)),
-          0);
-    }
-  }
-
-  const auto ingest = [&](std::uint32_t thread) {
-    for (std::uint32_t i = 0; i < kSets; ++i) {
-      const std::lock_guard<std::mutex> oneAtATime(ingestion);
-      ASSERT_EQ(FleetFile::Ingest(support, 1000 + thread * kSets + i), 0);
-    }
-  };
-  const auto merge = [&](std::uint32_t source) {
-    const std::wstring path = file.path("SOURCE" + std::to_string(source));
-    for (int i = 0; i < 3; ++i) {
-      ASSERT_EQ(velta::RTCMDataSupport::MergeRTCMDatumfiles(file.path(), path), 0);
-    }
-  };
   std::atomic<bool> done{false};
-  const velta::RTCMGenerator generator(1, file.path(), L"");
-  const auto query = [&](std::uint32_t) {
-    const double latitude = 300'000 * 2.42406840554768e-6;  // of set 0, radians
-    const double longitude = 36'000 * 2.42406840554768e-6;
-    while (!done) {
-      EXPECT_FALSE(generator.getAllDatums().empty());
-      EXPECT_NE(generator.get1023(latitude, longitude, 0), nullptr);
-      EXPECT_NE(generator.getRtcmDatumMessage(latitude, longitude, 0), nullptr);
+  std::mutex ingestion;
+  const auto ingest = [&](std::uint32_t first) {
+    for (std::uint32_t i = 1; i <= kSets; ++i) {
+      const std::lock_guard<std::mutex> oneAtATime(ingestion);
+      EXPECT_TRUE(fleet.IngestBoth(first + i));
     }
   };
+  const auto merge = [&] {
+    for (int i = 0; i < 3; ++i) EXPECT_TRUE(fleet.Merge(fleet.directory + L"SOURCE.dff"));
+  };
+  const auto look = [&] {
+    while (!done) {
+      orx::TCSInFileKey* shared = nullptr;
+      ASSERT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(fleet.datums, &shared), 0);
+      {
+        const boost::unique_lock<boost::recursive_mutex> lock(shared->GetMutex());
+        EXPECT_TRUE(HoldsDatum(*shared, 0));
+      }
+      RTCMDataSupport::ReleasePtrDatumGFF(fleet.datums);
+    }
+  };
+  const auto query = [&] {
+    while (!done) EXPECT_TRUE(fleet.Answers());
+  };
 
-  std::vector<std::thread> writers;
-  std::vector<std::thread> readers;
-  for (const std::uint32_t i : {0U, 1U}) {
-    readers.emplace_back(query, i);
-    writers.emplace_back(ingest, i);
-    writers.emplace_back(merge, i);
+  std::vector<std::thread> readers, writers;
+  for (const std::uint32_t first : {2000U, 3000U}) {
+    readers.emplace_back(query);
+    readers.emplace_back(look);
+    writers.emplace_back(ingest, first);
+    writers.emplace_back(merge);
   }
   for (std::thread& thread : writers) thread.join();
   done = true;
   for (std::thread& thread : readers) thread.join();
 
-  const orx::TCSInFileKey tree = file.Load();
-  for (std::uint32_t i = 0; i < 2 * kSets; ++i) {
-    EXPECT_TRUE(FleetFile::Holds(tree, 1000 + i)) << i;
-    EXPECT_TRUE(FleetFile::Holds(tree, 2000 + i)) << i;
+  const orx::TCSInFileKey datums = LoadTree(fleet.datums);
+  const orx::TCSInFileKey projections = LoadTree(fleet.projections);
+  for (std::uint32_t i = 1; i <= kSets; ++i) {
+    EXPECT_TRUE(HoldsDatum(datums, 1000 + i)) << i;
+    for (const std::uint32_t number : {2000 + i, 3000 + i}) {
+      EXPECT_TRUE(HoldsDatum(datums, number) && HoldsProjection(projections, number)) << number;
+    }
   }
-  EXPECT_EQ(generator.getAllDatums().size(), 1 + 4 * kSets);
 }
 
 }  // namespace

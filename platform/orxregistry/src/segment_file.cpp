@@ -223,6 +223,9 @@ std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, cons
   }
   if (stamp && os::Rename(beside, path, replace)) return stamp;
   os::Remove(beside);
+  // A new file whose name did not become durable goes, as what it holds must not pass for saved.
+  const auto named = replace ? std::nullopt : os::StampOf(path);
+  if (stamp && named && named->IsSameFile(*stamp)) os::Remove(path);
   return std::nullopt;
 }
 
