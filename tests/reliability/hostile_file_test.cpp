@@ -80,17 +80,6 @@ const struct Hostile {
     {"ExabytesInAKey", [] { return Lying(0, 15); }, 0, orx::kDamaged, 0},
 };
 
-bool Finds(const orx::TGenericRegistryKey& key) {
-  for (const std::wstring& name : key.GetValueNames()) {
-    if (!key.HasValue(name)) return false;
-  }
-  for (orx::TGenRegKeyIterator walk(key); walk;) {
-    const orx::TGenericRegistryKey sub(walk++);
-    if (!key.HasKey(sub.GetName()) || !Finds(sub)) return false;
-  }
-  return true;
-}
-
 /// Asks for everything and looks at everything.
 void Look(const RegistryFile& file, orx::RegistryError answer) {
   const orx::cs::velta::RTCMGenerator generator(1, file.path.wstring(), file.path.wstring());
@@ -98,7 +87,7 @@ void Look(const RegistryFile& file, orx::RegistryError answer) {
   EXPECT_FALSE(generator.getRtcmDatumMessage(0.9, 0.15, 0) || generator.get1023(0.9, 0.15, 0));
   EXPECT_FALSE(generator.get1024(5e6, 3e6, 0) || generator.getRtcmProjMessage());
   orx::TCSInFileKey tree = file.Load();
-  EXPECT_TRUE(Finds(RootOf(tree))) << "what is listed";
+  Describe(tree);
   EXPECT_EQ(tree.GetErrorState(), answer);
   RegistryFile::AddEntry(tree, L"S_1", "next");
   EXPECT_EQ(tree.Save(false, 512), answer == orx::kRegistryOk);
