@@ -143,9 +143,10 @@ std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
 }
 
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
+  const std::filesystem::path directory = to.parent_path();  // before it is too late to throw
   const bool renamed = replace ? std::rename(from.c_str(), to.c_str()) == 0
                                : RenameToNewName(from.c_str(), to.c_str());
-  return renamed && FlushDirectory(to.parent_path());
+  return renamed && FlushDirectory(directory);
 }
 
 void Remove(const std::filesystem::path& path) { unlink(path.c_str()); }

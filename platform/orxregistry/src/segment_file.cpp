@@ -201,13 +201,13 @@ FileContent ReadRegistryFile(const std::filesystem::path& path) {
 }
 
 std::optional<Buffer> MakeRegistryFile(KeyTree& tree) {
-  Buffer bytes = MakeFileHeader(tree.description);
-  const std::size_t start = bytes.size();
-  bytes.resize(start + kSegmentHeader);
-  tree.WriteAll(bytes);
+  std::optional<Buffer> file = MakeFileHeader(tree.description);
+  const std::size_t start = file->size();
+  file->resize(start + kSegmentHeader);
+  tree.WriteAll(*file);
   if (tree.error != kRegistryOk) return std::nullopt;
-  FinishSegment(bytes, start, start, 0);
-  return bytes;
+  FinishSegment(*file, start, start, 0);
+  return file;
 }
 
 std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, const Buffer& bytes,
