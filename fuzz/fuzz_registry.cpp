@@ -76,14 +76,14 @@ void Merge(const RegistryFile& file, bool isGood) {
   static const RegistryFile other;
   static const std::string before = (other.Create("kept"), other.Bytes());
   other.SetBytes(before);
-  const std::wstring path = file.path.wstring();
-  const bool merged = RTCMDataSupport::MergeRTCMDatumfiles(other.path.wstring(), path) == 0;
+  const std::wstring path = file.Name();
+  const bool merged = RTCMDataSupport::MergeRTCMDatumfiles(other.Name(), path) == 0;
   Require(other.Load().GetErrorState() == orx::kRegistryOk);
   if (!merged) {
     Require(other.Bytes() == before);
     Require(!isGood || !orx::TGenRegKeyIterator(RootOf(file.Load())));
   }
-  RTCMDataSupport::MergeRTCMProjectionfiles(path, other.path.wstring());
+  RTCMDataSupport::MergeRTCMProjectionfiles(path, other.Name());
 }
 
 void Try(const std::string& bytes) {
@@ -93,7 +93,7 @@ void Try(const std::string& bytes) {
   std::vector<std::pair<double, double>> positions{{NAN, 0.15}};
   Walk(RootOf(tree), positions);
   const bool isGood = tree.GetErrorState() == orx::kRegistryOk;
-  Query(file.path.wstring(), positions);
+  Query(file.Name(), positions);
   Save(file, tree, isGood);
   if (tree.GetErrorState() != orx::kNotARegistryFile) Merge(file, isGood);
 }

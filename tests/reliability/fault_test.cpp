@@ -17,7 +17,7 @@ namespace {
 
 /// A file, and what a process keeps in memory from one save to the next.
 struct Stage : RegistryFile {
-  explicit Stage(const char* name) : RegistryFile(name) {}
+  explicit Stage(const char* name) { path = directory / name; }
 
   bool Add(const std::wstring& entry, const std::string& value) {
     AddEntry(*tree, entry, value);
@@ -54,7 +54,7 @@ void CreateWithTwo(Stage& stage) {
 
 const Scenario kScenarios[] = {
     {"NewFile", "tree.dff",
-     [](Stage& stage) { stage.tree.emplace(stage.path.wstring(), L"", nullptr, false, 97); },
+     [](Stage& stage) { stage.tree.emplace(stage.Name(), L"", nullptr, false, 97); },
      [](Stage& stage) { return stage.Add(L"S_0", "made"); }, "", "made"},
     {"Append", "tree.dff", CreateWithTwo, [](Stage& stage) { return stage.Add(L"S_2", "second"); },
      kKept, "second"},
@@ -107,7 +107,7 @@ int Try(const Scenario& scenario, Fault fault, int place) {
   SCOPED_TRACE("fault " + std::to_string(static_cast<int>(fault)) + " at " + std::to_string(place));
   Stage stage(scenario.file);
   scenario.prepare(stage);
-  if (!stage.tree) stage.tree.emplace(stage.path.wstring(), nullptr, nullptr, true, 97);
+  if (!stage.tree) stage.tree.emplace(stage.Name(), nullptr, nullptr, true, 97);
   const std::string before = Describe(stage.Load());
   const ino_t fileBefore = stage.FileNumber();
   bool promised = false;

@@ -82,7 +82,7 @@ const struct Hostile {
 
 /// Asks for everything and looks at everything.
 void Look(const RegistryFile& file, orx::RegistryError answer) {
-  const orx::cs::velta::RTCMGenerator generator(1, file.path.wstring(), file.path.wstring());
+  const orx::cs::velta::RTCMGenerator generator(1, file.Name(), file.Name());
   EXPECT_TRUE(generator.getAllDatums().empty());
   EXPECT_FALSE(generator.getRtcmDatumMessage(0.9, 0.15, 0) || generator.get1023(0.9, 0.15, 0));
   EXPECT_FALSE(generator.get1024(5e6, 3e6, 0) || generator.getRtcmProjMessage());

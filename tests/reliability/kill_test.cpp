@@ -54,13 +54,14 @@ const Role kRoles[] = {
     {"replace",  // a large value, so that the file is written afresh again and again
      [](const std::wstring& directory, std::uint32_t number) {
        orx::TCSInFileKey tree = LoadTree(directory + L"ROVERS.dff");
-       const std::wstring text = std::to_wstring(number) + std::wstring(5000, L' ');
-       ContainerOf(tree).AddValue(L"replaced", RawValue::Text(text), 1, true);
+       const std::string text = std::to_string(number) + std::string(10'000, ' ');
+       ContainerOf(tree).AddValue(L"replaced", RawValue::Block(text), 1, true);
        return tree.Save(false, 512);
      },
      [](const auto& datums, const auto&, std::uint32_t number) {
-       const auto text = orx::GetRegValue<std::wstring>(ContainerOf(datums), L"replaced", L"0", 0);
-       return std::stoul(text) >= number;
+       RawValue value;
+       ContainerOf(datums).GetValue(L"replaced", value, 0, true);
+       return std::atol(value.bytes().c_str()) >= number;
      }},
     {"read",
      [](const std::wstring& directory, std::uint32_t) {
