@@ -49,25 +49,25 @@ namespace {
 /// Something that takes memory, another set each time.
 struct Case {
   const char* what;
-  int exceptions;  ///< at least
   bool (*work)(Fleet& fleet, std::uint32_t number);
+  int exceptions;  ///< at least
   bool addsEntry;
 };
 
 const Case kCases[] = {
-    {"Ingestion", 100, [](Fleet& fleet, std::uint32_t number) { return fleet.IngestBoth(number); },
+    {"Ingestion", [](Fleet& fleet, std::uint32_t number) { return fleet.IngestBoth(number); }, 100,
      true},
-    {"FirstIngestion", 200,
+    {"FirstIngestion",
      [](Fleet& fleet, std::uint32_t number) {
        return Fleet(fleet.directory + std::to_wstring(number) + L"/").IngestBoth(number);
      },
-     false},
-    {"Merge", 100,
+     200, false},
+    {"Merge",
      [](Fleet& fleet, std::uint32_t number) {
        return fleet.Ingest(number, "OTHER") && fleet.Merge(fleet.directory + L"OTHER.dff");
      },
-     true},
-    {"Queries", 50, [](Fleet& fleet, std::uint32_t) { return fleet.Answers(); }, false},
+     100, true},
+    {"Queries", [](Fleet& fleet, std::uint32_t) { return fleet.Answers(); }, 50, false},
 };
 
 /// No lock of the shared files is held; a thread that holds one could always take it again.
@@ -84,7 +84,7 @@ bool LocksAreFree(Fleet& fleet) {
 class OutOfMemory : public testing::TestWithParam<Case> {};
 
 TEST_P(OutOfMemory, IsReportedAndLeavesNothingHalf) {
-  const auto& [what, minimum, work, addsEntry] = GetParam();
+  const auto& [what, work, minimum, addsEntry] = GetParam();
   const TemporaryDirectory directory;
   Fleet fleet((directory / "").wstring());
   ASSERT_TRUE(fleet.IngestBoth(0));

@@ -68,13 +68,16 @@ using namespace velta_test;
 
 #define EXPORTED extern "C" __attribute__((visibility("default")))
 #define FAILS (Judge() != Verdict::kWork)
-#define REAL(name) reinterpret_cast<decltype(&name)>(dlsym(RTLD_NEXT, #name))
+#define REAL(name) reinterpret_cast<decltype(&(name))>(dlsym(RTLD_NEXT, #name))
 
 EXPORTED int open(const char* path, int flags, ...) {
-  va_list arguments;
-  va_start(arguments, flags);
-  const mode_t mode = (flags & O_CREAT) != 0 ? va_arg(arguments, mode_t) : 0;
-  va_end(arguments);
+  mode_t mode = 0;
+  if ((flags & O_CREAT) != 0) {
+    va_list arguments;
+    va_start(arguments, flags);
+    mode = va_arg(arguments, mode_t);
+    va_end(arguments);
+  }
   return FAILS ? -1 : REAL(open)(path, flags, mode);
 }
 EXPORTED int stat(const char* path, struct stat* status) noexcept {
