@@ -75,7 +75,7 @@ EXPORTED int open(const char* path, int flags, ...) {
   if ((flags & O_CREAT) != 0) {
     va_list arguments;
     va_start(arguments, flags);
-    mode = va_arg(arguments, mode_t);
+    mode = va_arg(arguments, mode_t);  // NOLINT(*-valist.Uninitialized): the line above does it
     va_end(arguments);
   }
   return FAILS ? -1 : REAL(open)(path, flags, mode);
