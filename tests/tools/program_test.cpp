@@ -1,7 +1,6 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
-#include <regex>
 #include <sstream>
 #include <string>
 #include <vector>
@@ -134,20 +133,6 @@ TEST_F(ProgramTest, ConvertsTheExamplesToTheByteBothWays) {
     const std::string lines = ReadBytes(EXAMPLE_STREAMS "/" + name + ".jsonl");
     EXPECT_EQ(Run("encode -", lines).out, frames);
     EXPECT_EQ(Run("decode -", frames).out, lines);
-  }
-}
-
-TEST_F(ProgramTest, HelpHasExamplesThatWork) {
-  const std::regex rest("\\\\\n *"), streams("examples/streams/"), place(" out");
-  const std::regex example("\n  velta ([^|\n]*)");
-  const char* const commands[] = {"",      "ingest", "list",   "generate",
-                                  "merge", "decode", "encode", "dump"};
-  for (const std::string command : commands) {
-    std::string help = std::regex_replace(Run(command + " --help").out, rest, "");
-    EXPECT_NE(help.find("\n  velta " + command), std::string::npos) << help;
-    help = std::regex_replace(std::regex_replace(help, streams, "%"), place, " @out");
-    for (std::sregex_iterator found(help.begin(), help.end(), example), end; found != end; ++found)
-      EXPECT_EQ(Run(found->str(1)).status, 0) << found->str();
   }
 }
 

@@ -76,7 +76,8 @@ CLI::App* AddConversion(CLI::App& program, Action& action, const std::string& na
   const auto files = std::make_shared<Conversion>();
   CLI::App* command = program.add_subcommand(name, help);
   command->add_option("FILE", files->from, "the input, \"-\" for standard input")->required();
-  command->add_option("-o,--output", files->to, "the output")->capture_default_str();
+  command->add_option("-o,--output", files->to, "the output, \"-\" for standard output")
+      ->capture_default_str();
   command->callback([&action, files, work] { action = [files, work] { return work(*files); }; });
   return command;
 }

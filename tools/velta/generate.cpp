@@ -167,12 +167,15 @@ void AddGenerate(CLI::App& program, Action& action) {
                     "print JSON lines as \"velta decode\" does, no frames");
   command->footer(
       "Sends, as RTCM 3 frames, a 1021 or 1022 and a 1023 from the datum file, a 1024 and a 1025\n"
-      "or 1027 from the projection file. The datum message announces what is sent with it.\n"
+      "or 1027 from the projection file: one of the two files must be given. A 1024 is sent only\n"
+      "for a northing and an easting. The datum message announces what is sent with it. As the\n"
+      "output \"-\" is standard output.\n"
       "\n"
       "Example:\n"
       "  velta ingest --datum-dir . --projection-dir . examples/streams/dhdn.rtcm3\n"
       "  velta generate --datum AUTO_DHDN_BESEL.dff --projection AUTO_DHDN_BESEL.prj --lat 52.002 "
-      "--lon 9.002 --json");
+      "--lon 9.002 -o messages.rtcm3\n"
+      "  velta decode messages.rtcm3");
   command->callback([&action, options] {
     if (options->datum.empty() && options->projection.empty()) {
       throw CLI::RequiredError("--datum or --projection");

@@ -217,8 +217,8 @@ void AddIngest(CLI::App& program, Action& action) {
       "ingest", "Puts the message sets of RTCM 3 streams into datum and projection files.");
   command->add_option("FILE", options->files, "the streams, \"-\" for standard input")->required();
   auto* dir = command->add_option("--dir", options->dir,
-                                  "directory that stands for the user's geodetic directory; the\n"
-                                  "files go to datums/rtcmdata and projections/rtcmdata in it");
+                                  "the files go to datums/rtcmdata and projections/rtcmdata in\n"
+                                  "this directory");
   auto* datumDir =
       command->add_option("--datum-dir", options->datumDir, "directory of the datum files (.dff)");
   auto* projectionDir = command->add_option("--projection-dir", options->projectionDir,
@@ -230,6 +230,8 @@ void AddIngest(CLI::App& program, Action& action) {
       "A set is a datum message (1021 or 1022) and the messages that it announces, all with the\n"
       "same System Identification Number, in any order. It is ingested as soon as it is complete.\n"
       "A 1026 is not supported. Sets that are incomplete at the end are reported as failures.\n"
+      "Without a directory the files go to the user's geodetic directory, where the office\n"
+      "application looks for them; the environment variable ORX_USER_GEO_DIR names another.\n"
       "\n"
       "Example:\n"
       "  velta ingest --dir out examples/streams/dhdn.rtcm3");

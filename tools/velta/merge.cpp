@@ -57,6 +57,7 @@ void AddMerge(CLI::App& program, Action& action) {
   command->add_flag("--json", merge->json, "print the result as JSON");
   command->footer(
       "Entries of the same name are replaced by the source's; what only the target has stays.\n"
+      "All entries of the target then count as its own datum's, whatever the source's is called.\n"
       "\n"
       "Example:\n"
       "  velta ingest --datum-dir . --projection-dir . examples/streams/dhdn.rtcm3\n"
