@@ -17,6 +17,7 @@
 #include "files.h"
 #include "ingest_report.h"
 #include "message_set.h"
+#include "orxutils/path.h"
 #include "rtcm3/message_reader.h"
 #include "terminal.h"
 #include "text.h"
@@ -42,15 +43,15 @@ class SizeWatch {
  public:
   explicit SizeWatch(const fs::path& directory) {
     std::error_code error;
-    for (fs::directory_iterator files(directory, error), end; !error && files != end;
-         files.increment(error)) {
+    for (fs::directory_iterator files(orx::ToSystemPath(directory), error), end;
+         !error && files != end; files.increment(error)) {
       Changed(files->path());
     }
   }
 
   bool Changed(const fs::path& file) {
     std::error_code error;
-    const std::uintmax_t size = fs::file_size(file, error);
+    const std::uintmax_t size = fs::file_size(orx::ToSystemPath(file), error);
     if (error) return false;
     const auto [known, isNew] = sizes_.try_emplace(file.filename(), size);
     return isNew || std::exchange(known->second, size) != size;
