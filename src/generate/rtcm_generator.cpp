@@ -28,6 +28,16 @@ bool ReadDatum(const TGenericRegistryKey& container, const TGenericRegistryKey& 
   return true;
 }
 
+/// Those of the keys that may be datum entries.
+std::size_t CountEntries(const TGenericRegistryKey& container) {
+  std::size_t count = 0;
+  for (TGenRegKeyIterator walk(container); walk;) {
+    const TGenericRegistryKey entry(walk++);
+    if (entry.HasKey(layout::kStandardDatum) && entry.HasKey(layout::kDatumGrid.key)) ++count;
+  }
+  return count;
+}
+
 }  // namespace
 
 RTCMGenerator::RTCMGenerator(std::int32_t id, const COrxStringT<wchar_t>& datumFileName,
@@ -43,9 +53,7 @@ RTCMGenerator::~RTCMGenerator() = default;
 std::vector<DatumData, orx_dl_allocator<DatumData>> RTCMGenerator::getAllDatums() const {
   std::vector<DatumData, orx_dl_allocator<DatumData>> datums;
   const TGenericRegistryKey container = OpenContainer(datumFile);
-  std::size_t entries = 0;
-  for (TGenRegKeyIterator walk(container); walk; walk++) ++entries;
-  datums.reserve(entries);
+  datums.reserve(CountEntries(container));
   for (TGenRegKeyIterator walk(container); walk;) {
     datums.emplace_back();
     if (!ReadDatum(container, TGenericRegistryKey(walk++), datums.back())) datums.pop_back();

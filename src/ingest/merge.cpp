@@ -47,8 +47,9 @@ ResultCode MergeFiles(const FileKind& kind, const COrxStringT<wchar_t>& targetPa
   // touched.
   LookInto(sourceContainer);
   if (source.GetErrorState() != kRegistryOk) return kind.trouble;
+  Change change(*target);
   if (merge(targetContainer, sourceContainer) != kSuccess) return kind.trouble;
-  return target->Save(false, kRegistryVersion) ? kSuccess : kind.trouble;
+  return change.Save() ? kSuccess : kind.trouble;
 }
 
 }  // namespace

@@ -42,10 +42,11 @@ ResultCode AddEntry(const FileKind& kind, const COrxStringT<wchar_t>& name, cons
   // Damage inside a key shows only when the key has been looked into.
   if (container.IsNull() || file.GetErrorState() != kRegistryOk) return kind.trouble;
   if (isPresent) return kSuccess;
+  Change change(file);
   TGenericRegistryKey entry(container, name, container.GetKeyDim(), true);
   const ResultCode result = fill(entry);
   if (result != kSuccess) return result;
-  return file.Save(false, kRegistryVersion) ? kSuccess : kEntryNotWritten;
+  return change.Save() ? kSuccess : kEntryNotWritten;
 }
 
 }  // namespace orx::cs::velta

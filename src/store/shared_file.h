@@ -58,6 +58,25 @@ class GiveBackLater {
   const COrxStringT<wchar_t>& path_;
 };
 
+/// A change of a shared file: either all of it is saved, or it is forgotten when this goes. What
+/// was unsaved before is the caller's and is left alone.
+class Change {
+ public:
+  explicit Change(TInFileKey& file) : file_(file), isAlone_(!file.HasUnsavedChanges()) {}
+  Change(const Change&) = delete;
+  Change& operator=(const Change&) = delete;
+  ~Change() {
+    if (!isSaved_ && isAlone_) file_.ForgetChanges();
+  }
+
+  bool Save() { return isSaved_ = file_.Save(false, kRegistryVersion); }
+
+ private:
+  TInFileKey& file_;
+  bool isAlone_;
+  bool isSaved_ = false;
+};
+
 /// The first sub-key, null when there is none.
 TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key);
 

@@ -81,10 +81,19 @@ bool LocksAreFree(Fleet& fleet) {
          std::async(std::launch::async, isFree, RTCMDataSupport::GFFProjectionFile).get();
 }
 
-class OutOfMemory : public testing::TestWithParam<Case> {};
+/// Every entry in the file is one that the list of datums has.
+bool HasOnlyWholeEntries(const Fleet& fleet) {
+  const orx::TCSInFileKey tree = LoadTree(fleet.datums);
+  std::size_t entries = 0;
+  for (orx::TGenRegKeyIterator walk(ContainerOf(tree)); walk; walk++) ++entries;
+  return RTCMGenerator(1, fleet.datums, L"").getAllDatums().size() == entries;
+}
+
+/// Also while somebody else has the shared file.
+class OutOfMemory : public testing::TestWithParam<std::tuple<Case, bool>> {};
 
 TEST_P(OutOfMemory, IsReportedAndLeavesNothingHalf) {
-  const auto& [what, work, minimum, addsEntry] = GetParam();
+  const auto& [what, work, minimum, addsEntry] = std::get<Case>(GetParam());
   const TemporaryDirectory directory;
   Fleet fleet((directory / "").wstring());
   ASSERT_TRUE(fleet.IngestBoth(0));
@@ -92,8 +101,10 @@ TEST_P(OutOfMemory, IsReportedAndLeavesNothingHalf) {
   bool ranOut = true;
   for (std::uint32_t number = 1; ranOut && !HasFailure(); ++number) {
     SCOPED_TRACE(number);
-    std::filesystem::remove(directory / "OTHER.dff");  // else merging takes ever more memory
+    std::filesystem::remove(directory / "OTHER.dff");
     bool answered = false;
+    orx::TCSInFileKey* shared = nullptr;
+    if (std::get<bool>(GetParam())) fleet.support.GetUnlockedPtrDatumGFF(fleet.datums, &shared);
     allocationsLeft = number - 1;
     try {
       answered = work(fleet, number);
@@ -107,12 +118,19 @@ TEST_P(OutOfMemory, IsReportedAndLeavesNothingHalf) {
     EXPECT_TRUE(!answered || HoldsDatum(LoadTree(fleet.datums), number) == addsEntry);
     EXPECT_TRUE(work(fleet, number)) << "the next call";
     EXPECT_EQ(HoldsDatum(LoadTree(fleet.datums), number), addsEntry);
+    EXPECT_TRUE(HasOnlyWholeEntries(fleet));
+    if (shared) fleet.support.ReleasePtrDatumGFF(fleet.datums);
   }
   EXPECT_GT(exceptions, minimum);
 }
 
-INSTANTIATE_TEST_SUITE_P(In, OutOfMemory, testing::ValuesIn(kCases),
-                         [](const auto& test) { return test.param.what; });
+INSTANTIATE_TEST_SUITE_P(In, OutOfMemory,
+                         testing::Combine(testing::ValuesIn(kCases), testing::Bool()),
+                         [](const auto& test) {
+                           const bool isShared = std::get<bool>(test.param);
+                           return std::get<Case>(test.param).what +
+                                  std::string(isShared ? "OfASharedFile" : "");
+                         });
 
 }  // namespace
 }  // namespace velta_test

@@ -43,7 +43,7 @@ int Run(std::vector<std::string> arguments) {
   try {
     // Takes them from the last to the first, without the program's name.
     std::reverse(arguments.begin(), arguments.end());
-    arguments.pop_back();
+    if (!arguments.empty()) arguments.pop_back();
     program.parse(std::move(arguments));
   } catch (const CLI::ParseError& error) {
     return program.exit(error) == 0 ? kDone : kWrongCall;

@@ -43,8 +43,11 @@ bool TInFileKey::Save(bool /*flag*/, unsigned registryVersion) {
   const AppendResult result = AppendUnsaved(*path, *tree_);
   if (result == AppendResult::kFailed) return false;
   tree_->MarkSaved();
-  // What others appended is in the file and not in this tree.
-  if (result == AppendResult::kBehindOthers) tree_->position.stamp = os::FileStamp();
+  // What others appended is in the file and not in this tree. What was copied lies in the memory of
+  // whole other files, which is given up once the file is read again.
+  if (result == AppendResult::kBehindOthers || tree_->HasBorrowed()) {
+    tree_->position.stamp = os::FileStamp();
+  }
   return true;
 }
 
@@ -66,6 +69,11 @@ bool TInFileKey::Save(const COrxStringT<wchar_t>& fileName, bool /*flag*/,
 }
 
 bool TInFileKey::HasUnsavedChanges() const { return tree_->has_unsaved(); }
+
+void TInFileKey::ForgetChanges() {
+  tree_->MarkSaved();
+  tree_->position.stamp = os::FileStamp();
+}
 
 bool TInFileKey::HasFileChanged() const {
   const std::optional<std::filesystem::path> path = ToPath(fileName_);

@@ -189,8 +189,9 @@ void KeyTree::DeepCopy(Key& to, Key& from) {
     const std::size_t size = record::KeyRecordSize(record);
     if (record::IsWhole({record, size}, record::kMaxDepth - to.depth)) {
       lenders_.insert(source.shared_from_this());
+      Unsaved& unsaved = MarkUnsaved(to);
       AddLayer(to, record);
-      MarkUnsaved(to).copied = record;
+      unsaved.copied = record;
       unsavedBytes_ += size;
       return;
     }
@@ -209,7 +210,14 @@ KeyTree::Unsaved& KeyTree::MarkUnsaved(Key& key) {
   isAsLoaded_ = false;
   const auto [entry, isNew] = unsaved_.try_emplace(&key);
   Unsaved& unsaved = entry->second;
-  if (isNew && key.parent) MarkUnsaved(*key.parent).keys.push_back(&key);
+  if (isNew && key.parent) {
+    try {
+      MarkUnsaved(*key.parent).keys.push_back(&key);
+    } catch (...) {
+      unsaved_.erase(entry);  // nobody would come to it
+      throw;
+    }
+  }
   return unsaved;
 }
 

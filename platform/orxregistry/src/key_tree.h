@@ -120,6 +120,8 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   /// Appends the record of the root with everything.
   void WriteAll(record::Buffer& to) { WriteAll(to, *root_); }
   void MarkSaved();
+  /// True when some of the tree lies in the memory of trees that it was copied from.
+  bool HasBorrowed() const { return !lenders_.empty(); }
 
   RegistryError error = kRegistryOk;
   const std::u16string description;

@@ -86,10 +86,15 @@ class NamedList {
 
   void Append(Item item) {
     items_.push_back(item);
-    if (index_) {
-      index_->insert(items_.size() - 1);
-    } else if (items_.size() > kLinear) {
-      MakeIndex();
+    try {
+      if (index_) {
+        index_->insert(items_.size() - 1);
+      } else if (items_.size() > kLinear) {
+        MakeIndex();
+      }
+    } catch (...) {
+      items_.pop_back();
+      throw;
     }
   }
 

@@ -73,9 +73,12 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
   /// \param registryVersion kRegistryVersion
   bool Save(const COrxStringT<wchar_t>& fileName, bool flag, unsigned registryVersion);
 
- protected:
   /// True when the tree has changes that no save has made durable.
   bool HasUnsavedChanges() const;
+  /// Gives up what is not saved. The tree shows it until it is read again, but no save writes it.
+  void ForgetChanges();
+
+ protected:
   /// True when the file is not, or no longer, what was read or saved last.
   bool HasFileChanged() const;
   /// Reads the file again, forgetting unsaved changes. Keys obtained before keep the old tree.
