@@ -90,8 +90,12 @@ void Report::WriteJson(const std::string& path) const {
                                     {"velta", row.velta},
                                     {"beside", row.beside}};
     if (row.goal) entry["goal"] = *row.goal;
-    if (row.peer > 0) entry["sqlite"] = row.peer;
     if (row.beside > 0) entry["ratio"] = row.velta / row.beside;
+    if (row.goal && row.beside > 0) entry["missed"] = row.velta / row.beside > *row.goal;
+    if (row.peer > 0) {
+      entry["sqlite"] = row.peer;
+      entry["ratioToSqlite"] = row.velta / row.peer;
+    }
     rows.push_back(entry);
   }
   std::ofstream(path) << rows.dump(2) << "\n";

@@ -118,7 +118,7 @@ TEST_P(RecordFileTest, MergeWithAFileThatCannotBeUsedLeavesTheTargetAlone) {
 }
 
 #ifdef _WIN32
-TEST_P(RecordFileTest, FileThatCannotGrow) {
+TEST_P(RecordFileTest, FilesThatCannotGrow) {
   GTEST_SKIP() << "needs setrlimit, a limit on the size of a process's files";
 }
 #else
