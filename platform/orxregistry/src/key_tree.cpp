@@ -214,7 +214,7 @@ KeyTree::Unsaved& KeyTree::MarkUnsaved(Key& key) {
     try {
       MarkUnsaved(*key.parent).keys.push_back(&key);
     } catch (...) {
-      unsaved_.erase(entry);  // nobody would come to it
+      unsaved_.erase(&key);  // nobody would come to it
       throw;
     }
   }
