@@ -211,6 +211,23 @@ TEST(RegistryFile, ANewFileNeverReplacesOne) {
       << "nothing is left beside it";
 }
 
+#ifdef _WIN32
+TEST(RegistryFile, ThatWasMovedAsideToBeReplacedIsPutBack) {
+  const RegistryFile file;
+  file.Create();
+  const std::string whole = Describe(file.Load());
+  for (const bool reads : {true, false}) {
+    std::filesystem::rename(file.path, file.directory / "tree.dff.replaced");
+    if (reads) {
+      EXPECT_EQ(Describe(file.Load()), whole);
+    } else {
+      EXPECT_FALSE(RegistryFile::New().Save(file.Name(), false, 512));
+    }
+    EXPECT_TRUE(std::filesystem::exists(file.path));
+  }
+}
+#endif
+
 TEST(RegistryFile, ALostFileIsNotASuccess) {
   const RegistryFile file;
   TCSInFileKey tree(file.Name(), nullptr, nullptr, false, 97U);

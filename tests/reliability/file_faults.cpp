@@ -59,6 +59,7 @@ int FileFaults::Count() { return machine.seen; }
 bool FileFaults::IsDurable() {
   return machine.isFileFlushed && machine.isDirectoryFlushed && machine.wasFlushedInTime;
 }
+void FileFaults::ForgetFlush() { machine.isDirectoryFlushed = false; }
 
 }  // namespace velta_test
 

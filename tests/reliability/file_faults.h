@@ -26,6 +26,8 @@ struct FileFaults {
   /// A power cut now would lose nothing: what was written was flushed, before its file got its
   /// name; and so was the directory after that.
   static bool IsDurable();
+  /// From here on the directory counts as not flushed: who named a file may have been stopped.
+  static void ForgetFlush();
 };
 
 }  // namespace velta_test

@@ -56,7 +56,7 @@ bool TInFileKey::SaveNew(const std::filesystem::path& path) {
   const auto stamp = file ? PublishFile(path, *file, false) : std::nullopt;
   if (!stamp) return false;
   tree_->MarkSaved();
-  tree_->position = {*stamp, file->size(), 0};
+  tree_->position = {*stamp, file->size(), 0, true};
   return true;
 }
 

@@ -55,7 +55,7 @@ KeyTree::KeyTree(std::u16string text)
 KeyTree::KeyTree(FileContent content)
     : error(content.error),
       description(std::move(content.description)),
-      position{content.stamp, content.end, content.superseded},
+      position{content.stamp, content.end, content.superseded, false},
       file_(std::move(content.memory)),
       root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {
   for (record::Bytes segment : content.segments) {

@@ -89,6 +89,9 @@ std::optional<FileStamp> StampOf(const std::filesystem::path& path);
 /// \param replace false: fails when there is a file of that name
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace);
 
+/// Makes the names of the files in the directory of `path` durable.
+bool FlushNames(const std::filesystem::path& path);
+
 void Remove(const std::filesystem::path& path);
 
 }  // namespace orx::os

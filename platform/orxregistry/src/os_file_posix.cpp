@@ -35,9 +35,14 @@ FileStamp ToStamp(const struct stat& status) {
   return stamp;
 }
 
+std::filesystem::path DirectoryOf(const std::filesystem::path& path) {
+  const std::filesystem::path directory = path.parent_path();
+  return directory.empty() ? "." : directory;
+}
+
 bool FlushDirectory(const std::filesystem::path& directory) {
-  const char* const name = directory.empty() ? "." : directory.c_str();
-  const int handle = Retry([&] { return open(name, O_RDONLY | O_DIRECTORY | O_CLOEXEC); });
+  const int flags = O_RDONLY | O_DIRECTORY | O_CLOEXEC;
+  const int handle = Retry([&] { return open(directory.c_str(), flags); });
   if (handle < 0) return false;
   const bool flushed = Retry([&] { return fsync(handle); }) == 0;
   close(handle);
@@ -143,11 +148,13 @@ std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
 }
 
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
-  const std::filesystem::path directory = to.parent_path();  // before it is too late to throw
+  const std::filesystem::path directory = DirectoryOf(to);  // before it is too late to throw
   const bool renamed = replace ? std::rename(from.c_str(), to.c_str()) == 0
                                : RenameToNewName(from.c_str(), to.c_str());
   return renamed && FlushDirectory(directory);
 }
+
+bool FlushNames(const std::filesystem::path& path) { return FlushDirectory(DirectoryOf(path)); }
 
 void Remove(const std::filesystem::path& path) { unlink(path.c_str()); }
 

@@ -40,6 +40,25 @@ OVERLAPPED At(std::uint64_t offset) {
   return place;
 }
 
+/// \return nothing without a handle
+std::optional<FileStamp> StampOfOpen(HANDLE handle) {
+  BY_HANDLE_FILE_INFORMATION information;
+  if (!GetFileInformationByHandle(handle, &information)) return std::nullopt;
+  FileStamp stamp;
+  stamp.device = information.dwVolumeSerialNumber;
+  stamp.file = Join(information.nFileIndexHigh, information.nFileIndexLow);
+  stamp.size = Join(information.nFileSizeHigh, information.nFileSizeLow);
+  stamp.modified = static_cast<std::int64_t>(
+      Join(information.ftLastWriteTime.dwHighDateTime, information.ftLastWriteTime.dwLowDateTime));
+  return stamp;
+}
+
+bool Lock(HANDLE handle) {
+  OVERLAPPED place = {};
+  place.OffsetHigh = kLockedByteHigh;
+  return LockFileEx(handle, LOCKFILE_EXCLUSIVE_LOCK, 0, 1, 0, &place);
+}
+
 /// Replaces a file that others have open: they keep the old one.
 bool RenameOver(const std::filesystem::path& from, const std::filesystem::path& to) {
   // Through such a handle the change of the directory is durable, too.
@@ -61,11 +80,16 @@ bool Move(const std::filesystem::path& from, const std::filesystem::path& to, DW
   return MoveFileExW(from.c_str(), to.c_str(), flags | MOVEFILE_WRITE_THROUGH) != 0;
 }
 
+std::filesystem::path OldNameOf(const std::filesystem::path& path) {
+  std::filesystem::path old = path;
+  return old += ".replaced";
+}
+
 /// Replaces a file that others have open where the file system cannot do so at once, as on a
 /// network share: moves it out of the way first, so that for a moment there is none of that name.
+/// The caller has locked the file.
 bool SwapIn(const std::filesystem::path& from, const std::filesystem::path& to) {
-  std::filesystem::path old = to;
-  old += ".old";
+  const std::filesystem::path old = OldNameOf(to);
   if (!Move(to, old, MOVEFILE_REPLACE_EXISTING)) return false;
   if (!Move(from, to, 0)) {
     Move(old, to, 0);
@@ -75,10 +99,28 @@ bool SwapIn(const std::filesystem::path& from, const std::filesystem::path& to) 
   return true;
 }
 
+/// Waits for a process that is swapping in a file, or puts back the one that a process left moved
+/// out of the way when it was stopped. The caller has not locked it.
+/// \return true when there may be a file of that name now
+bool PutBack(const std::filesystem::path& path) {
+  const std::filesystem::path old = OldNameOf(path);
+  const HANDLE handle = Open(old, GENERIC_READ, OPEN_EXISTING);
+  if (!handle) return false;
+  if (Lock(handle)) Move(old, path, 0);  // fails where there is a file of that name again
+  CloseHandle(handle);
+  return true;
+}
+
+HANDLE OpenOrPutBack(const std::filesystem::path& path, DWORD access, DWORD disposition) {
+  const HANDLE handle = Open(path, access, disposition);
+  if (handle || GetLastError() != ERROR_FILE_NOT_FOUND || !PutBack(path)) return handle;
+  return Open(path, access, disposition);
+}
+
 }  // namespace
 
 std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
-  const HANDLE handle = Open(path, GENERIC_READ, OPEN_EXISTING);
+  const HANDLE handle = OpenOrPutBack(path, GENERIC_READ, OPEN_EXISTING);
   if (!handle) return std::nullopt;
   return File(handle);
 }
@@ -86,12 +128,10 @@ std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
 std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool create) {
   for (;;) {
     const HANDLE handle =
-        Open(path, GENERIC_READ | GENERIC_WRITE, create ? OPEN_ALWAYS : OPEN_EXISTING);
+        OpenOrPutBack(path, GENERIC_READ | GENERIC_WRITE, create ? OPEN_ALWAYS : OPEN_EXISTING);
     if (!handle) return std::nullopt;
     File file(handle);
-    OVERLAPPED place = {};
-    place.OffsetHigh = kLockedByteHigh;
-    if (!LockFileEx(handle, LOCKFILE_EXCLUSIVE_LOCK, 0, 1, 0, &place)) return std::nullopt;
+    if (!Lock(handle)) return std::nullopt;
     // While this waited, the file may have been replaced by another of the same name.
     const std::optional<FileStamp> opened = file.Stamp();
     const std::optional<FileStamp> named = StampOf(path);
@@ -104,17 +144,7 @@ File::~File() {
   if (handle_ != kNone) CloseHandle(handle_);
 }
 
-std::optional<FileStamp> File::Stamp() const {
-  BY_HANDLE_FILE_INFORMATION information;
-  if (!GetFileInformationByHandle(handle_, &information)) return std::nullopt;
-  FileStamp stamp;
-  stamp.device = information.dwVolumeSerialNumber;
-  stamp.file = Join(information.nFileIndexHigh, information.nFileIndexLow);
-  stamp.size = Join(information.nFileSizeHigh, information.nFileSizeLow);
-  stamp.modified = static_cast<std::int64_t>(
-      Join(information.ftLastWriteTime.dwHighDateTime, information.ftLastWriteTime.dwLowDateTime));
-  return stamp;
-}
+std::optional<FileStamp> File::Stamp() const { return StampOfOpen(handle_); }
 
 std::optional<std::size_t> File::Read(std::uint64_t offset, unsigned char* to,
                                       std::size_t size) const {
@@ -158,13 +188,22 @@ Memory::Memory(std::size_t size) : bytes_(new unsigned char[size]) {}
 void Memory::Free::operator()(unsigned char* bytes) const { delete[] bytes; }
 
 std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
-  const std::optional<File> file = File::OpenToRead(path);
-  return file ? file->Stamp() : std::nullopt;
+  const HANDLE handle = Open(path, GENERIC_READ, OPEN_EXISTING);
+  const std::optional<FileStamp> stamp = StampOfOpen(handle);
+  if (handle) CloseHandle(handle);
+  return stamp;
 }
 
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
-  if (!replace) return Move(from, to, 0);
+  if (!replace) {
+    PutBack(to);
+    return Move(from, to, 0);
+  }
   return RenameOver(from, to) || Move(from, to, MOVEFILE_REPLACE_EXISTING) || SwapIn(from, to);
+}
+
+bool FlushNames(const std::filesystem::path&) {
+  return true;  // every move writes through
 }
 
 void Remove(const std::filesystem::path& path) { DeleteFileW(path.c_str()); }

@@ -186,7 +186,7 @@ AppendResult CatchUp(const os::File& file, FilePosition& position) {
   if (*stamp == position.stamp) return AppendResult::kAppended;
   const FileContent content = ReadContent(file);
   if (content.error != kRegistryOk) return AppendResult::kFailed;
-  position = {content.stamp, content.end, content.superseded};
+  position = {content.stamp, content.end, content.superseded, false};
   return AppendResult::kBehindOthers;
 }
 
@@ -222,10 +222,14 @@ std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, cons
     stamp = file->Stamp();
   }
   if (stamp && os::Rename(beside, path, replace)) return stamp;
-  os::Remove(beside);
+  const auto isNamed = [own = file->Stamp()](const std::filesystem::path& name) {
+    const std::optional<os::FileStamp> named = os::StampOf(name);
+    return own && named && named->IsSameFile(*own);
+  };
+  // Once it has its name, the file beside it may be somebody else's.
+  if (isNamed(beside)) os::Remove(beside);
   // A new file whose name did not become durable goes, as what it holds must not pass for saved.
-  const auto named = replace ? std::nullopt : os::StampOf(path);
-  if (stamp && named && named->IsSameFile(*stamp)) os::Remove(path);
+  if (!replace && isNamed(path)) os::Remove(path);
   return std::nullopt;
 }
 
@@ -244,10 +248,13 @@ AppendResult AppendUnsaved(const std::filesystem::path& path, KeyTree& tree) {
     const std::optional<Buffer> whole = Compact(ReadContent(*file), unsaved);
     const auto stamp = whole ? PublishFile(path, *whole, true) : std::nullopt;
     if (!stamp) return AppendResult::kFailed;
-    tree.position = {*stamp, whole->size(), 0};
+    tree.position = {*stamp, whole->size(), 0, true};
     return result;
   }
   FinishSegment(segment, 0, at.end, at.superseded);
+  // Before anything is promised that could go with the name.
+  at.isNameDurable = at.isNameDurable || os::FlushNames(path);
+  if (!at.isNameDurable) return AppendResult::kFailed;
   const bool cutOff = at.stamp.size == at.end || file->Truncate(at.end);
   const bool written =
       cutOff && file->Write(at.end, segment.data(), segment.size()) && file->Flush();

@@ -46,6 +46,7 @@ struct FilePosition {
   os::FileStamp stamp;
   std::uint64_t end = 0;
   std::uint64_t superseded = 0;
+  bool isNameDurable = false;  ///< false: who named the file may not have flushed its directory
 };
 
 /// How an append ended.
