@@ -15,6 +15,10 @@
 namespace velta_test {
 namespace {
 
+using namespace orx::cs::velta;
+
+constexpr auto kNoSuchFile = static_cast<ResultCode>(0x80070002);
+
 /// A file, and what a process keeps in memory from one save to the next.
 struct Stage : RegistryFile {
   explicit Stage(const char* name) { path = directory / name; }
@@ -39,8 +43,9 @@ struct Scenario {
   const char* file;
   void (*prepare)(Stage&);
   bool (*save)(Stage&);
-  std::string kept;   ///< what the tree describes before the save and after it
-  std::string saved;  ///< what it describes only after it
+  std::string kept;                ///< what the tree describes before the save and after it
+  std::string saved;               ///< what it describes only after it
+  ResultCode fullDisk = kSuccess;  ///< the answer of what the library does when the disk is full
 };
 
 const std::string kKept = "S_1(0 value=1:1:acknowledged)";
@@ -73,18 +78,18 @@ const Scenario kScenarios[] = {
      },
      [](Stage& stage) { return stage.Add(L"big", std::string(3000, 'n')); }, kKept, "nnnn"},
     {"FirstDatum", "ROVERS.dff", [](Stage&) {}, [](Stage& stage) { return stage.fleet.Ingest(1); },
-     "", kEntry1},
+     "", kEntry1, kNoSuchFile},
     {"Datum", "ROVERS.dff", [](Stage& stage) { stage.fleet.Ingest(0); },
-     [](Stage& stage) { return stage.fleet.Ingest(1); }, kEntry0, kEntry1},
+     [](Stage& stage) { return stage.fleet.Ingest(1); }, kEntry0, kEntry1, kEntryNotWritten},
     {"Projection", "ROVERS.prj", [](Stage& stage) { stage.fleet.IngestBoth(10); },
-     [](Stage& stage) { return stage.fleet.IngestBoth(11); }, "S_10_0", "S_11_0"},
+     [](Stage& stage) { return stage.fleet.IngestBoth(11); }, "S_10_0", "S_11_0", kEntryNotWritten},
     {"Merge", "ROVERS.dff",
      [](Stage& stage) {
        stage.fleet.Ingest(0);
        stage.fleet.Ingest(1, "OTHER");
      },
      [](Stage& stage) { return stage.fleet.Merge(stage.fleet.directory + L"OTHER.dff"); }, kEntry0,
-     kEntry1},
+     kEntry1, kDatumFileTrouble},
 };
 
 bool SaveInAChild(Stage& stage, const Scenario& scenario, int place) {
@@ -117,6 +122,8 @@ int Try(const Scenario& scenario, Fault fault, int place) {
     const FileFaults armed(fault, place);
     promised = scenario.save(stage);
     EXPECT_TRUE(FileFaults::IsDurable() || !promised);
+    const bool isFull = fault == Fault::kFull && place == 0;
+    EXPECT_TRUE(!isFull || stage.fleet.result == scenario.fullDisk) << stage.fleet.result;
   }
   const int operations = FileFaults::Count();
   EXPECT_TRUE(promised || (fault != Fault::kShort && place != INT_MAX));

@@ -35,17 +35,17 @@ struct Fleet {
 
   bool Ingest(std::uint32_t number, const std::string& datumName = "ROVERS") {
     const NumberedSet set(number, datumName);
-    return support.ParseDatumMessages(set.datum, &set.grid) == 0;
+    return (result = support.ParseDatumMessages(set.datum, &set.grid)) == 0;
   }
   /// A datum and a projection.
   bool IngestBoth(std::uint32_t number) {
     orx::cs::velta::Rtcm1025 projection;
     projection.projectionType = 1;
     projection.laNO = number;
-    return Ingest(number) && support.ParseProjectionMessages(projection, nullptr) == 0;
+    return Ingest(number) && (result = support.ParseProjectionMessages(projection, nullptr)) == 0;
   }
-  bool Merge(const std::wstring& source) const {
-    return RTCMDataSupport::MergeRTCMDatumfiles(datums, source) == 0;
+  bool Merge(const std::wstring& source) {
+    return (result = RTCMDataSupport::MergeRTCMDatumfiles(datums, source)) == 0;
   }
 
   /// Every query finds set 0, the first.
@@ -61,6 +61,7 @@ struct Fleet {
   const std::wstring datums = directory + L"ROVERS.dff";
   const std::wstring projections = directory + L"ROVERS.prj";
   RTCMDataSupport support{directory.c_str(), directory.c_str()};
+  orx::cs::velta::ResultCode result = 0;  ///< of the last call
 };
 
 }  // namespace velta_test

@@ -1,11 +1,28 @@
 // The ingestion object's life and the shared files.
 
-#include "support/operating_system.h"
+#ifdef _WIN32
+#include <windows.h>
+#else
+#include <link.h>
+#endif
+
 #include "support/rtcm_test.h"
 #include "userdirs/user_dirs.h"
 
 namespace velta_test {
 namespace {
+
+/// Asks the system's loader.
+bool IsSiblingLoaded() {
+#ifdef _WIN32
+  return GetModuleHandleA("RTCMGridHost.dll") != nullptr;
+#else
+  const auto isIt = [](dl_phdr_info* library, std::size_t, void*) {
+    return std::string(library->dlpi_name).ends_with("RTCMGridHost.so") ? 1 : 0;
+  };
+  return dl_iterate_phdr(isIt, nullptr) != 0;
+#endif
+}
 
 using LifecycleTest = RtcmTest;
 

@@ -16,4 +16,12 @@ inline void WriteBytes(const std::filesystem::path& path, const std::string& byt
   std::ofstream(path, std::ios::binary | std::ios::trunc) << bytes;
 }
 
+/// Changes one byte of a file.
+/// \param place 0: in its middle
+inline void Damage(const std::filesystem::path& path, std::size_t place = 0) {
+  std::string bytes = ReadBytes(path);
+  bytes.at(place == 0 ? bytes.size() / 2 : place) ^= 1;
+  WriteBytes(path, bytes);
+}
+
 }  // namespace velta_test

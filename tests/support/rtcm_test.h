@@ -2,10 +2,10 @@
 
 #include <gtest/gtest.h>
 
-#include "rtcm3/json_lines.h"
 #include "support/file_bytes.h"
 #include "support/gff_tree.h"
 #include "support/temporary_directory.h"
+#include "tools/worked_messages.h"
 #include "velta/rtcm_data_support.h"
 #include "velta/rtcm_generator.h"
 
@@ -24,36 +24,13 @@ constexpr auto *kDhdn = "AUTO_DHDN_BESEL", *kLocal = "Local_B_O_7";
 enum Parts { k1021 = 1, k1022 = 2, k1023 = 4, k1024 = 8, k1025 = 16, k1027 = 32 };
 constexpr int kDhdnSet = k1021 | k1023 | k1024 | k1025, kLocalSet = k1022 | k1023 | k1024 | k1027;
 
-/// Changes one byte of a file.
-inline void Damage(const std::filesystem::path& path, std::size_t place) {
-  std::string bytes = ReadBytes(path);
-  bytes.at(place) ^= 1;
-  WriteBytes(path, bytes);
-}
-
 /// A message's fields by their names; null when there is no message.
 inline Json ToJson(const RtcmMessage* message) {
-  if (!message) return nullptr;
-  std::string line;
-  velta_tool::rtcm3::AppendJsonLine(velta_tool::rtcm3::FromRecord(*message), line);
-  return Json::parse(line);
-}
-
-/// The worked message of a kind. The 1021 and the 1025 are of one system, the 1022 and the 1027 of
-/// another.
-template <class Message>
-Message Worked() {
-  std::ifstream lines(WORKED_MESSAGES);
-  std::string line;
-  velta_tool::rtcm3::Message message = Rtcm1026();
-  while (!std::holds_alternative<Message>(message) && std::getline(lines, line)) {
-    message = velta_tool::rtcm3::ParseJsonLine(line);
-  }
-  return std::get<Message>(message);
+  return message ? Json::parse(JsonOf(velta_tool::rtcm3::FromRecord(*message))) : Json();
 }
 
 /// The worked messages, and an ingestion object with directories of its own, which do not exist
-/// yet.
+/// yet. The 1021 and the 1025 are of one system, the 1022 and the 1027 of another.
 class RtcmTest : public testing::Test {
  protected:
   MsgUtilized Set(int parts) const {
@@ -86,12 +63,12 @@ class RtcmTest : public testing::Test {
   const std::wstring projectionPath_ = projections_.wstring() + L"/";
   RTCMDataSupport support_{datumPath_.c_str(), projectionPath_.c_str()};
 
-  Rtcm1021 m1021_ = Worked<Rtcm1021>();
-  Rtcm1022 m1022_ = Worked<Rtcm1022>();
-  Rtcm1023 m1023_ = Worked<Rtcm1023>();
-  Rtcm1024 m1024_ = Worked<Rtcm1024>();
-  Rtcm1025 m1025_ = Worked<Rtcm1025>();
-  Rtcm1027 m1027_ = Worked<Rtcm1027>();
+  Rtcm1021 m1021_ = WorkedRecord<Rtcm1021>(1021);
+  Rtcm1022 m1022_ = WorkedRecord<Rtcm1022>(1022);
+  Rtcm1023 m1023_ = WorkedRecord<Rtcm1023>(1023);
+  Rtcm1024 m1024_ = WorkedRecord<Rtcm1024>(1024);
+  Rtcm1025 m1025_ = WorkedRecord<Rtcm1025>(1025);
+  Rtcm1027 m1027_ = WorkedRecord<Rtcm1027>(1027);
 };
 
 }  // namespace velta_test

@@ -40,11 +40,6 @@ class ProgramTest : public testing::Test {
 #endif
     return {status, ReadBytes(directory_ / "stdout"), ReadBytes(directory_ / "stderr")};
   }
-  void Damage(const std::string& name) {
-    std::string bytes = ReadBytes(directory_ / name);
-    bytes.at(bytes.size() / 2) ^= 1;
-    WriteBytes(directory_ / name, bytes);
-  }
 
   TemporaryDirectory directory_;
 };
@@ -116,7 +111,7 @@ TEST_P(Session, GoesAsItShould) {
   EXPECT_FALSE(calls.empty());
   for (const Call& call : calls) {
     SCOPED_TRACE("velta " + call.arguments);
-    if (!call.damaged.empty()) Damage(call.damaged);
+    if (!call.damaged.empty()) Damage(directory_ / call.damaged);
     const Outcome outcome = Run(call.arguments, call.input);
     EXPECT_EQ(outcome.status, call.status);
     ExpectParts(outcome.out, call.out);

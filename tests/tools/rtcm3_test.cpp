@@ -102,13 +102,6 @@ TEST_F(FrameReaderTest, LiveFrameIsHandedOutBeforeMoreIsAwaited) {
 
 std::string PayloadOf(const std::string& frame) { return frame.substr(3, frame.size() - 6); }
 
-std::string JsonOf(const Message& message) {
-  std::string line;
-  AppendJsonLine(message, line);
-  line.pop_back();
-  return line;
-}
-
 /// What comes out of a payload: the message's JSON, or nothing when it is too short.
 std::string JsonOfPayload(const std::string& payload) {
   Message message;

@@ -18,6 +18,18 @@ inline std::string Worked(unsigned message, const std::string& file = "worked_me
   return line;
 }
 
+template <class Record>
+Record WorkedRecord(unsigned message) {
+  return std::get<Record>(velta_tool::rtcm3::ParseJsonLine(Worked(message)));
+}
+
+inline std::string JsonOf(const velta_tool::rtcm3::Message& message) {
+  std::string line;
+  velta_tool::rtcm3::AppendJsonLine(message, line);
+  line.pop_back();
+  return line;
+}
+
 inline std::string FrameOf(const std::string& json) {
   std::string frame;
   velta_tool::rtcm3::Encode(velta_tool::rtcm3::ParseJsonLine(json), frame);
