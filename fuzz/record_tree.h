@@ -13,7 +13,8 @@
 #include <xxhash.h>
 
 /// Registry files taken apart, spoiled in one place and put together again with right sizes and
-/// checksums, so that what is tried lies behind them. Follows docs/gff-format.md.
+/// checksums, so that what is tried lies behind them. Follows docs/gff-format.md and shares no code
+/// with the library.
 namespace velta_fuzz {
 
 struct Value {
@@ -72,11 +73,15 @@ inline std::vector<Segment> TakeApart(std::string_view file) {
   return segments;
 }
 
-inline std::string PutTogether(const std::vector<Segment>& segments) {
+/// \param description in UTF-16
+inline std::string PutTogether(const std::vector<Segment>& segments,
+                               const std::string& description = "") {
   const auto checksum = [](const std::string& bytes, std::size_t from, std::uint64_t seed = 0) {
     return std::uint64_t{XXH3_64bits_withSeed(bytes.data() + from, bytes.size() - from, seed)};
   };
-  std::string file("\x89ORX\r\n\x1A\n\0\2\0\0\0\0\0\0", 16);
+  std::string file("\x89ORX\r\n\x1A\n\0\2\0\0", 12);
+  Append(file, static_cast<std::uint32_t>(description.size()));
+  file += description;
   Append(file, checksum(file, 0));
   for (const Segment& segment : segments) {
     const std::size_t at = file.size();
@@ -115,26 +120,32 @@ inline Key TakeKey(std::string_view& bytes, int depth = 0) {
   return key;
 }
 
-inline void AppendKey(std::string& to, const Key& key) {
-  std::string values;
-  for (const Value& value : key.values) {
-    Append(values, static_cast<std::uint32_t>(value.data.size()));
-    Append(values, value.elementSize);
-    Append(values, static_cast<std::uint16_t>(value.name.size() / 2));
-    Append(values, value.type);
-    Append(values, value.dimension);
-    values.append(value.name, 0, value.name.size() / 2 * 2);
-    values += value.data;
-  }
-  std::string keys;
-  for (const Key& sub : key.keys) AppendKey(keys, sub);
-  Append(to, std::uint64_t{values.size()});
-  Append(to, std::uint64_t{keys.size()});
-  Append(to, static_cast<std::uint16_t>(key.name.size() / 2));
-  Append(to, key.dimension);
-  Append(to, std::uint8_t{0});
-  to.append(key.name, 0, key.name.size() / 2 * 2);
-  to += values + keys;
+inline std::string BytesOf(const Value& value) {
+  std::string bytes;
+  Append(bytes, static_cast<std::uint32_t>(value.data.size()));
+  Append(bytes, value.elementSize);
+  Append(bytes, static_cast<std::uint16_t>(value.name.size() / 2));
+  Append(bytes, value.type);
+  Append(bytes, value.dimension);
+  return bytes.append(value.name, 0, value.name.size() / 2 * 2) + value.data;
+}
+
+/// A key's record around its values' and its keys'.
+inline std::string Around(const Key& key, const std::string& values, const std::string& keys) {
+  std::string bytes;
+  Append(bytes, std::uint64_t{values.size()});
+  Append(bytes, std::uint64_t{keys.size()});
+  Append(bytes, static_cast<std::uint16_t>(key.name.size() / 2));
+  Append(bytes, key.dimension);
+  Append(bytes, std::uint8_t{0});
+  return bytes.append(key.name, 0, key.name.size() / 2 * 2) + values + keys;
+}
+
+inline std::string BytesOf(const Key& key) {
+  std::string values, keys;
+  for (const Value& value : key.values) values += BytesOf(value);
+  for (const Key& sub : key.keys) keys += BytesOf(sub);
+  return Around(key, values, keys);
 }
 
 /// Spoils registry files; `Mutate(bytes, size, largest size)` spoils plain bytes.
@@ -164,8 +175,7 @@ class Spoiler {
         std::string_view bytes = segment.tree;
         Key root = TakeKey(bytes);
         Spoil(root);
-        segment.tree.clear();
-        AppendKey(segment.tree, root);
+        segment.tree = BytesOf(root);
     }
     return PutTogether(segments);
   }

@@ -106,12 +106,8 @@ TEST(TGeoProj, HoldsItsParametersAndNoOthers) {
 TEST(TRectRgn, HoldsItsEdgesAndEveryNumberOfAMeridian) {
   constexpr double kDegree = std::numbers::pi / 180,
                    kNaN = std::numeric_limits<double>::quiet_NaN();
-  const struct {
-    const char* what;
-    TRectRgn region;  // degrees
-    double latitude, longitude;
-    bool inside, insidePlane;
-  } cases[] = {
+  // A region and a point in degrees, whether it is inside, and whether it is on the plane.
+  const std::tuple<const char*, TRectRgn, double, double, bool, bool> cases[] = {
       {"north-east corner", {50, 2, 8, 3}, 52, 11, true, true},
       {"south-west corner", {50, 2, 8, 3}, 50, 8, true, true},
       {"north of it", {50, 2, 8, 3}, 52.0001, 9, false, false},

@@ -1,14 +1,9 @@
-// Files as the library writes them, and files that were cut, altered or made up: the writer here
-// follows docs/gff-format.md and shares no code with the library.
+// Files as the library writes them, and files that were cut, altered or made up.
 
 #include <gtest/gtest.h>
 
-#include <cstring>
-
+#include "fuzz/record_tree.h"
 #include "registry_fixture.h"
-
-#define XXH_INLINE_ALL
-#include <xxhash.h>
 
 namespace velta_test {
 namespace {
@@ -16,40 +11,21 @@ namespace {
 using namespace std::string_view_literals;
 using orx::TCSInFileKey;
 
-template <class Integer>
-std::string Int(Integer value) {
-  std::string bytes(sizeof value, '\0');
-  std::memcpy(bytes.data(), &value, sizeof value);
-  return bytes;
-}
-
-std::string Checksum(const std::string& bytes, std::uint64_t seed = 0) {
-  return Int(XXH3_64bits_withSeed(bytes.data(), bytes.size(), seed));
-}
-
 std::string Key(const std::u16string& name, const std::string& values, const std::string& keys,
-                std::uint16_t dimension = 0) {
-  return Int(values.size()) + Int(keys.size()) + Int(static_cast<std::uint16_t>(name.size())) +
-         Int(dimension) + Units(name) + values + keys;
+                std::uint8_t dimension = 0) {
+  return velta_fuzz::Around({dimension, Units(name), {}, {}}, values, keys);
 }
 
-std::string Value(const std::u16string& name, int type, std::uint32_t elementSize,
-                  const std::string& data, char dimension = 1) {
-  return Int(static_cast<std::uint32_t>(data.size())) + Int(elementSize) +
-         Int(static_cast<std::uint16_t>(name.size())) + static_cast<char>(type) + dimension +
-         Units(name) + data;
+std::string Value(const std::u16string& name, std::uint8_t type, std::uint32_t elementSize,
+                  const std::string& data, std::uint8_t dimension = 1) {
+  return velta_fuzz::BytesOf(velta_fuzz::Value{elementSize, type, dimension, Units(name), data});
 }
 
 /// A file of these trees, one a segment.
 std::string File(const std::vector<std::string>& trees) {
-  std::string file = "\x89ORX\r\n\x1A\n" + Int(512U) + Int(4U) + Units(u"ab");
-  file += Checksum(file);
-  for (const std::string& tree : trees) {
-    const std::string header =
-        "SEG1" + Int(0U) + Int(tree.size()) + Int(std::uint64_t{0}) + Checksum(tree);
-    file += header + Checksum(header, file.size()) + tree;
-  }
-  return file;
+  std::vector<velta_fuzz::Segment> segments;
+  for (const std::string& tree : trees) segments.push_back({0, tree});
+  return velta_fuzz::PutTogether(segments, Units(u"ab"));
 }
 
 TEST(RegistryFormat, IsReadAndWrittenAsDocumented) {
@@ -120,7 +96,7 @@ TEST(RegistryRecords, ThatLieAreDamage) {
       {"half a value", Key(u"", good + good.substr(0, 13), "")},
       {"half a key", Key(u"", good, Key(u"k", "", "").substr(0, 21))},
       {"nested too deep", Key(u"", good, deep)},
-      {"sizes that wrap around", Int(~std::uint64_t{0}) + Int(std::uint64_t{1}) + Int(0U)},
+      {"sizes that wrap around", std::string(8, '\xFF') + "\1" + std::string(11, '\0')},
       {"bytes behind the root", Key(u"", good, "") + "x"},
       {"no root", ""},
   };

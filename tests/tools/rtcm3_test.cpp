@@ -48,11 +48,8 @@ class FrameReaderTest : public testing::Test {
 TEST_F(FrameReaderTest, FindsTheFramesAmongEverythingElse) {
   const std::string bad = kSecond.substr(0, kSecond.size() - 1) + "?";
   const std::string longest(kMaxPayload, '\xD3');
-  const struct {
-    std::string stream;
-    std::vector<std::string> payloads;
-    std::uint64_t skippedBytes, badCrcs;
-  } cases[] = {
+  // A stream, its payloads, the bytes passed over and the bad checksums.
+  const std::tuple<std::string, std::vector<std::string>, std::uint64_t, std::uint64_t> cases[] = {
       {"noise" + kFirst + "between" + kSecond + "\xD3", kBoth, 13, 0},
       {"\xD3" + kFirst + "\xD3" + kSecond, kBoth, 2, 0},
       {std::string("\xD3\0\x13", 3) + kFirst + kSecond, kBoth, 3, 1},      // swallows a frame
@@ -62,14 +59,12 @@ TEST_F(FrameReaderTest, FindsTheFramesAmongEverythingElse) {
       {bad + kFirst + kSecond, kBoth, bad.size(), 1},
       {Frame("") + Frame(longest), {"", longest}, 0, 0},
   };
-  for (const auto& test : cases) {
-    SCOPED_TRACE(testing::PrintToString(test.stream));
-    Read(std::stringbuf(test.stream));
-    EXPECT_EQ(payloads, test.payloads);
-    EXPECT_EQ(counts.bytes, test.stream.size());
-    EXPECT_EQ(counts.frames, test.payloads.size());
-    EXPECT_EQ(counts.skippedBytes, test.skippedBytes);
-    EXPECT_EQ(counts.badCrcs, test.badCrcs);
+  for (const auto& [stream, expected, skippedBytes, badCrcs] : cases) {
+    SCOPED_TRACE(testing::PrintToString(stream));
+    Read(std::stringbuf(stream));
+    EXPECT_EQ(payloads, expected);
+    EXPECT_EQ(std::tuple(counts.bytes, counts.frames, counts.skippedBytes, counts.badCrcs),
+              std::tuple(stream.size(), expected.size(), skippedBytes, badCrcs));
   }
 }
 
@@ -161,11 +156,7 @@ TEST(Encode, RecordThatDoesNotFitIsRefusedWhole) {
 }
 
 TEST(Json, WhatIsWrongIsNamedWithFieldAndRange) {
-  const struct {
-    unsigned message;
-    const char *field, *value;
-    std::string error;
-  } cases[] = {
+  const std::tuple<unsigned, const char*, const char*, std::string> cases[] = {
       {1021, "message", "1020", "message must be an integer from 1021 to 1027, not 1020"},
       {1021, "message", "1025", "projectionType is missing"},
       {1021, "sourceName", "5", "sourceName must be a text of at most 31 ISO 8859-1 characters"},
