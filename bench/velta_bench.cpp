@@ -123,8 +123,8 @@ void AddIngestion(Suite& suite, const Files& files, int iterations) {
 }
 
 void AddQueries(Suite& suite, const Files& files, int iterations) {
-  const auto read = [files](benchmark::State& state) {
-    for (auto _ : state) benchmark::DoNotOptimize(ReadFile(files.Datum()));
+  const auto read = [path = files.Datum()](benchmark::State& state) {
+    for (auto _ : state) benchmark::DoNotOptimize(ReadFile(path));
   };
   const auto find = [files](benchmark::State& state) {
     for (auto _ : state) {
@@ -133,11 +133,12 @@ void AddQueries(Suite& suite, const Files& files, int iterations) {
     }
   };
   const Position at = files.Last();
+  const velta::RTCMGenerator generator = files.Generator();
   suite.Add(
       {"getRtcmDatumMessage, last", files.entries, "read the file", 2.0}, iterations,
       [=](benchmark::State& state) {
         for (auto _ : state) {
-          Require(files.Generator().getRtcmDatumMessage(at.latitude, at.longitude, 0) != nullptr,
+          Require(generator.getRtcmDatumMessage(at.latitude, at.longitude, 0) != nullptr,
                   "getRtcmDatumMessage");
         }
       },
@@ -146,7 +147,7 @@ void AddQueries(Suite& suite, const Files& files, int iterations) {
       {"get1023, last", files.entries, "read the file", 2.0}, iterations,
       [=](benchmark::State& state) {
         for (auto _ : state) {
-          Require(files.Generator().get1023(at.latitude, at.longitude, 0) != nullptr, "get1023");
+          Require(generator.get1023(at.latitude, at.longitude, 0) != nullptr, "get1023");
         }
       },
       read, find);
@@ -154,7 +155,7 @@ void AddQueries(Suite& suite, const Files& files, int iterations) {
       {"getAllDatums", files.entries, "read the file", 5.0}, iterations,
       [=](benchmark::State& state) {
         for (auto _ : state) {
-          Require(files.Generator().getAllDatums().size() >= files.entries, "getAllDatums");
+          Require(generator.getAllDatums().size() >= files.entries, "getAllDatums");
         }
       },
       read,

@@ -27,6 +27,11 @@ TEST(OrxString, KeepsEveryCharacterThatTheOtherFormHas) {
 }
 
 constexpr char8_t kAnyLanguage[] = u8"g\u00E9\u4E2D \U0001F4CD";
+#ifdef _WIN32
+constexpr char kSameAsA[] = "A";
+#else
+constexpr char kSameAsA[] = "a";
+#endif
 
 TEST(UserDirs, TheVariableReplacesTheDirectoryWhole) {
   static char set[] = "ORX_USER_GEO_DIR=/geo/data/", empty[] = "ORX_USER_GEO_DIR=";
@@ -65,7 +70,8 @@ TEST_F(GridHost, HandsOutOneTreeReadAgainWhenTheFileChangedOrNobodySaved) {
   ASSERT_NE(tree, nullptr);
   RegistryFile::AddEntry(*tree, L"mine", "unsaved");
   EXPECT_TRUE(file.Append(L"theirs", "saved"));
-  EXPECT_EQ(Obtain(file.path.parent_path() / "x" / ".." / kAnyLanguage), tree) << "another name";
+  const auto above = file.path.parent_path().parent_path();
+  EXPECT_EQ(Obtain(above / kSameAsA / "x" / ".." / kAnyLanguage), tree) << "another name";
   EXPECT_NE(Describe(*tree).find("mine"), std::string::npos) << "somebody works on it";
   GiveBack();
   GiveBack();
