@@ -213,19 +213,16 @@ TEST(RegistryFile, ALostFileIsNotASuccess) {
   EXPECT_NE(Describe(file.Load()).find("S_1"), std::string::npos);
 }
 
-TEST(RegistryKey, DeepCopyLaysTheSourceOverTheTarget) {
+TEST(RegistryKey, IsCopiedAsItIsAlsoIntoItself) {
   const TCSInFileKey tree = RegistryFile::New(), other = RegistryFile::New();
-  RegistryFile::AddEntry(tree, L"both", "old");
-  RegistryFile::AddEntry(tree, L"mine", "kept");
-  RegistryFile::AddEntry(other, L"new", "new");
-  RegistryFile::AddEntry(other, L"both", "new");
-  orx::TGenericRegistryKey root = RootOf(tree);
-  root.DeepCopy(RootOf(other));
-  const std::string content =
-      "(0 container(0 both(0 value=1:1:new) mine(0 value=1:1:kept) new(0 value=1:1:new))";
-  EXPECT_EQ(Describe(tree), content + ")");
-  Open(root, L"inside").DeepCopy(root);
-  EXPECT_TRUE(Describe(Open(root, L"inside")).starts_with(content));
+  RegistryFile::AddEntry(tree, L"S_1", "first");
+  orx::TGenericRegistryKey(RootOf(other), L"key", 3, true)
+      .AddValue(L"value", RawValue::Block("never saved"), 1, true);
+  RootOf(tree).DeepCopy(RootOf(other));
+  const std::string content = "(0 container(0 S_1(0 value=1:1:first)) key(3 value=1:1:never saved)";
+  Open(RootOf(tree), L"inside").DeepCopy(RootOf(tree));
+  EXPECT_TRUE(Describe(Open(RootOf(tree), L"inside")).starts_with(content));
+  EXPECT_TRUE(Describe(tree).starts_with(content + " inside"));
 }
 
 TEST(RegistryKey, ACopyOutlivesItsFileAndIsSavedWithWhatWasChangedInIt) {
