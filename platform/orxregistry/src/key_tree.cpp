@@ -197,9 +197,8 @@ void KeyTree::DeepCopy(Key& to, Key& from) {
     }
   }
   for (const ValueRecord value : source.Values(from)) SetValue(to, record::ValueAt(value));
-  // A source inside the target can get new keys meanwhile.
-  const std::size_t count = source.Keys(from).size();
-  for (std::size_t i = 0; i < count; ++i) {
+  // By their places, as a target inside the source adds keys to it meanwhile.
+  for (std::size_t i = 0; i < source.Keys(from).size(); ++i) {
     Key* const key = source.Keys(from)[i];
     if (Key* const copy = OpenKey(to, key->name(), key->dimension())) DeepCopy(*copy, *key);
   }
