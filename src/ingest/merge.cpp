@@ -34,6 +34,7 @@ ResultCode MergeFiles(const FileKind& kind, const COrxStringT<wchar_t>& targetPa
                       const COrxStringT<wchar_t>& sourcePath, MergeContainers* merge) {
   TCSInFileKey* target = nullptr;
   const ResultCode obtained = Obtain(kind, targetPath, &target);
+  const GiveBackLater giveBack(kind, targetPath);  // when the lock is gone
   if (obtained != kSuccess) return obtained;
   const boost::unique_lock<boost::recursive_mutex> lock(target->GetMutex());
   TGenericRegistryKey targetContainer = ContainerOf(*target);
@@ -56,7 +57,6 @@ ResultCode MergeFiles(const FileKind& kind, const COrxStringT<wchar_t>& targetPa
 
 ResultCode RTCMDataSupport::MergeRTCMDatumfiles(const COrxStringT<wchar_t>& target,
                                                 const COrxStringT<wchar_t>& source) {
-  const GiveBackLater giveBack(kDatumFiles, target);
   return _MergeRTCMDatumfiles(target, source);
 }
 
@@ -72,7 +72,6 @@ ResultCode RTCMDataSupport::MergeRTCMDatumfiles(TGenericRegistryKey& target,
 
 ResultCode RTCMDataSupport::MergeRTCMProjectionfiles(const COrxStringT<wchar_t>& target,
                                                      const COrxStringT<wchar_t>& source) {
-  const GiveBackLater giveBack(kProjectionFiles, target);
   return _MergeRTCMProjectionfiles(target, source);
 }
 

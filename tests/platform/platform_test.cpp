@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
+#include <future>
 #include <limits>
 #include <numbers>
 
@@ -74,6 +75,19 @@ TEST_F(GridHost, HandsOutOneTreeReadAgainWhenTheFileChangedOrNobodySaved) {
   GiveBack();
   Obtain(file.path);
   EXPECT_EQ(Describe(*tree), Describe(file.Load())) << "given back unsaved";
+}
+
+TEST_F(GridHost, CountsAUserWhoCameWhileAnotherWaited) {
+  orx::TCSInFileKey* const tree = Obtain(file.path);
+  GiveBack();
+  tree->GetMutex().lock();
+  auto other = std::async(std::launch::async, [this] { Obtain(file.path); });
+  EXPECT_EQ(other.wait_for(std::chrono::milliseconds(50)), std::future_status::timeout);
+  Obtain(file.path);
+  RegistryFile::AddEntry(*tree, L"mine", "unsaved");
+  tree->GetMutex().unlock();
+  other.wait();
+  EXPECT_NE(Describe(*tree).find("mine"), std::string::npos);
 }
 
 TEST_F(GridHost, ReportsAMissingFileAndHandsOutADamagedOne) {

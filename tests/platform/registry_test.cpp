@@ -177,6 +177,17 @@ TEST(RegistryFile, TwoWritersLoseNothingWhileItIsWrittenAfreshNowAndThen) {
   }
 }
 
+TEST(RegistryFile, ThatCannotBeWrittenAfreshIsAppendedTo) {
+  const RegistryFile file;
+  file.Create();
+  std::filesystem::create_directory(file.directory / "tree.dff.new");
+  for (const char letter : "abc"sv) {
+    EXPECT_TRUE(file.Append(L"S_0", std::string(5000, letter)));
+    EXPECT_EQ(Describe(file.Load()),
+              "(0 container(0 S_0(0 value=1:1:" + std::string(5000, letter) + ")))");
+  }
+}
+
 TEST(RegistryFile, ANewFileNeverReplacesOne) {
   const RegistryFile file;
   file.Create();

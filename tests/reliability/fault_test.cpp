@@ -21,7 +21,10 @@ constexpr auto kNoSuchFile = static_cast<ResultCode>(0x80070002);
 
 /// A file, and what a process keeps in memory from one save to the next.
 struct Stage : RegistryFile {
-  explicit Stage(const char* name) { path = directory / name; }
+  explicit Stage(const char* name) : fleet(((directory / name).parent_path() / "").wstring()) {
+    path = directory / name;
+    FileFaults::NewDisk();
+  }
 
   bool Add(const std::wstring& entry, const std::string& value) {
     AddEntry(*tree, entry, value);
@@ -33,7 +36,7 @@ struct Stage : RegistryFile {
     return status.st_ino;
   }
 
-  Fleet fleet{(directory / "").wstring()};
+  Fleet fleet;
   std::optional<orx::TCSInFileKey> tree;
 };
 
@@ -61,6 +64,12 @@ const Scenario kScenarios[] = {
     {"NewFile", "tree.dff",
      [](Stage& stage) { stage.tree.emplace(stage.Name(), L"", nullptr, false, 97); },
      [](Stage& stage) { return stage.Add(L"S_0", "made"); }, "", "made"},
+    {"NewFileOfAnOldFileSystem", "tree.dff",
+     [](Stage& stage) {
+       FileFaults::isOldFileSystem = true;
+       stage.tree.emplace(stage.Name(), L"", nullptr, false, 97);
+     },
+     [](Stage& stage) { return stage.Add(L"S_0", "made"); }, "", "made"},
     {"Append", "tree.dff", CreateWithTwo, [](Stage& stage) { return stage.Add(L"S_2", "second"); },
      kKept, "second"},
     {"AppendBehindAnUnfinishedSave", "tree.dff",
@@ -77,8 +86,8 @@ const Scenario kScenarios[] = {
        stage.Append(L"big", std::string(9000, 'o'));
      },
      [](Stage& stage) { return stage.Add(L"big", std::string(3000, 'n')); }, kKept, "nnnn"},
-    {"FirstDatum", "ROVERS.dff", [](Stage&) {}, [](Stage& stage) { return stage.fleet.Ingest(1); },
-     "", kEntry1, kNoSuchFile},
+    {"FirstDatum", "new/directory/ROVERS.dff", [](Stage&) {},
+     [](Stage& stage) { return stage.fleet.Ingest(1); }, "", kEntry1, kNoSuchFile},
     {"Datum", "ROVERS.dff", [](Stage& stage) { stage.fleet.Ingest(0); },
      [](Stage& stage) { return stage.fleet.Ingest(1); }, kEntry0, kEntry1, kEntryNotWritten},
     {"Projection", "ROVERS.prj", [](Stage& stage) { stage.fleet.IngestBoth(10); },
@@ -161,11 +170,42 @@ TEST(NextSave, MakesTheNameDurableThatSomebodyElseGave) {
   Stage stage("tree.dff");
   stage.Create();
   stage.tree.emplace(stage.Name(), nullptr, nullptr, true, 97);
-  FileFaults::ForgetFlush();
+  FileFaults::ForgetFlush(stage.path);
   EXPECT_TRUE(stage.Add(L"S_1", "to a file as it was found") && FileFaults::IsDurable());
   stage.Append(L"S_2", "somebody else's");
-  FileFaults::ForgetFlush();
+  FileFaults::ForgetFlush(stage.path);
   EXPECT_TRUE(stage.Add(L"S_3", "to a file that changed") && FileFaults::IsDurable());
+}
+
+TEST(SaveAfresh, KeepsTheModeAndLeavesALinkToTheFile) {
+  namespace fs = std::filesystem;
+  Stage stage("tree.dff");
+  CreateWithTwo(stage);
+  fs::permissions(stage.path, fs::perms::owner_all);
+  const ino_t before = stage.FileNumber();
+  const fs::path link = stage.directory / "link.dff";
+  fs::create_symlink(stage.path, link);
+  stage.tree.emplace(link.wstring(), nullptr, nullptr, true, 97);
+  for (const char letter : {'a', 'b', 'c'})
+    EXPECT_TRUE(stage.Add(L"big", std::string(5000, letter)));
+  EXPECT_NE(stage.FileNumber(), before);
+  EXPECT_EQ(fs::status(stage.path).permissions(), fs::perms::owner_all);
+  EXPECT_TRUE(fs::is_symlink(link));
+  EXPECT_NE(Describe(stage.Load()).find("ccc"), std::string::npos);
+}
+
+TEST(Load, SeesAWholeTreeWhileAnUnfinishedSaveIsWrittenOver) {
+  Stage stage("tree.dff");
+  CreateWithTwo(stage);
+  const std::size_t whole = stage.Bytes().size();
+  stage.Append(L"S_2", std::string(whole + 1500, 'u'));
+  stage.SetBytes(stage.Bytes().substr(0, 2 * whole + 1000));
+  FileFaults::meanwhile = [&] {
+    EXPECT_TRUE(stage.Append(L"S_3", std::string(whole, 'x')) && stage.Append(L"S_4", "y"));
+  };
+  const orx::TCSInFileKey tree = stage.Load();
+  EXPECT_EQ(tree.GetErrorState(), orx::kRegistryOk);
+  EXPECT_NE(Describe(tree).find("S_4"), std::string::npos);
 }
 
 INSTANTIATE_TEST_SUITE_P(Of, Save, testing::ValuesIn(kScenarios),

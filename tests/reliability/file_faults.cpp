@@ -10,6 +10,9 @@
 #include <csignal>
 #include <cstdarg>
 #include <cstdio>
+#include <optional>
+#include <set>
+#include <string>
 #include <utility>
 
 namespace velta_test {
@@ -22,10 +25,11 @@ struct Machine {
   int seen = 0;
   bool isFull = false;
   bool isFileFlushed = true;
-  bool isDirectoryFlushed = true;
   bool wasFlushedInTime = true;
 };
 Machine machine;
+/// The directories with names that may not be durable; nobody counts in processes without faults.
+std::optional<std::set<std::filesystem::path>> unflushed;
 
 enum class Verdict { kWork, kFail, kHalf };
 
@@ -44,11 +48,14 @@ Verdict Judge(bool isWrite = false) {
   return isWrite ? Verdict::kHalf : Verdict::kWork;
 }
 
-int NoteRename(int result) {
-  if (result != 0) return result;
-  machine.wasFlushedInTime &= machine.isFileFlushed;
-  machine.isDirectoryFlushed = false;
+int NoteName(int result, const char* path) {
+  if (result == 0 && unflushed) unflushed->insert(std::filesystem::path(path).parent_path());
   return result;
+}
+
+int NoteRename(int result, const char* to) {
+  if (result == 0) machine.wasFlushedInTime &= machine.isFileFlushed;
+  return NoteName(result, to);
 }
 
 }  // namespace
@@ -57,9 +64,15 @@ FileFaults::FileFaults(Fault fault, int place) { machine = {true, fault, place};
 FileFaults::~FileFaults() { machine.isArmed = false; }
 int FileFaults::Count() { return machine.seen; }
 bool FileFaults::IsDurable() {
-  return machine.isFileFlushed && machine.isDirectoryFlushed && machine.wasFlushedInTime;
+  return machine.isFileFlushed && unflushed->empty() && machine.wasFlushedInTime;
 }
-void FileFaults::ForgetFlush() { machine.isDirectoryFlushed = false; }
+void FileFaults::NewDisk() {
+  unflushed.emplace();
+  isOldFileSystem = false;
+}
+void FileFaults::ForgetFlush(const std::filesystem::path& path) {
+  unflushed = {path.parent_path()};
+}
 
 }  // namespace velta_test
 
@@ -91,6 +104,11 @@ EXPORTED int flock(int file, int operation) noexcept {
   return FAILS ? -1 : REAL(flock)(file, operation);
 }
 EXPORTED ssize_t pread(int file, void* to, size_t size, off_t offset) {
+  if (const auto work = std::exchange(FileFaults::meanwhile, nullptr)) {
+    const ssize_t half = REAL(pread)(file, to, size / 2, offset);
+    work();
+    return half;
+  }
   return FAILS ? -1 : REAL(pread)(file, to, size, offset);
 }
 EXPORTED ssize_t pwrite(int file, const void* from, size_t size, off_t offset) {
@@ -105,15 +123,28 @@ EXPORTED int ftruncate(int file, off_t size) noexcept {
 }
 // Nobody waits for the disk.
 EXPORTED int fdatasync(int) { return FAILS ? -1 : (machine.isFileFlushed = true, 0); }
-EXPORTED int fsync(int) { return FAILS ? -1 : (machine.isDirectoryFlushed = true, 0); }
+EXPORTED int fsync(int directory) {
+  if (FAILS) return -1;
+  if (!unflushed) return 0;
+  const auto link = "/proc/self/fd/" + std::to_string(directory);
+  unflushed->erase(std::filesystem::read_symlink(link));
+  return 0;
+}
+EXPORTED int mkdir(const char* path, mode_t mode) noexcept {
+  return FAILS ? -1 : NoteName(REAL(mkdir)(path, mode), path);
+}
 EXPORTED int link(const char* from, const char* to) noexcept {
-  return FAILS ? -1 : NoteRename(REAL(link)(from, to));
+  return FAILS ? -1 : NoteRename(REAL(link)(from, to), to);
 }
 EXPORTED int unlink(const char* path) noexcept { return FAILS ? -1 : REAL(unlink)(path); }
 EXPORTED int rename(const char* from, const char* to) noexcept {
-  return FAILS ? -1 : NoteRename(REAL(rename)(from, to));
+  return FAILS ? -1 : NoteRename(REAL(rename)(from, to), to);
 }
 EXPORTED int renameat2(int from, const char* old, int to, const char* name,
                        unsigned flags) noexcept {
-  return FAILS ? -1 : NoteRename(REAL(renameat2)(from, old, to, name, flags));
+  if (FileFaults::isOldFileSystem) {
+    errno = EINVAL;
+    return -1;
+  }
+  return FAILS ? -1 : NoteRename(REAL(renameat2)(from, old, to, name, flags), name);
 }

@@ -1,5 +1,8 @@
 #pragma once
 
+#include <filesystem>
+#include <functional>
+
 namespace velta_test {
 
 /// What happens at a file operation of the libraries.
@@ -22,12 +25,21 @@ struct FileFaults {
   FileFaults& operator=(const FileFaults&) = delete;
   ~FileFaults();
 
+  /// From here on it is noted what is durable; everything is.
+  static void NewDisk();
+
   static int Count();
   /// A power cut now would lose nothing: what was written was flushed, before its file got its
   /// name; and so was the directory after that.
   static bool IsDurable();
-  /// From here on the directory counts as not flushed: who named a file may have been stopped.
-  static void ForgetFlush();
+  /// From here on a file's directory counts as not flushed: who named the file may have been
+  /// stopped.
+  static void ForgetFlush(const std::filesystem::path& path);
+
+  /// The file system cannot rename without replacing.
+  static inline bool isOldFileSystem = false;
+  /// Done once, in the middle of the next read.
+  static inline std::function<void()> meanwhile;
 };
 
 }  // namespace velta_test

@@ -149,7 +149,8 @@ class KillMachine {
 };
 
 TEST(Killed, NothingReportedIsLostAndNoReaderSeesABrokenTree) {
-  const int seed = testing::UnitTest::GetInstance()->random_seed();
+  static int round = 0;
+  const int seed = testing::UnitTest::GetInstance()->random_seed() + round++;
   KillMachine machine(static_cast<unsigned>(seed));
   std::size_t kills = 0;
   for (const auto end = Clock::now() + kRound; Clock::now() < end && !HasFailure(); ++kills) {

@@ -56,26 +56,15 @@ struct NameOrder {
 /// The table of shared files, by whole name.
 class SharedFiles {
  public:
+  /// Counts a user, also when the file cannot be had, but not when an exception passes.
   std::int32_t Get(const wchar_t* name, orx::TCSInFileKey** file) {
     *file = nullptr;
-    SharedFile* shared = nullptr;
-    bool inUse = false;
-    {
-      const std::lock_guard<std::mutex> lock(mutex_);
-      const std::wstring whole = orx::ToWholeName(name);
-      std::unique_ptr<SharedFile>& entry = files_[whole];
-      if (!entry) entry = std::make_unique<SharedFile>(whole);
-      shared = entry.get();
-      inUse = shared->users > 0;
-    }
-    const boost::unique_lock<boost::recursive_mutex> lock(shared->GetMutex());
-    shared->Refresh(inUse);
-    {
-      const std::lock_guard<std::mutex> tableLock(mutex_);
-      ++shared->users;
-    }
-    if (shared->GetErrorState() == orx::kCannotBeOpened) return kNoFile;
-    *file = shared;
+    SharedFile& shared = Find(name);
+    const boost::unique_lock<boost::recursive_mutex> lock(shared.GetMutex());
+    shared.Refresh(ChangeUsers(shared, 0) > 0);
+    ChangeUsers(shared, 1);
+    if (shared.GetErrorState() == orx::kCannotBeOpened) return kNoFile;
+    *file = &shared;
     return kSuccess;
   }
 
@@ -89,6 +78,18 @@ class SharedFiles {
   }
 
  private:
+  SharedFile& Find(const wchar_t* name) {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    const std::wstring whole = orx::ToWholeName(name);
+    std::unique_ptr<SharedFile>& entry = files_[whole];
+    if (!entry) entry = std::make_unique<SharedFile>(whole);
+    return *entry;
+  }
+  int ChangeUsers(SharedFile& shared, int by) {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    return shared.users += by;
+  }
+
   std::mutex mutex_;
   std::map<std::wstring, std::unique_ptr<SharedFile>, NameOrder> files_;
 };

@@ -53,7 +53,7 @@ bool TInFileKey::Save(bool /*flag*/, unsigned registryVersion) {
 
 bool TInFileKey::SaveNew(const std::filesystem::path& path) {
   const std::optional<record::Buffer> file = MakeRegistryFile(*tree_);
-  const auto stamp = file ? PublishFile(path, *file, false) : std::nullopt;
+  const auto stamp = file ? PublishFile(path, *file, nullptr) : std::nullopt;
   if (!stamp) return false;
   tree_->MarkSaved();
   tree_->position = {*stamp, file->size(), 0, true};
@@ -65,7 +65,7 @@ bool TInFileKey::Save(const COrxStringT<wchar_t>& fileName, bool /*flag*/,
   const std::optional<std::filesystem::path> path = ToPath(fileName);
   if (!path || registryVersion != kRegistryVersion || tree_->error != kRegistryOk) return false;
   const std::optional<record::Buffer> file = MakeRegistryFile(*tree_);
-  return file && PublishFile(*path, *file, false);
+  return file && PublishFile(*path, *file, nullptr);
 }
 
 bool TInFileKey::HasUnsavedChanges() const { return tree_->has_unsaved(); }

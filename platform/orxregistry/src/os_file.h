@@ -31,7 +31,7 @@ class File {
 
   /// Opens a file to change it and holds it against every other that opens it this way, in this
   /// process or in others, until closed. Waits for its turn.
-  /// \param create make the file when it does not exist
+  /// \param create make the file when it does not exist; it has no other name then
   /// \return nothing when the file cannot be opened or locked
   static std::optional<File> OpenLocked(const std::filesystem::path& path, bool create);
 
@@ -48,6 +48,9 @@ class File {
 
   bool Write(std::uint64_t offset, const unsigned char* from, std::size_t size);
   bool Truncate(std::uint64_t size);
+
+  /// Gives the file the owner, the group and the mode of another, as far as the system has them.
+  bool TakeAccessOf(const File& other);
 
   /// Makes what was written durable, the file's size included.
   bool Flush();
@@ -84,6 +87,9 @@ class Memory {
 
 /// \return nothing when there is no such file
 std::optional<FileStamp> StampOf(const std::filesystem::path& path);
+
+/// The path of a file itself where a name in it is a symbolic link.
+std::filesystem::path WithoutLinks(const std::filesystem::path& path);
 
 /// Gives a file another name in the same directory and makes the change of the directory durable.
 /// \param replace false: fails when there is a file of that name

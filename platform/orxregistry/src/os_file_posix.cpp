@@ -11,12 +11,16 @@
 #include <cstdlib>
 #include <new>
 
+#include "orxutils/file_funcs.h"
 #include "os_file.h"
 
 namespace orx::os {
 namespace {
 
 constexpr mode_t kNewFileMode = 0666;
+constexpr mode_t kModeBits = 07777;
+/// Not to wait for somebody to write into a pipe of that name.
+constexpr int kToRead = O_RDONLY | O_CLOEXEC | O_NONBLOCK;
 
 template <class Call>
 auto Retry(Call call) {
@@ -40,11 +44,15 @@ std::filesystem::path DirectoryOf(const std::filesystem::path& path) {
   return directory.empty() ? "." : directory;
 }
 
-bool FlushDirectory(const std::filesystem::path& directory) {
-  const int flags = O_RDONLY | O_DIRECTORY | O_CLOEXEC;
-  const int handle = Retry([&] { return open(directory.c_str(), flags); });
+/// \param path of a file
+/// \param directory that it is in
+bool FlushNames(const std::filesystem::path& path, const std::filesystem::path& directory) {
+  const std::error_code error = FileFuncs::flushDirectory(directory);
+  if (error != std::errc::permission_denied) return !error;
+  // Who may not read the directory has the whole file system flushed.
+  const int handle = Retry([&] { return open(path.c_str(), kToRead); });
   if (handle < 0) return false;
-  const bool flushed = Retry([&] { return fsync(handle); }) == 0;
+  const bool flushed = syncfs(handle) == 0;
   close(handle);
   return flushed;
 }
@@ -58,23 +66,33 @@ bool RenameToNewName(const char* from, const char* to) {
   return true;
 }
 
+bool HasOtherName(int handle) {
+  struct stat status;
+  return fstat(handle, &status) == 0 && status.st_nlink > 1;
+}
+
 }  // namespace
 
 std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
-  // Not to wait for somebody to write into a pipe of that name.
-  const int flags = O_RDONLY | O_CLOEXEC | O_NONBLOCK;
-  const int handle = Retry([&] { return open(path.c_str(), flags); });
+  const int handle = Retry([&] { return open(path.c_str(), kToRead); });
   if (handle < 0) return std::nullopt;
   return File(handle);
 }
 
 std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool create) {
-  const int flags = O_RDWR | O_CLOEXEC | (create ? O_CREAT : 0);
+  const int flags = O_RDWR | O_CLOEXEC | (create ? O_CREAT | O_NOFOLLOW : 0);
   for (;;) {
     const int handle = Retry([&] { return open(path.c_str(), flags, kNewFileMode); });
     if (handle < 0) return std::nullopt;
     File file(handle);
+    // A file that was finished and has its name, whose process was stopped in RenameToNewName. This
+    // process may have locked it by that name.
+    if (create && HasOtherName(handle)) {
+      if (unlink(path.c_str()) != 0) return std::nullopt;
+      continue;
+    }
     if (Retry([&] { return flock(handle, LOCK_EX); }) != 0) return std::nullopt;
+    if (create && HasOtherName(handle)) continue;
     // While this waited, the file may have been replaced by another of the same name.
     const std::optional<FileStamp> opened = file.Stamp();
     const std::optional<FileStamp> named = StampOf(path);
@@ -122,6 +140,14 @@ bool File::Truncate(std::uint64_t size) {
   return Retry([&] { return ftruncate(handle_, static_cast<off_t>(size)); }) == 0;
 }
 
+bool File::TakeAccessOf(const File& other) {
+  struct stat own, wanted;
+  if (fstat(handle_, &own) != 0 || fstat(other.handle_, &wanted) != 0) return false;
+  const bool isSameOwner = own.st_uid == wanted.st_uid && own.st_gid == wanted.st_gid;
+  return (isSameOwner || fchown(handle_, wanted.st_uid, wanted.st_gid) == 0) &&
+         fchmod(handle_, wanted.st_mode & kModeBits) == 0;
+}
+
 bool File::Flush() {
   return Retry([&] { return fdatasync(handle_); }) == 0;
 }
@@ -151,10 +177,16 @@ bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, 
   const std::filesystem::path directory = DirectoryOf(to);  // before it is too late to throw
   const bool renamed = replace ? std::rename(from.c_str(), to.c_str()) == 0
                                : RenameToNewName(from.c_str(), to.c_str());
-  return renamed && FlushDirectory(directory);
+  return renamed && FlushNames(to, directory);
 }
 
-bool FlushNames(const std::filesystem::path& path) { return FlushDirectory(DirectoryOf(path)); }
+std::filesystem::path WithoutLinks(const std::filesystem::path& path) {
+  std::error_code error;
+  std::filesystem::path real = std::filesystem::canonical(path, error);
+  return error ? path : real;
+}
+
+bool FlushNames(const std::filesystem::path& path) { return FlushNames(path, DirectoryOf(path)); }
 
 void Remove(const std::filesystem::path& path) { unlink(path.c_str()); }
 

@@ -61,15 +61,15 @@ bool Lock(HANDLE handle) {
 
 /// Replaces a file that others have open: they keep the old one.
 bool RenameOver(const std::filesystem::path& from, const std::filesystem::path& to) {
-  // Through such a handle the change of the directory is durable, too.
-  const HANDLE handle = Open(from, DELETE | SYNCHRONIZE, OPEN_EXISTING, FILE_FLAG_WRITE_THROUGH);
-  if (!handle) return false;
   const std::wstring name = ToWholeName(to.wstring());
   std::vector<unsigned char> buffer(sizeof(FILE_RENAME_INFO) + name.size() * sizeof(wchar_t));
   auto* const info = reinterpret_cast<FILE_RENAME_INFO*>(buffer.data());
   *reinterpret_cast<DWORD*>(info) = kReplaceIfExists | kPosixSemantics;
   info->FileNameLength = static_cast<DWORD>(name.size() * sizeof(wchar_t));
   std::copy(name.begin(), name.end(), info->FileName);
+  // Through such a handle the change of the directory is durable, too.
+  const HANDLE handle = Open(from, DELETE | SYNCHRONIZE, OPEN_EXISTING, FILE_FLAG_WRITE_THROUGH);
+  if (!handle) return false;
   const bool renamed = SetFileInformationByHandle(handle, kFileRenameInfoEx, info,
                                                   static_cast<DWORD>(buffer.size()));
   CloseHandle(handle);
@@ -136,7 +136,11 @@ std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool cre
     const std::optional<FileStamp> opened = file.Stamp();
     const std::optional<FileStamp> named = StampOf(path);
     if (!opened || (!named && !create)) return std::nullopt;
-    if (named && opened->IsSameFile(*named)) return file;
+    if (named && opened->IsSameFile(*named)) {
+      // One from before this file was swapped in: nobody shall put that back any more.
+      Remove(OldNameOf(path));
+      return file;
+    }
   }
 }
 
@@ -181,6 +185,8 @@ bool File::Truncate(std::uint64_t size) {
   return SetFilePointerEx(handle_, end, nullptr, FILE_BEGIN) && SetEndOfFile(handle_);
 }
 
+bool File::TakeAccessOf(const File&) { return true; }
+
 bool File::Flush() { return FlushFileBuffers(handle_) != 0; }
 
 Memory::Memory(std::size_t size) : bytes_(new unsigned char[size]) {}
@@ -201,6 +207,8 @@ bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, 
   }
   return RenameOver(from, to) || Move(from, to, MOVEFILE_REPLACE_EXISTING) || SwapIn(from, to);
 }
+
+std::filesystem::path WithoutLinks(const std::filesystem::path& path) { return path; }
 
 bool FlushNames(const std::filesystem::path&) {
   return true;  // every move writes through

@@ -143,8 +143,8 @@ void FindSegments(Bytes bytes, FileContent& content) {
   if (damaged) content.error = kDamaged;
 }
 
-/// Reads an open file from its start.
-FileContent ReadContent(const os::File& file) {
+/// Reads an open file from its start, as it is just now.
+FileContent ReadOnce(const os::File& file) {
   FileContent content;
   const std::optional<os::FileStamp> stamp = file.Stamp();
   if (!stamp) {
@@ -169,6 +169,15 @@ FileContent ReadContent(const os::File& file) {
   }
   FindSegments(Bytes(content.memory.get(), *size), content);
   return content;
+}
+
+/// Reads an open file from its start.
+FileContent ReadContent(const os::File& file) {
+  for (;;) {
+    FileContent content = ReadOnce(file);
+    // What looks like damage can be a save that others cut off and wrote over meanwhile.
+    if (content.error != kDamaged || file.Stamp() == content.stamp) return content;
+  }
 }
 
 /// The content of a file and one more tree, written anew without what is superseded.
@@ -211,17 +220,18 @@ std::optional<Buffer> MakeRegistryFile(KeyTree& tree) {
 }
 
 std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, const Buffer& bytes,
-                                         bool replace) {
+                                         const os::File* replaced) {
   std::filesystem::path beside = path;
   beside += ".new";
   std::optional<os::File> file = os::File::OpenLocked(beside, true);
   if (!file) return std::nullopt;
   std::optional<os::FileStamp> stamp;
-  if (file->Truncate(0) && file->Write(0, bytes.data(), bytes.size()) && file->Flush()) {
+  if (file->Truncate(0) && (!replaced || file->TakeAccessOf(*replaced)) &&
+      file->Write(0, bytes.data(), bytes.size()) && file->Flush()) {
     // Taken while nobody else can have the file: under its new name others may append to it.
     stamp = file->Stamp();
   }
-  if (stamp && os::Rename(beside, path, replace)) return stamp;
+  if (stamp && os::Rename(beside, path, replaced != nullptr)) return stamp;
   const auto isNamed = [own = file->Stamp()](const std::filesystem::path& name) {
     const std::optional<os::FileStamp> named = os::StampOf(name);
     return own && named && named->IsSameFile(*own);
@@ -229,11 +239,12 @@ std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, cons
   // Once it has its name, the file beside it may be somebody else's.
   if (isNamed(beside)) os::Remove(beside);
   // A new file whose name did not become durable goes, as what it holds must not pass for saved.
-  if (!replace && isNamed(path)) os::Remove(path);
+  if (!replaced && isNamed(path)) os::Remove(path);
   return std::nullopt;
 }
 
-AppendResult AppendUnsaved(const std::filesystem::path& path, KeyTree& tree) {
+AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
+  const std::filesystem::path path = os::WithoutLinks(name);
   std::optional<os::File> file = os::File::OpenLocked(path, false);
   if (!file) return AppendResult::kFailed;
   FilePosition at = tree.position;
@@ -246,10 +257,14 @@ AppendResult AppendUnsaved(const std::filesystem::path& path, KeyTree& tree) {
   if (at.superseded > (at.end + segment.size()) / 2) {
     const Bytes unsaved(segment.data() + kSegmentHeader, segment.size() - kSegmentHeader);
     const std::optional<Buffer> whole = Compact(ReadContent(*file), unsaved);
-    const auto stamp = whole ? PublishFile(path, *whole, true) : std::nullopt;
-    if (!stamp) return AppendResult::kFailed;
-    tree.position = {*stamp, whole->size(), 0, true};
-    return result;
+    if (!whole) return AppendResult::kFailed;
+    if (const auto stamp = PublishFile(path, *whole, &*file)) {
+      tree.position = {*stamp, whole->size(), 0, true};
+      return result;
+    }
+    // An append needs less room, and fewer rights. But the new file may have the name already.
+    const std::optional<os::FileStamp> named = os::StampOf(path);
+    if (!named || !named->IsSameFile(at.stamp)) return AppendResult::kFailed;
   }
   FinishSegment(segment, 0, at.end, at.superseded);
   // Before anything is promised that could go with the name.

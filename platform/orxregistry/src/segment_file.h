@@ -36,10 +36,11 @@ FileContent ReadRegistryFile(const std::filesystem::path& path);
 std::optional<record::Buffer> MakeRegistryFile(KeyTree& tree);
 
 /// Writes a file beside its place, makes it durable and gives it its name.
-/// \param replace false: fails when there is a file of that name
+/// \param replaced the file whose place it takes and whose owner and mode it gets, locked; null:
+///     fails when there is a file of that name
 /// \return the stamp of the file; nothing when it did not come to be
 std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path,
-                                         const record::Buffer& bytes, bool replace);
+                                         const record::Buffer& bytes, const os::File* replaced);
 
 /// What a tree knows of its file: where the next segment goes.
 struct FilePosition {
@@ -57,7 +58,7 @@ enum class AppendResult {
 };
 
 /// Appends what is not saved of a tree to its file durably, or writes the file afresh when more
-/// than half of it is superseded.
-AppendResult AppendUnsaved(const std::filesystem::path& path, KeyTree& tree);
+/// than half of it is superseded and that can be done.
+AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree);
 
 }  // namespace orx

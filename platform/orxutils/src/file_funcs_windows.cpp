@@ -55,6 +55,8 @@ bool createDirectoryTree(const COrxStringT<wchar_t>& name) {
   return isDirExists(name);
 }
 
+std::error_code flushDirectory(const std::filesystem::path&) { return {}; }
+
 bool isTerminal(std::FILE* file) { return _isatty(_fileno(file)) != 0; }
 
 void setBinaryMode(std::FILE* file) {

@@ -59,7 +59,10 @@ COrxStringT<wchar_t> ToWholeName(const COrxStringT<wchar_t>& name) {
   const std::optional<std::filesystem::path> path = ToPath(name);
   if (!path) return name;
   std::error_code error;
-  const std::filesystem::path whole = std::filesystem::absolute(*path, error);
+  std::filesystem::path whole = std::filesystem::absolute(*path, error);
+  // Behind a symbolic link ".." leads elsewhere than the text says.
+  const bool goesUp = name.find(L"..") != name.npos;
+  if (!error && goesUp) whole = std::filesystem::weakly_canonical(whole, error);
   return error ? name : ToName(whole.lexically_normal());
 }
 

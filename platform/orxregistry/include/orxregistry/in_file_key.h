@@ -75,7 +75,8 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
 
   /// True when the tree has changes that no save has made durable.
   bool HasUnsavedChanges() const;
-  /// Gives up what is not saved. The tree shows it until it is read again, but no save writes it.
+  /// Gives up what is not saved. The tree shows it until it is read again, but no save to its file
+  /// writes it.
   void ForgetChanges();
 
  protected:

@@ -1,7 +1,9 @@
 #pragma once
 
 #include <cstdio>
+#include <filesystem>
 #include <string>
+#include <system_error>
 #include <vector>
 
 #include "orxutils/export.h"
@@ -17,9 +19,13 @@ ORXUTILS_EXPORT bool isFileExists(const COrxStringT<wchar_t>& name);
 /// True when a directory of that name exists.
 ORXUTILS_EXPORT bool isDirExists(const COrxStringT<wchar_t>& name);
 
-/// Makes a directory with all missing parents.
+/// Makes a directory with all missing parents, durably as far as that can be had.
 /// \return true when the directory exists afterwards
 ORXUTILS_EXPORT bool createDirectoryTree(const COrxStringT<wchar_t>& name);
+
+/// Makes the names in a directory durable; on Windows and on file systems that have no such
+/// operation does nothing.
+ORXUTILS_EXPORT std::error_code flushDirectory(const std::filesystem::path& directory);
 
 /// True when an open file is a terminal.
 ORXUTILS_EXPORT bool isTerminal(std::FILE* file);
