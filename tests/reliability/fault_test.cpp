@@ -192,6 +192,10 @@ TEST(SaveAfresh, KeepsTheModeAndLeavesALinkToTheFile) {
   EXPECT_EQ(fs::status(stage.path).permissions(), fs::perms::owner_all);
   EXPECT_TRUE(fs::is_symlink(link));
   EXPECT_NE(Describe(stage.Load()).find("ccc"), std::string::npos);
+
+  fs::create_symlink(stage.directory / "somebody's", stage.directory / "tree.dff.new");
+  for (const char letter : {'d', 'e'}) EXPECT_TRUE(stage.Add(L"big", std::string(5000, letter)));
+  EXPECT_FALSE(fs::exists(stage.directory / "somebody's")) << "a link is not followed";
 }
 
 TEST(Load, SeesAWholeTreeWhileAnUnfinishedSaveIsWrittenOver) {
