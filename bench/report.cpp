@@ -32,6 +32,8 @@ std::string Times(double of, double by) {
   return text;
 }
 
+bool IsTime(const Row& row) { return row.limit != kFileSize; }
+
 }  // namespace
 
 void Report::Add(const Row& row) {
@@ -69,9 +71,8 @@ void Report::Print() const {
   for (const Row& row : rows_) {
     char goal[16] = "";
     if (row.goal) std::snprintf(goal, sizeof goal, "%.2f", *row.goal);
-    const bool isTime = row.limit != "the file's size";
-    const std::string velta = isTime ? Milliseconds(row.velta) : "";
-    const std::string limit = isTime ? Milliseconds(row.beside) : "";
+    const std::string velta = IsTime(row) ? Milliseconds(row.velta) : "";
+    const std::string limit = IsTime(row) ? Milliseconds(row.beside) : "";
     const std::string ratio = Times(row.velta, row.beside);
     const bool missed = row.goal && row.beside > 0 && row.velta / row.beside > *row.goal;
     std::printf("%-26s %8lld  %12s  %12s  %7s %6s  %12s %6s  %s%s\n", row.work.c_str(),
@@ -84,11 +85,9 @@ void Report::Print() const {
 void Report::WriteJson(const std::string& path) const {
   nlohmann::ordered_json rows = nlohmann::ordered_json::array();
   for (const Row& row : rows_) {
-    nlohmann::ordered_json entry = {{"work", row.work},
-                                    {"entries", row.entries},
-                                    {"limit", row.limit},
-                                    {"velta", row.velta},
-                                    {"beside", row.beside}};
+    nlohmann::ordered_json entry = {{"work", row.work},   {"entries", row.entries},
+                                    {"limit", row.limit}, {"unit", IsTime(row) ? "s" : "bytes"},
+                                    {"velta", row.velta}, {"beside", row.beside}};
     if (row.goal) entry["goal"] = *row.goal;
     if (row.beside > 0) entry["ratio"] = row.velta / row.beside;
     if (row.goal && row.beside > 0) entry["missed"] = row.velta / row.beside > *row.goal;

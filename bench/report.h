@@ -13,14 +13,17 @@ namespace velta_bench {
 /// Whose time a benchmark measures.
 enum class Side { kVelta, kLimit, kPeer };
 
+/// The limit of work that is measured in bytes, not in seconds.
+inline constexpr const char* kFileSize = "the file's size";
+
 /// A row of the report: a piece of work at a number of entries.
 struct Row {
   std::string work;
   std::int64_t entries = 0;
   std::string limit;           ///< what is measured beside it; empty: a note of its own
   std::optional<double> goal;  ///< the most times the limit that the work may take
-  double velta = 0.0;          ///< seconds, or a ratio of bytes
-  double beside = 0.0;         ///< seconds of the limit
+  double velta = 0.0;          ///< seconds; of memory, bytes
+  double beside = 0.0;         ///< the same of the limit
   double peer = 0.0;           ///< seconds of the peer; 0: none
 };
 

@@ -258,7 +258,7 @@ void AddMemory(Report& report, const Files& files) {
       {"memory, getAllDatums", [=] { files.Generator().getAllDatums(); }},
   };
   for (const auto& [name, query] : queries) {
-    Row row{name, files.entries, "the file's size", 2.5};
+    Row row{name, files.entries, kFileSize, 2.5};
     row.velta = static_cast<double>(PeakOf(query) - nothing);
     row.beside = static_cast<double>(fs::file_size(files.Datum()));
     // A constant of the process is most of what a small file costs.

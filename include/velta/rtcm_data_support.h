@@ -58,7 +58,8 @@ class RTCMDataSupport {
   VELTA_EXPORT static ResultCode GetPrjTransformationDLL();
 
   /// Obtains the shared tree of a datum file. The tree's mutex is not held on return: lock
-  /// `(*file)->GetMutex()` before touching the tree, and give the file back when done.
+  /// `(*file)->GetMutex()` before touching the tree, and give the file back when done, also after a
+  /// code other than 0.
   /// \param fileName full path including ".dff"
   /// \param file receives the tree, which stays the sibling library's
   /// \return 0, kNoSiblingLibrary, the loader's status, or the sibling library's code

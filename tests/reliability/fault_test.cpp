@@ -177,7 +177,7 @@ TEST(NextSave, MakesTheNameDurableThatSomebodyElseGave) {
   EXPECT_TRUE(stage.Add(L"S_3", "to a file that changed") && FileFaults::IsDurable());
 }
 
-TEST(SaveAfresh, KeepsTheModeAndLeavesALinkToTheFile) {
+TEST(SaveAfresh, KeepsModeAndLinksAndIsNotNeeded) {
   namespace fs = std::filesystem;
   Stage stage("tree.dff");
   CreateWithTwo(stage);
