@@ -48,6 +48,7 @@ class ProgramTest : public testing::Test {
 ///
 ///     $ arguments        the call
 ///     < 1021 name=value  on its standard input: the frame of a worked message, fields changed
+///     <+ 1021 name=value the same message as a line of JSON
 ///     <| 3FC0            a frame of these bytes
 ///     << text            a line of text
 ///     ~ name             a file that is damaged in its middle before
@@ -59,7 +60,7 @@ struct Call {
   std::vector<std::string> out, err;
 };
 
-std::string ChangedFrame(const std::string& text) {
+std::string ChangedJson(const std::string& text) {
   std::istringstream words(text);
   unsigned number = 0;
   words >> number;
@@ -68,11 +69,11 @@ std::string ChangedFrame(const std::string& text) {
     const std::size_t equals = word.find('=');
     json = With(json, word.substr(0, equals), word.substr(equals + 1));
   }
-  return FrameOf(json);
+  return json;
 }
 
 std::vector<Call> ReadSession(const std::string& name) {
-  const std::string_view marks = "$ < <| << ~ = > !";
+  const std::string_view marks = "$ < <+ <| << ~ = > !";
   std::vector<Call> calls;
   std::ifstream lines(TOOL_TESTS "/sessions/" + name);
   for (std::string line; std::getline(lines, line);) {
@@ -82,7 +83,8 @@ std::vector<Call> ReadSession(const std::string& name) {
     if (mark.empty() || mark == "#") continue;
     if (mark == "$") calls.emplace_back().arguments = text;
     Call& call = calls.at(calls.size() - 1);
-    if (mark == "<") call.input += ChangedFrame(text);
+    if (mark == "<") call.input += FrameOf(ChangedJson(text));
+    if (mark == "<+") call.input += ChangedJson(text) + "\n";
     if (mark == "<|") velta_tool::rtcm3::AppendFrame(FromHex(text), call.input);
     if (mark == "<<") call.input += text + "\n";
     if (mark == "~") call.damaged = text;

@@ -155,36 +155,5 @@ TEST(Encode, RecordThatDoesNotFitIsRefusedWhole) {
   EXPECT_EQ(out, "before");
 }
 
-TEST(Json, WhatIsWrongIsNamedWithFieldAndRange) {
-  const std::tuple<unsigned, const char*, const char*, std::string> cases[] = {
-      {1021, "message", "1020", "message must be an integer from 1021 to 1027, not 1020"},
-      {1021, "message", "1025", "projectionType is missing"},
-      {1021, "sourceName", "5", "sourceName must be a text of at most 31 ISO 8859-1 characters"},
-      {1021, "targetName", "\"32345678901234567890123456789012\"", "targetName must be a text of"},
-      {1021, "targetName", "\"\u0141\"", "targetName must be a text of at most 31"},
-      {1023, "mjd", "0, \"mjD\": 1", "mjD is no field of the message"},
-      {1023, "phi0", "1048576", "phi0 must be an integer from -1048576 to 1048575, not 1048576"},
-      {1023, "mjd", "-1", "mjd must be an integer from 0 to 65535, not -1"},
-      {1023, "mjd", "1.0", "mjd must be an integer from 0 to 65535, not 1.0"},
-      {1023, "horShiftIndicator", "2", "horShiftIndicator must be an integer from 0 to 1, not 2"},
-      {1027, "laPC", "18446744073709551615", "laPC must be an integer from -8589934592 to"},
-      {1023, "residualPhi", "[1,2,3,4,5,6,7,8,9,0,1,2,3,4,5,6,7]", "residualPhi must be an array"},
-      {1023, "residualH", "[0,0,0,256,0,0,0,0,0,0,0,0,0,0,0,0]", "residualH[3] must be an integer"},
-  };
-  for (const auto& [message, field, value, error] : cases) {
-    EXPECT_EQ(ErrorOf(With(Worked(message), field, value)).substr(0, error.size()), error);
-  }
-  for (const char* line : {"", "[1021]", "{\"message\": 1021", "\"\xFF\""}) {
-    EXPECT_EQ(ErrorOf(line), "not a JSON object");
-  }
-}
-
-TEST(Json, NamesThatAreNotAsciiAreUtf8) {
-  const std::string json = With(Worked(1021), "sourceName", R"("Straße \"1\"")");
-  const auto datum = std::get<Rtcm1021>(ParseJsonLine(json));
-  EXPECT_EQ(datum.sourceName, orx::Narrow(L"Stra\u00DFe \"1\""));
-  EXPECT_EQ(JsonOf(datum), json);
-}
-
 }  // namespace
 }  // namespace velta_test
