@@ -83,6 +83,7 @@ using namespace velta_test;
 #define EXPORTED extern "C" __attribute__((visibility("default")))
 #define FAILS (Judge() != Verdict::kWork)
 #define REAL(name) reinterpret_cast<decltype(&(name))>(dlsym(RTLD_NEXT, #name))
+#define PASS(name, ...) (FAILS ? -1 : REAL(name)(__VA_ARGS__))
 
 EXPORTED int open(const char* path, int flags, ...) {
   mode_t mode = 0;
@@ -92,24 +93,18 @@ EXPORTED int open(const char* path, int flags, ...) {
     mode = va_arg(arguments, mode_t);  // NOLINT(*-valist.Uninitialized): the line above does it
     va_end(arguments);
   }
-  return FAILS ? -1 : REAL(open)(path, flags, mode);
+  return PASS(open, path, flags, mode);
 }
-EXPORTED int stat(const char* path, struct stat* status) noexcept {
-  return FAILS ? -1 : REAL(stat)(path, status);
-}
-EXPORTED int fstat(int file, struct stat* status) noexcept {
-  return FAILS ? -1 : REAL(fstat)(file, status);
-}
-EXPORTED int flock(int file, int operation) noexcept {
-  return FAILS ? -1 : REAL(flock)(file, operation);
-}
+EXPORTED int stat(const char* path, struct stat* to) noexcept { return PASS(stat, path, to); }
+EXPORTED int fstat(int file, struct stat* to) noexcept { return PASS(fstat, file, to); }
+EXPORTED int flock(int file, int how) noexcept { return PASS(flock, file, how); }
 EXPORTED ssize_t pread(int file, void* to, size_t size, off_t offset) {
   if (const auto work = std::exchange(FileFaults::meanwhile, nullptr)) {
     const ssize_t half = REAL(pread)(file, to, size / 2, offset);
     work();
     return half;
   }
-  return FAILS ? -1 : REAL(pread)(file, to, size, offset);
+  return PASS(pread, file, to, size, offset);
 }
 EXPORTED ssize_t pwrite(int file, const void* from, size_t size, off_t offset) {
   const Verdict verdict = Judge(true);
@@ -136,7 +131,8 @@ EXPORTED int mkdir(const char* path, mode_t mode) noexcept {
 EXPORTED int link(const char* from, const char* to) noexcept {
   return FAILS ? -1 : NoteRename(REAL(link)(from, to), to);
 }
-EXPORTED int unlink(const char* path) noexcept { return FAILS ? -1 : REAL(unlink)(path); }
+EXPORTED int fchmod(int file, mode_t mode) noexcept { return PASS(fchmod, file, mode); }
+EXPORTED int unlink(const char* path) noexcept { return PASS(unlink, path); }
 EXPORTED int rename(const char* from, const char* to) noexcept {
   return FAILS ? -1 : NoteRename(REAL(rename)(from, to), to);
 }
