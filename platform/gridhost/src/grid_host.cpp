@@ -53,7 +53,7 @@ struct NameOrder {
   }
 };
 
-/// The table of shared files, by whole name.
+/// The table of shared files, by whole names and by the names that were asked for.
 class SharedFiles {
  public:
   /// Counts a user, also when the file cannot be had, but not when an exception passes.
@@ -68,22 +68,23 @@ class SharedFiles {
     return kSuccess;
   }
 
-  /// The caller may still hold the file's lock, so the tree stays as it is. Needs no memory for a
-  /// whole name, as it must work when memory is out.
+  /// The caller may still hold the file's lock, so the tree stays as it is. Asks neither for memory
+  /// nor the file system, as it must work when memory is out.
   void Reset(const wchar_t* name) {
     const std::lock_guard<std::mutex> lock(mutex_);
-    auto entry = files_.find(std::wstring_view(name));
-    if (entry == files_.end()) entry = files_.find(orx::ToWholeName(name));
+    const auto entry = files_.find(std::wstring_view(name));
     if (entry != files_.end() && entry->second->users > 0) --entry->second->users;
   }
 
  private:
   SharedFile& Find(const wchar_t* name) {
-    const std::lock_guard<std::mutex> lock(mutex_);
     const std::wstring whole = orx::ToWholeName(name);
-    std::unique_ptr<SharedFile>& entry = files_[whole];
-    if (!entry) entry = std::make_unique<SharedFile>(whole);
-    return *entry;
+    const std::lock_guard<std::mutex> lock(mutex_);
+    const auto found = files_.find(whole);
+    const auto file = found == files_.end() ? std::make_shared<SharedFile>(whole) : found->second;
+    files_.insert_or_assign(whole, file);
+    files_.insert_or_assign(name, file);
+    return *file;
   }
   int ChangeUsers(SharedFile& shared, int by) {
     const std::lock_guard<std::mutex> lock(mutex_);
@@ -91,7 +92,7 @@ class SharedFiles {
   }
 
   std::mutex mutex_;
-  std::map<std::wstring, std::unique_ptr<SharedFile>, NameOrder> files_;
+  std::map<std::wstring, std::shared_ptr<SharedFile>, NameOrder> files_;
 };
 
 SharedFiles& Files() {

@@ -49,7 +49,8 @@ class File {
   bool Write(std::uint64_t offset, const unsigned char* from, std::size_t size);
   bool Truncate(std::uint64_t size);
 
-  /// Gives the file the owner, the group and the mode of another, as far as the system has them.
+  /// Gives the file the owner, the group and the mode of another, where the system has them.
+  /// \return false when that cannot be done, or is not all that tells who may use the file
   bool TakeAccessOf(const File& other);
 
   /// Makes what was written durable, the file's size included.
@@ -95,8 +96,8 @@ std::filesystem::path WithoutLinks(const std::filesystem::path& path);
 /// \param replace false: fails when there is a file of that name
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace);
 
-/// Makes the names of the files in the directory of `path` durable.
-bool FlushNames(const std::filesystem::path& path);
+/// Makes the name of a file durable.
+bool FlushName(const std::filesystem::path& path);
 
 void Remove(const std::filesystem::path& path);
 

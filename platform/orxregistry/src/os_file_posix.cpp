@@ -2,6 +2,7 @@
 #include <sys/file.h>
 #include <sys/mman.h>
 #include <sys/stat.h>
+#include <sys/xattr.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -39,24 +40,6 @@ FileStamp ToStamp(const struct stat& status) {
   return stamp;
 }
 
-std::filesystem::path DirectoryOf(const std::filesystem::path& path) {
-  const std::filesystem::path directory = path.parent_path();
-  return directory.empty() ? "." : directory;
-}
-
-/// \param path of a file
-/// \param directory that it is in
-bool FlushNames(const std::filesystem::path& path, const std::filesystem::path& directory) {
-  const std::error_code error = FileFuncs::flushDirectory(directory);
-  if (error != std::errc::permission_denied) return !error;
-  // Who may not read the directory has the whole file system flushed.
-  const int handle = Retry([&] { return open(path.c_str(), kToRead); });
-  if (handle < 0) return false;
-  const bool flushed = syncfs(handle) == 0;
-  close(handle);
-  return flushed;
-}
-
 bool RenameToNewName(const char* from, const char* to) {
   if (renameat2(AT_FDCWD, from, AT_FDCWD, to, RENAME_NOREPLACE) == 0) return true;
   if (errno != EINVAL && errno != ENOSYS) return false;
@@ -85,18 +68,18 @@ std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool cre
     const int handle = Retry([&] { return open(path.c_str(), flags, kNewFileMode); });
     if (handle < 0) return std::nullopt;
     File file(handle);
-    // A file that was finished and has its name, whose process was stopped in RenameToNewName. This
-    // process may have locked it by that name.
+    // A process that was stopped in RenameToNewName leaves a finished file with two names. It is
+    // not locked here: a caller that holds it by its right name would wait for itself.
     if (create && HasOtherName(handle)) {
-      if (unlink(path.c_str()) != 0) return std::nullopt;
+      if (unlink(path.c_str()) != 0 && errno != ENOENT) return std::nullopt;
       continue;
     }
     if (Retry([&] { return flock(handle, LOCK_EX); }) != 0) return std::nullopt;
+    // While this waited, the file may have got its name, or been replaced by another of this name.
     if (create && HasOtherName(handle)) continue;
-    // While this waited, the file may have been replaced by another of the same name.
     const std::optional<FileStamp> opened = file.Stamp();
     const std::optional<FileStamp> named = StampOf(path);
-    if (!opened || (!named && !create)) return std::nullopt;
+    if (!opened) return std::nullopt;
     if (named && opened->IsSameFile(*named)) return file;
   }
 }
@@ -141,11 +124,15 @@ bool File::Truncate(std::uint64_t size) {
 }
 
 bool File::TakeAccessOf(const File& other) {
-  struct stat own, wanted;
+  struct stat own;
+  struct stat wanted;
   if (fstat(handle_, &own) != 0 || fstat(other.handle_, &wanted) != 0) return false;
+  // An access control list says more than the mode.
+  if (fgetxattr(other.handle_, "system.posix_acl_access", nullptr, 0) > 0) return false;
   const bool isSameOwner = own.st_uid == wanted.st_uid && own.st_gid == wanted.st_gid;
-  return (isSameOwner || fchown(handle_, wanted.st_uid, wanted.st_gid) == 0) &&
-         fchmod(handle_, wanted.st_mode & kModeBits) == 0;
+  if (!isSameOwner && fchown(handle_, wanted.st_uid, wanted.st_gid) != 0) return false;
+  const mode_t mode = wanted.st_mode & kModeBits;
+  return (own.st_mode & kModeBits) == mode || fchmod(handle_, mode) == 0;
 }
 
 bool File::Flush() {
@@ -174,10 +161,9 @@ std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
 }
 
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
-  const std::filesystem::path directory = DirectoryOf(to);  // before it is too late to throw
   const bool renamed = replace ? std::rename(from.c_str(), to.c_str()) == 0
                                : RenameToNewName(from.c_str(), to.c_str());
-  return renamed && FlushNames(to, directory);
+  return renamed && FlushName(to);
 }
 
 std::filesystem::path WithoutLinks(const std::filesystem::path& path) {
@@ -186,7 +172,7 @@ std::filesystem::path WithoutLinks(const std::filesystem::path& path) {
   return error ? path : real;
 }
 
-bool FlushNames(const std::filesystem::path& path) { return FlushNames(path, DirectoryOf(path)); }
+bool FlushName(const std::filesystem::path& path) { return FileFuncs::flushName(path); }
 
 void Remove(const std::filesystem::path& path) { unlink(path.c_str()); }
 

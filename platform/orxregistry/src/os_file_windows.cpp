@@ -135,7 +135,7 @@ std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool cre
     // While this waited, the file may have been replaced by another of the same name.
     const std::optional<FileStamp> opened = file.Stamp();
     const std::optional<FileStamp> named = StampOf(path);
-    if (!opened || (!named && !create)) return std::nullopt;
+    if (!opened) return std::nullopt;
     if (named && opened->IsSameFile(*named)) {
       // One from before this file was swapped in: nobody shall put that back any more.
       Remove(OldNameOf(path));
@@ -210,7 +210,7 @@ bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, 
 
 std::filesystem::path WithoutLinks(const std::filesystem::path& path) { return path; }
 
-bool FlushNames(const std::filesystem::path&) {
+bool FlushName(const std::filesystem::path&) {
   return true;  // every move writes through
 }
 

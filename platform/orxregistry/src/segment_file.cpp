@@ -268,7 +268,7 @@ AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
   }
   FinishSegment(segment, 0, at.end, at.superseded);
   // Before anything is promised that could go with the name.
-  at.isNameDurable = at.isNameDurable || os::FlushNames(path);
+  at.isNameDurable = at.isNameDurable || os::FlushName(path);
   if (!at.isNameDurable) return AppendResult::kFailed;
   const bool cutOff = at.stamp.size == at.end || file->Truncate(at.end);
   const bool written =

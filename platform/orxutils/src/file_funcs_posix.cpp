@@ -3,6 +3,7 @@
 
 #include <cerrno>
 #include <filesystem>
+#include <new>
 #include <optional>
 #include <system_error>
 
@@ -21,13 +22,33 @@ bool Ask(const COrxStringT<wchar_t>& name, Question question) {
   return path && question(*path, error) && !error;
 }
 
+template <class Call>
+int Retry(Call call) {
+  int result = call();
+  while (result < 0 && errno == EINTR) result = call();
+  return result;
+}
+
+class Handle {
+ public:
+  Handle(const char* name, int flags) : handle_(Retry([&] { return open(name, flags); })) {}
+  Handle(const Handle&) = delete;
+  Handle& operator=(const Handle&) = delete;
+  ~Handle() {
+    if (handle_ >= 0) close(handle_);
+  }
+  int get() const { return handle_; }
+
+ private:
+  int handle_;
+};
+
 bool MakeDirectory(const fs::path& path, std::error_code& error) {
   if (fs::is_directory(path, error)) return true;
   const fs::path parent = path.has_parent_path() ? path.parent_path() : ".";
   if (parent != path && !MakeDirectory(parent, error)) return false;
   if (!fs::create_directory(path, error)) return fs::is_directory(path, error);  // another's
-  const std::error_code flush = flushDirectory(parent);
-  if (!flush || flush == std::errc::permission_denied) return true;
+  if (flushName(path)) return true;
   fs::remove(path, error);
   return false;
 }
@@ -48,14 +69,18 @@ bool isDirExists(const COrxStringT<wchar_t>& name) {
 
 bool createDirectoryTree(const COrxStringT<wchar_t>& name) { return Ask(name, MakeDirectory); }
 
-std::error_code flushDirectory(const fs::path& directory) {
-  const auto error = [] { return std::error_code(errno, std::generic_category()); };
-  const int handle = open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
-  if (handle < 0) return error();
-  const bool isDone = fsync(handle) == 0 || errno == EINVAL;
-  const std::error_code result = isDone ? std::error_code() : error();
-  close(handle);
-  return result;
+bool flushName(const fs::path& path) noexcept try {
+  const fs::path directory = path.has_parent_path() ? path.parent_path() : ".";
+  const Handle names(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+  if (names.get() >= 0) {
+    return Retry([&] { return fsync(names.get()); }) == 0 || errno == EINVAL;
+  }
+  if (errno != EACCES) return false;
+  // Who may not read the directory has the whole file system flushed.
+  const Handle named(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK);
+  return named.get() >= 0 && syncfs(named.get()) == 0;
+} catch (const std::bad_alloc&) {
+  return false;
 }
 
 bool isTerminal(std::FILE* file) { return isatty(fileno(file)) != 0; }

@@ -55,7 +55,7 @@ bool createDirectoryTree(const COrxStringT<wchar_t>& name) {
   return isDirExists(name);
 }
 
-std::error_code flushDirectory(const std::filesystem::path&) { return {}; }
+bool flushName(const std::filesystem::path&) noexcept { return true; }
 
 bool isTerminal(std::FILE* file) { return _isatty(_fileno(file)) != 0; }
 

@@ -3,7 +3,6 @@
 #include <cstdio>
 #include <filesystem>
 #include <string>
-#include <system_error>
 #include <vector>
 
 #include "orxutils/export.h"
@@ -19,13 +18,13 @@ ORXUTILS_EXPORT bool isFileExists(const COrxStringT<wchar_t>& name);
 /// True when a directory of that name exists.
 ORXUTILS_EXPORT bool isDirExists(const COrxStringT<wchar_t>& name);
 
-/// Makes a directory with all missing parents, durably as far as that can be had.
+/// Makes a directory with all missing parents, durably.
 /// \return true when the directory exists afterwards
 ORXUTILS_EXPORT bool createDirectoryTree(const COrxStringT<wchar_t>& name);
 
-/// Makes the names in a directory durable; on Windows and on file systems that have no such
-/// operation does nothing.
-ORXUTILS_EXPORT std::error_code flushDirectory(const std::filesystem::path& directory);
+/// Makes the name of a file or a directory durable; on Windows and on file systems that have no
+/// such operation does nothing.
+ORXUTILS_EXPORT bool flushName(const std::filesystem::path& path) noexcept;
 
 /// True when an open file is a terminal.
 ORXUTILS_EXPORT bool isTerminal(std::FILE* file);
