@@ -97,8 +97,12 @@ const Scenario kScenarios[] = {
        stage.fleet.Ingest(0);
        stage.fleet.Ingest(1, "OTHER");
      },
-     [](Stage& stage) { return stage.fleet.Merge(stage.fleet.directory + L"OTHER.dff"); }, kEntry0,
-     kEntry1, kDatumFileTrouble},
+     [](Stage& stage) {
+       Fleet& fleet = stage.fleet;
+       const std::wstring other = fleet.directory + L"OTHER.dff";
+       return (fleet.result = RTCMDataSupport::MergeRTCMDatumfiles(fleet.datums, other)) == 0;
+     },
+     kEntry0, kEntry1, kDatumFileTrouble},
 };
 
 bool SaveInAChild(Stage& stage, const Scenario& scenario, int place) {

@@ -44,8 +44,8 @@ struct Fleet {
     projection.laNO = number;
     return Ingest(number) && (result = support.ParseProjectionMessages(projection, nullptr)) == 0;
   }
-  bool Merge(const std::wstring& source) {
-    return (result = RTCMDataSupport::MergeRTCMDatumfiles(datums, source)) == 0;
+  bool Merge(const std::wstring& source) const {
+    return RTCMDataSupport::MergeRTCMDatumfiles(datums, source) == 0;
   }
 
   /// Every query finds set 0, the first.
@@ -61,7 +61,7 @@ struct Fleet {
   const std::wstring datums = directory + L"ROVERS.dff";
   const std::wstring projections = directory + L"ROVERS.prj";
   RTCMDataSupport support{directory.c_str(), directory.c_str()};
-  orx::cs::velta::ResultCode result = 0;  ///< of the last call
+  orx::cs::velta::ResultCode result = 0;  ///< of the last ingestion
 };
 
 }  // namespace velta_test
