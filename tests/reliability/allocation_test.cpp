@@ -95,7 +95,7 @@ class OutOfMemory : public testing::TestWithParam<std::tuple<Case, bool>> {};
 TEST_P(OutOfMemory, IsReportedAndLeavesNothingHalf) {
   const auto& [what, work, minimum, addsEntry] = std::get<Case>(GetParam());
   const TemporaryDirectory directory;
-  Fleet fleet((directory / "").wstring());
+  Fleet fleet((directory / "./").wstring());  // a name to be made whole
   ASSERT_TRUE(fleet.IngestBoth(0));
   int exceptions = 0;
   bool ranOut = true;
