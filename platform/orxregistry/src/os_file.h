@@ -96,9 +96,6 @@ std::filesystem::path WithoutLinks(const std::filesystem::path& path);
 /// \param replace false: fails when there is a file of that name
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace);
 
-/// Makes the name of a file durable.
-bool FlushName(const std::filesystem::path& path);
-
 void Remove(const std::filesystem::path& path);
 
 }  // namespace orx::os

@@ -163,7 +163,7 @@ std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
   const bool renamed = replace ? std::rename(from.c_str(), to.c_str()) == 0
                                : RenameToNewName(from.c_str(), to.c_str());
-  return renamed && FlushName(to);
+  return renamed && FileFuncs::flushName(to);
 }
 
 std::filesystem::path WithoutLinks(const std::filesystem::path& path) {
@@ -171,8 +171,6 @@ std::filesystem::path WithoutLinks(const std::filesystem::path& path) {
   std::filesystem::path real = std::filesystem::canonical(path, error);
   return error ? path : real;
 }
-
-bool FlushName(const std::filesystem::path& path) { return FileFuncs::flushName(path); }
 
 void Remove(const std::filesystem::path& path) { unlink(path.c_str()); }
 

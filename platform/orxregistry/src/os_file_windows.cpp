@@ -210,10 +210,6 @@ bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, 
 
 std::filesystem::path WithoutLinks(const std::filesystem::path& path) { return path; }
 
-bool FlushName(const std::filesystem::path&) {
-  return true;  // every move writes through
-}
-
 void Remove(const std::filesystem::path& path) { DeleteFileW(path.c_str()); }
 
 }  // namespace orx::os

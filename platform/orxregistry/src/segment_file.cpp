@@ -6,6 +6,7 @@
 #include <utility>
 
 #include "key_tree.h"
+#include "orxutils/file_funcs.h"
 
 #define XXH_INLINE_ALL
 #include <xxhash.h>
@@ -268,7 +269,7 @@ AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
   }
   FinishSegment(segment, 0, at.end, at.superseded);
   // Before anything is promised that could go with the name.
-  at.isNameDurable = at.isNameDurable || os::FlushName(path);
+  at.isNameDurable = at.isNameDurable || FileFuncs::flushName(path);
   if (!at.isNameDurable) return AppendResult::kFailed;
   const bool cutOff = at.stamp.size == at.end || file->Truncate(at.end);
   const bool written =

@@ -55,7 +55,9 @@ bool createDirectoryTree(const COrxStringT<wchar_t>& name) {
   return isDirExists(name);
 }
 
-bool flushName(const std::filesystem::path&) noexcept { return true; }
+bool flushName(const std::filesystem::path&) noexcept {
+  return true;  // every move writes through
+}
 
 bool isTerminal(std::FILE* file) { return _isatty(_fileno(file)) != 0; }
 
