@@ -5,7 +5,8 @@
 namespace orx::cs::velta {
 
 /// What an ingestion operation answers: 0 is success. Codes that the sibling library or the
-/// loader of libraries answers are passed on unchanged and are not among those below.
+/// loader of libraries answers are passed on unchanged; those of RTCMGridHost and of the loader
+/// here are the last two below.
 using ResultCode = std::int32_t;
 
 /// A result code and what it says to a person.
@@ -42,8 +43,12 @@ inline constexpr ResultCode kNoDatumMessage = static_cast<ResultCode>(0x80040642
 inline constexpr ResultCode kNoDatumName = static_cast<ResultCode>(0x80040643);
 /// RTCMGridHost cannot be loaded or lacks an entry point.
 inline constexpr ResultCode kNoSiblingLibrary = static_cast<ResultCode>(0x80040644);
+/// RTCMGridHost: the shared file does not exist, or could not be made or opened.
+inline constexpr ResultCode kNoSharedFile = static_cast<ResultCode>(0x80070002);
+/// The loader: RTCMGridHost was found and the system cannot load it.
+inline constexpr ResultCode kSiblingNotLoadable = static_cast<ResultCode>(0x8007000B);
 
-/// Every result code of this library with its meaning.
+/// Every result code above with its meaning.
 inline constexpr ResultMeaning kResultMeanings[] = {
     {kSuccess, "done, or the entry was already there"},
     {kNotTheCurrentDescription, "not the object's current datum or projection, nothing written"},
@@ -60,6 +65,8 @@ inline constexpr ResultMeaning kResultMeanings[] = {
     {kNoDatumMessage, "the message set has neither a 1021 nor a 1022"},
     {kNoDatumName, "no target datum name"},
     {kNoSiblingLibrary, "the library RTCMGridHost cannot be loaded or lacks an entry point"},
+    {kNoSharedFile, "the file does not exist, or could not be made or opened"},
+    {kSiblingNotLoadable, "RTCMGridHost is no library that this system can load"},
 };
 
 }  // namespace orx::cs::velta

@@ -33,10 +33,11 @@ void LookInto(const TGenericRegistryKey& key) {
 ResultCode MergeFiles(const FileKind& kind, const COrxStringT<wchar_t>& targetPath,
                       const COrxStringT<wchar_t>& sourcePath, MergeContainers* merge) {
   TCSInFileKey* target = nullptr;
-  const ResultCode obtained = Obtain(kind, targetPath, &target);
+  const ResultCode obtained = ObtainTree(kind, targetPath, &target);
   const GiveBackLater giveBack(kind, targetPath);  // when the lock is gone
   if (obtained != kSuccess) return obtained;
   const boost::unique_lock<boost::recursive_mutex> lock(target->GetMutex());
+  ReadIfLost(*target);
   TGenericRegistryKey targetContainer = ContainerOf(*target);
   if (targetContainer.IsNull()) return kind.trouble;
 

@@ -29,7 +29,7 @@ ResultCode CreateFileWithEntry(const FileKind& kind, const COrxStringT<wchar_t>&
 
 ResultCode OpenShared(const FileKind& kind, const COrxStringT<wchar_t>& path) {
   kind.current = nullptr;
-  ResultCode result = Obtain(kind, path, &kind.current);
+  ResultCode result = ObtainTree(kind, path, &kind.current);
   if (result == kSuccess && kind.current->GetErrorState() != kRegistryOk) result = kind.trouble;
   if (result != kSuccess) GiveBack(kind, path);
   return result;
@@ -37,6 +37,7 @@ ResultCode OpenShared(const FileKind& kind, const COrxStringT<wchar_t>& path) {
 
 ResultCode AddEntry(const FileKind& kind, const COrxStringT<wchar_t>& name, const FillKey& fill) {
   TCSInFileKey& file = *kind.current;
+  ReadIfLost(file);
   const TGenericRegistryKey container = ContainerOf(file);
   const bool isPresent = container.HasKey(name);
   // Damage inside a key shows only when the key has been looked into.

@@ -31,10 +31,19 @@ ResultCode Obtain(const FileKind& kind, const COrxStringT<wchar_t>& path, TCSInF
   return obtain ? obtain(path.c_str(), file) : kNoSiblingLibrary;
 }
 
+ResultCode ObtainTree(const FileKind& kind, const COrxStringT<wchar_t>& path, TCSInFileKey** file) {
+  const ResultCode result = Obtain(kind, path, file);
+  return result == kSuccess && !*file ? kind.trouble : result;
+}
+
 void GiveBack(const FileKind& kind, const COrxStringT<wchar_t>& path) {
   if (!kind.loader) return;
   auto* const giveBack = kind.loader->GetFunc<GiveBackFunction>(kind.giveBackFunction);
   if (giveBack) giveBack(path.c_str());
+}
+
+void ReadIfLost(TInFileKey& file) {
+  if (file.GetErrorState() == kCannotBeOpened) file.Reload();
 }
 
 TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key) {

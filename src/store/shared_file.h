@@ -43,6 +43,10 @@ void UnloadSibling(const FileKind& kind);
 ResultCode Obtain(const FileKind& kind, const COrxStringT<wchar_t>& path, TCSInFileKey** file);
 void GiveBack(const FileKind& kind, const COrxStringT<wchar_t>& path);
 
+/// As Obtain, for those who work on the tree: a sibling library that answers 0 and hands out no
+/// tree is the kind's trouble.
+ResultCode ObtainTree(const FileKind& kind, const COrxStringT<wchar_t>& path, TCSInFileKey** file);
+
 /// Gives a file back when it goes.
 class GiveBackLater {
  public:
@@ -76,6 +80,10 @@ class Change {
   bool isAlone_;
   bool isSaved_ = false;
 };
+
+/// Reads a tree again that could not be read when a change of it was forgotten. To be called with
+/// the tree's lock, before anything is looked up in it.
+void ReadIfLost(TInFileKey& file);
 
 /// The first sub-key, null when there is none.
 TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key);

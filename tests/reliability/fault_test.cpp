@@ -1,23 +1,46 @@
 // Every file operation of a save fails, or is the last thing the process does, in turn.
 
+#include <dlfcn.h>
 #include <gtest/gtest.h>
+#include <pthread.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <climits>
+#include <functional>
 #include <optional>
+#include <utility>
 
 #include "file_faults.h"
 #include "fleet.h"
 #include "platform/registry_fixture.h"
 
+namespace {
+
+/// Work to be done in front of one of the times that a lock is taken.
+struct WatchedLock {
+  pthread_mutex_t* lock = nullptr;
+  int times = 0;
+  std::function<void()> work;
+};
+WatchedLock watched;
+
+}  // namespace
+
+/// In the place of the C library's, for the libraries too.
+extern "C" __attribute__((visibility("default"))) int pthread_mutex_lock(
+    pthread_mutex_t* lock) noexcept {
+  static auto* const real =
+      reinterpret_cast<decltype(&pthread_mutex_lock)>(dlsym(RTLD_NEXT, "pthread_mutex_lock"));
+  if (lock == watched.lock && --watched.times == 0) std::exchange(watched, {}).work();
+  return real(lock);
+}
+
 namespace velta_test {
 namespace {
 
 using namespace orx::cs::velta;
-
-constexpr auto kNoSuchFile = static_cast<ResultCode>(0x80070002);
 
 /// A file, and what a process keeps in memory from one save to the next.
 struct Stage : RegistryFile {
@@ -87,7 +110,7 @@ const Scenario kScenarios[] = {
      },
      [](Stage& stage) { return stage.Add(L"big", std::string(3000, 'n')); }, kKept, "nnnn"},
     {"FirstDatum", "new/directory/ROVERS.dff", [](Stage&) {},
-     [](Stage& stage) { return stage.fleet.Ingest(1); }, "", kEntry1, kNoSuchFile},
+     [](Stage& stage) { return stage.fleet.Ingest(1); }, "", kEntry1, kNoSharedFile},
     {"Datum", "ROVERS.dff", [](Stage& stage) { stage.fleet.Ingest(0); },
      [](Stage& stage) { return stage.fleet.Ingest(1); }, kEntry0, kEntry1, kEntryNotWritten},
     {"Projection", "ROVERS.prj", [](Stage& stage) { stage.fleet.IngestBoth(10); },
@@ -168,6 +191,71 @@ TEST_P(Save, LosesNothingAndReportsItsFailure) {
   for (const Fault fault : kFaults) {
     for (int place = 0; place < operations; ++place) Try(GetParam(), fault, place);
   }
+}
+
+/// A caller tries again with the tree that it holds when the full disk has room again.
+class Retry : public testing::Test {
+ protected:
+  Retry() { EXPECT_TRUE(fleet.IngestBoth(0)); }
+
+  DatumData CurrentDatum() const {
+    return RTCMGenerator(1, fleet.datums, L"").getAllDatums().at(0);
+  }
+
+  Stage stage{"ROVERS.dff"};
+  Fleet& fleet = stage.fleet;
+};
+
+TEST_F(Retry, SavesTheDatumThatTheDiskDidNotTake) {
+  {
+    const FileFaults full(Fault::kFull, 0);
+    EXPECT_FALSE(fleet.Ingest(1));
+  }
+  DatumData datum = CurrentDatum();
+  EXPECT_EQ(fleet.support.AddDatumToGFF(datum), kSuccess);
+  EXPECT_TRUE(HoldsDatum(LoadTree(fleet.datums), 1));
+}
+
+TEST_F(Retry, SavesTheDatumThatADiskGoneForAWhileDidNotTake) {
+  {
+    const FileFaults gone(Fault::kBroken, 4);
+    EXPECT_FALSE(fleet.Ingest(1));
+    EXPECT_EQ(fleet.result, kEntryNotWritten);
+  }
+  DatumData datum = CurrentDatum();
+  EXPECT_EQ(fleet.support.AddDatumToGFF(datum), kSuccess);
+  EXPECT_TRUE(HoldsDatum(LoadTree(fleet.datums), 1));
+}
+
+TEST_F(Retry, SavesTheProjectionThatTheDiskDidNotTake) {
+  Rtcm1025 message;
+  message.projectionType = ProjectionData::TM;
+  message.laNO = 1;
+  {
+    const FileFaults full(Fault::kFull, 0);
+    EXPECT_EQ(fleet.support.ParseProjectionMessages(message, nullptr), kEntryNotWritten);
+  }
+  const orx::cs::projmath::Ellipsoid ellipsoid = fleet.support.GetDatumTargetEllipsoid();
+  ProjectionData projection;
+  projection.rtcmProjName = L"ROVERS";
+  projection.prjType = L"TMERC";
+  projection.geoProj = std::make_unique<orx::cs::projmath::TUTMProj>(ellipsoid.a, ellipsoid.second,
+                                                                     0.0, 0.993, 1.1e-8, 0.0, 0.0);
+  EXPECT_EQ(fleet.support.AddProjectionToGFF(projection), kSuccess);
+  EXPECT_TRUE(HoldsProjection(LoadTree(fleet.projections), 1));
+}
+
+TEST_F(Retry, MergesTheEntryThatTheDiskDidNotTakeMeanwhile) {
+  ASSERT_TRUE(fleet.Ingest(1, "OTHER"));
+  ASSERT_TRUE(fleet.Ingest(0));
+  // Between obtaining the tree, for which its lock is taken once, and merging into it.
+  watched = {RTCMDataSupport::GFFDatumFile->GetMutex().native_handle(), 2, [&] {
+               const FileFaults full(Fault::kFull, 0);
+               EXPECT_FALSE(fleet.Ingest(1));
+             }};
+  EXPECT_TRUE(fleet.Merge(fleet.directory + L"OTHER.dff"));
+  EXPECT_FALSE(watched.work) << "it was done";
+  EXPECT_TRUE(HoldsDatum(LoadTree(fleet.datums), 1));
 }
 
 TEST(NextSave, MakesTheNameDurableThatSomebodyElseGave) {

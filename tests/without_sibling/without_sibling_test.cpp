@@ -10,8 +10,6 @@
 namespace orx::cs::velta {
 namespace {
 
-constexpr auto kNotLoadable = static_cast<ResultCode>(0x8007000B);
-
 class WithoutSiblingTest : public testing::Test {
  protected:
   WithoutSiblingTest() { std::filesystem::remove(SIBLING_FILE); }
@@ -37,12 +35,25 @@ TEST_F(WithoutSiblingTest, AbsentLibraryIsReportedByTheFirstUse) {
 
 TEST_F(WithoutSiblingTest, FileThatIsNoLibraryGivesTheLoadersStatus) {
   std::ofstream(SIBLING_FILE) << "no library";
-  EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(L"x.dff", &file_), kNotLoadable);
-  EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrProjectionGFF(L"x.prj", &file_), kNotLoadable);
+  EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(L"x.dff", &file_), kSiblingNotLoadable);
+  EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrProjectionGFF(L"x.prj", &file_), kSiblingNotLoadable);
   EXPECT_FALSE(RTCMDataSupport::DLLdatum || RTCMDataSupport::DLLprojection);
   // Once the half-loaded library is held, it is the entry point that is missing.
   const RTCMDataSupport support;
-  ExpectOfBothKinds(kNotLoadable, kNoSiblingLibrary);
+  ExpectOfBothKinds(kSiblingNotLoadable, kNoSiblingLibrary);
+}
+
+TEST_F(WithoutSiblingTest, LibraryThatHandsOutNoTreeIsTroubleOfItsKind) {
+  std::filesystem::copy_file(EMPTY_HANDED_FILE, SIBLING_FILE);
+  RTCMDataSupport support(L"./", L"./");
+  Rtcm1021 datum;
+  datum.targetName = "D";
+  Rtcm1025 projection;
+  projection.projectionType = ProjectionData::TM;
+  EXPECT_EQ(support.ParseDatumMessages(datum, nullptr), kDatumFileTrouble);
+  EXPECT_EQ(support.ParseProjectionMessages(projection, nullptr), kProjectionFileTrouble);
+  EXPECT_EQ(RTCMDataSupport::MergeRTCMDatumfiles(L"D.dff", L"D.dff"), kDatumFileTrouble);
+  EXPECT_EQ(RTCMDataSupport::MergeRTCMProjectionfiles(L"D.prj", L"D.prj"), kProjectionFileTrouble);
 }
 
 TEST_F(WithoutSiblingTest, LibraryWithoutTheEntryPointsIsNoSibling) {

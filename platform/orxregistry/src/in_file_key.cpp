@@ -70,9 +70,15 @@ bool TInFileKey::Save(const COrxStringT<wchar_t>& fileName, bool /*flag*/,
 
 bool TInFileKey::HasUnsavedChanges() const { return tree_->has_unsaved(); }
 
-void TInFileKey::ForgetChanges() {
-  tree_->MarkSaved();
-  tree_->position.stamp = os::FileStamp();
+void TInFileKey::ForgetChanges() noexcept {
+  try {
+    Reload();
+  } catch (...) {
+    // Nobody may be told that what the tree shows is there, or save it.
+    tree_->MarkSaved();
+    tree_->error = kCannotBeOpened;
+    tree_->position.stamp = os::FileStamp();
+  }
 }
 
 bool TInFileKey::HasFileChanged() const {

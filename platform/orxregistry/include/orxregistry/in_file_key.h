@@ -75,15 +75,14 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
 
   /// True when the tree has changes that no save has made durable.
   bool HasUnsavedChanges() const;
-  /// Gives up what is not saved. The tree shows it until it is read again, but no save to its file
-  /// writes it.
-  void ForgetChanges();
+  /// Reads the file again, forgetting unsaved changes. Keys obtained before keep the old tree.
+  void Reload();
+  /// As Reload(). When the file cannot be read now, the tree is kCannotBeOpened until a Reload().
+  void ForgetChanges() noexcept;
 
  protected:
   /// True when the file is not, or no longer, what was read or saved last.
   bool HasFileChanged() const;
-  /// Reads the file again, forgetting unsaved changes. Keys obtained before keep the old tree.
-  void Reload();
 
  private:
   bool SaveNew(const std::filesystem::path& path);
