@@ -15,10 +15,21 @@ namespace {
 
 /// Allocations until one fails; negative: none does.
 long allocationsLeft = -1;
+/// Allocations that have not been given back.
+long allocated = 0;
 
 bool RunsOut() { return allocationsLeft >= 0 && allocationsLeft-- == 0; }
 
-void* Allocate(std::size_t size) { return RunsOut() ? nullptr : std::malloc(size == 0 ? 1 : size); }
+void* Allocate(std::size_t size) {
+  if (RunsOut()) return nullptr;
+  ++allocated;
+  return std::malloc(size == 0 ? 1 : size);
+}
+
+void GiveBack(void* memory) {
+  if (memory) --allocated;
+  std::free(memory);
+}
 
 void* AllocateOrThrow(std::size_t size) {
   void* const memory = Allocate(size);
@@ -34,8 +45,8 @@ EXPORTED void* operator new(std::size_t size) { return AllocateOrThrow(size); }
 EXPORTED void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
   return Allocate(size);
 }
-EXPORTED void operator delete(void* memory) noexcept { std::free(memory); }
-EXPORTED void operator delete(void* memory, std::size_t) noexcept { std::free(memory); }
+EXPORTED void operator delete(void* memory) noexcept { GiveBack(memory); }
+EXPORTED void operator delete(void* memory, std::size_t) noexcept { GiveBack(memory); }
 /// Files are read into such memory.
 extern "C" EXPORTED void* aligned_alloc(std::size_t alignment, std::size_t size) noexcept {
   static auto* const real =
@@ -122,6 +133,16 @@ TEST_P(OutOfMemory, IsReportedAndLeavesNothingHalf) {
     if (shared) fleet.support.ReleasePtrDatumGFF(fleet.datums);
   }
   EXPECT_GT(exceptions, minimum);
+}
+
+TEST(Sibling, KeepsNothingOfANameThatNoFileHas) {
+  const TemporaryDirectory directory;
+  Fleet fleet((directory / "").wstring());
+  ASSERT_TRUE(fleet.Ingest(0));
+  orx::TCSInFileKey* file = nullptr;
+  const long before = allocated;
+  EXPECT_NE(RTCMDataSupport::GetUnlockedPtrDatumGFF(fleet.directory + L"none.dff", &file), 0);
+  EXPECT_EQ(allocated, before);
 }
 
 INSTANTIATE_TEST_SUITE_P(In, OutOfMemory,

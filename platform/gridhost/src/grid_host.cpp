@@ -53,18 +53,19 @@ struct NameOrder {
   }
 };
 
-/// The table of shared files, by whole names and by the names that were asked for.
+/// The table of shared files. A name that no file has leaves nothing in it.
 class SharedFiles {
  public:
-  /// Counts a user, also when the file cannot be had, but not when an exception passes.
+  /// Counts a user, but not when there is no such file or an exception passes.
   std::int32_t Get(const wchar_t* name, orx::TCSInFileKey** file) {
     *file = nullptr;
-    SharedFile& shared = Find(name);
-    const boost::unique_lock<boost::recursive_mutex> lock(shared.GetMutex());
-    shared.Refresh(ChangeUsers(shared, 0) > 0);
-    ChangeUsers(shared, 1);
-    if (shared.GetErrorState() == orx::kCannotBeOpened) return kNoFile;
-    *file = &shared;
+    SharedFile* const shared = Find(name);
+    if (!shared) return kNoFile;
+    const boost::unique_lock<boost::recursive_mutex> lock(shared->GetMutex());
+    shared->Refresh(IsInUse(*shared));
+    if (shared->GetErrorState() == orx::kCannotBeOpened) return kNoFile;
+    AddUser(name, *shared);
+    *file = shared;
     return kSuccess;
   }
 
@@ -72,27 +73,38 @@ class SharedFiles {
   /// nor the file system, as it must work when memory is out.
   void Reset(const wchar_t* name) {
     const std::lock_guard<std::mutex> lock(mutex_);
-    const auto entry = files_.find(std::wstring_view(name));
-    if (entry != files_.end() && entry->second->users > 0) --entry->second->users;
+    const auto found = names_.find(std::wstring_view(name));
+    if (found == names_.end()) return;
+    SharedFile* const file = found->second;
+    if (--file->users > 0) return;
+    std::erase_if(names_, [file](const auto& named) { return named.second == file; });
   }
 
  private:
-  SharedFile& Find(const wchar_t* name) {
+  /// \return null when there is no such file
+  SharedFile* Find(const wchar_t* name) {
     const std::wstring whole = orx::ToWholeName(name);
     const std::lock_guard<std::mutex> lock(mutex_);
     const auto found = files_.find(whole);
-    const auto file = found == files_.end() ? std::make_shared<SharedFile>(whole) : found->second;
-    files_.insert_or_assign(whole, file);
-    files_.insert_or_assign(name, file);
-    return *file;
+    if (found != files_.end()) return found->second.get();
+    auto file = std::make_unique<SharedFile>(whole);
+    if (file->GetErrorState() == orx::kCannotBeOpened) return nullptr;
+    return files_.emplace(whole, std::move(file)).first->second.get();
   }
-  int ChangeUsers(SharedFile& shared, int by) {
+  bool IsInUse(const SharedFile& shared) {
     const std::lock_guard<std::mutex> lock(mutex_);
-    return shared.users += by;
+    return shared.users > 0;
+  }
+  void AddUser(const wchar_t* name, SharedFile& shared) {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    names_.try_emplace(name, &shared);
+    ++shared.users;
   }
 
   std::mutex mutex_;
-  std::map<std::wstring, std::shared_ptr<SharedFile>, NameOrder> files_;
+  std::map<std::wstring, std::unique_ptr<SharedFile>, NameOrder> files_;  ///< by whole names
+  /// The files in use by the names that they were asked for.
+  std::map<std::wstring, SharedFile*, NameOrder> names_;
 };
 
 SharedFiles& Files() {
