@@ -1,7 +1,6 @@
 #include "ingest/datum_conversion.h"
 
 #include <algorithm>
-#include <cwctype>
 #include <iterator>
 #include <string>
 
@@ -29,8 +28,8 @@ projmath::Ellipsoid EllipsoidOf(std::uint32_t addA, std::uint32_t addB) {
 
 COrxStringT<wchar_t> CleanDatumName(const COrxStringT<char>& targetName) {
   COrxStringT<wchar_t> name = Widen(targetName);
-  const auto isForeign = [](wchar_t c) { return std::iswalnum(static_cast<std::wint_t>(c)) == 0; };
-  std::replace_if(name.begin(), name.end(), isForeign, L'_');
+  std::replace_if(
+      name.begin(), name.end(), [](wchar_t c) { return !IsLetterOrDigit(c); }, L'_');
   name.erase(std::unique(name.begin(), name.end()), name.end());
   return name;
 }

@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
+#include <cwctype>
 #include <future>
 #include <limits>
 #include <numbers>
@@ -12,6 +13,23 @@
 #include "projmath/rect_rgn.h"
 #include "registry_fixture.h"
 #include "userdirs/user_dirs.h"
+
+#ifndef _WIN32
+#include <pwd.h>
+#include <unistd.h>
+#endif
+
+#ifndef _WIN32
+namespace {
+bool isTurkish = false;
+}  // namespace
+
+/// In the place of the C library's, for the libraries too.
+extern "C" __attribute__((visibility("default"))) std::wint_t towlower(std::wint_t c) noexcept {
+  if (isTurkish && c == L'I') return 0x131;  // without its dot
+  return c >= L'A' && c <= L'Z' ? c - L'A' + L'a' : c;
+}
+#endif
 
 namespace velta_test {
 namespace {
@@ -27,16 +45,82 @@ TEST(OrxString, KeepsEveryCharacterThatTheOtherFormHas) {
   EXPECT_FALSE(orx::EqualsIgnoringCase(L"DHDN", L"DHDN "));
 }
 
+TEST(OrxString, KnowsLettersAndDigitsAsWindowsDoes) {
+  std::wstring found;
+  for (wchar_t c = 0; c < 0x180; ++c) {
+    if (orx::IsLetterOrDigit(c)) found += c;
+  }
+  EXPECT_EQ(found,
+            L"0123456789ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz\u00B2\u00B3\u00B9"
+            L"\u00C0\u00C1\u00C2\u00C3\u00C4\u00C5\u00C6\u00C7\u00C8\u00C9\u00CA\u00CB\u00CC\u00CD"
+            L"\u00CE\u00CF\u00D0\u00D1\u00D2\u00D3\u00D4\u00D5\u00D6\u00D8\u00D9\u00DA\u00DB\u00DC"
+            L"\u00DD\u00DE\u00DF\u00E0\u00E1\u00E2\u00E3\u00E4\u00E5\u00E6\u00E7\u00E8\u00E9\u00EA"
+            L"\u00EB\u00EC\u00ED\u00EE\u00EF\u00F0\u00F1\u00F2\u00F3\u00F4\u00F5\u00F6\u00F8\u00F9"
+            L"\u00FA\u00FB\u00FC\u00FD\u00FE\u00FF");
+}
+
+#ifndef _WIN32
+TEST(OrxString, ComparesLettersOfAsciiAlikeInATurkishLocale) {
+  isTurkish = true;
+  EXPECT_EQ(std::towlower(L'I'), 0x131U) << "what the libraries would get";
+  EXPECT_TRUE(orx::EqualsIgnoringCase(L"CASSINI", L"cassini"));
+  isTurkish = false;
+}
+#endif
+
 constexpr char8_t kAnyLanguage[] = u8"g\u00E9\u4E2D \U0001F4CD";
 constexpr bool kIsWindows = std::filesystem::path::preferred_separator == '\\';
 
-TEST(UserDirs, TheVariableReplacesTheDirectoryWhole) {
-  static char set[] = "ORX_USER_GEO_DIR=/geo/data/", empty[] = "ORX_USER_GEO_DIR=";
-  putenv(set);
-  EXPECT_EQ(orx::GetUserGeoDir(), L"/geo/data");
-  putenv(empty);
+/// The directory with an environment of the test's own, or the error that there is none.
+class UserDirs : public ::testing::Test {
+ protected:
+  static std::string Directory() try {
+    return orx::ToUtf8(orx::GetUserGeoDir());
+  } catch (const std::runtime_error& error) {
+    return error.what();
+  }
+  static void Set(const std::string& name, const std::string& value) {
+#ifdef _WIN32
+    _putenv_s(name.c_str(), value.c_str());
+#else
+    setenv(name.c_str(), value.c_str(), 1);
+#endif
+  }
+  ~UserDirs() override { Set("ORX_USER_GEO_DIR", ""); }
+};
+
+TEST_F(UserDirs, TheVariableReplacesTheDirectoryWhole) {
   EXPECT_TRUE(orx::GetUserGeoDir().ends_with(L"orx/geodata"));
+  Set("ORX_USER_GEO_DIR", "/geo/data/");
+  EXPECT_EQ(Directory(), "/geo/data");
 }
+
+#ifdef _WIN32
+TEST_F(UserDirs, WithoutAnyItIsAnErrorThatNamesTheVariable) {
+  const std::string error = "LOCALAPPDATA names no directory; set it or ORX_USER_GEO_DIR";
+  for (const char* const none : {"", "relative"}) {
+    Set("LOCALAPPDATA", none);
+    EXPECT_EQ(Directory(), error);
+  }
+}
+#else
+TEST_F(UserDirs, WithoutHomeItIsThatOfThePasswordDatabase) {
+  const std::string known = getpwuid(getuid())->pw_dir;
+  for (const char* const none : {"", "relative"}) {
+    Set("HOME", none);
+    Set("XDG_DATA_HOME", none);
+    EXPECT_EQ(Directory(), known + "/.local/share/orx/geodata");
+  }
+}
+
+TEST_F(UserDirs, NameThatIsNoTextIsAnErrorThatNamesTheVariable) {
+  Set("HOME", "/home/\xFF");
+  Set("XDG_DATA_HOME", "");
+  EXPECT_EQ(Directory(), "HOME is not UTF-8; set ORX_USER_GEO_DIR");
+  Set("XDG_DATA_HOME", "/data/\xFF");
+  EXPECT_EQ(Directory(), "XDG_DATA_HOME is not UTF-8; set ORX_USER_GEO_DIR");
+}
+#endif
 
 /// The sibling library, called as the library does.
 class GridHost : public ::testing::Test {

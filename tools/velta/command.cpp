@@ -20,7 +20,7 @@ std::string Describe(orx::cs::velta::ResultCode code) {
   for (const auto& [known, meaning] : orx::cs::velta::kResultMeanings) {
     if (known == code) return CodeText(code) + " " + meaning;
   }
-  return CodeText(code) + " RTCMGridHost: the file does not exist, or could not be made or opened";
+  return CodeText(code) + " a code of RTCMGridHost or of the system";
 }
 
 }  // namespace velta_tool

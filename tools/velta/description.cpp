@@ -5,7 +5,7 @@
 #include <span>
 #include <string_view>
 
-#include "text.h"
+#include "orxutils/orx_string.h"
 #include "velta/projection_data.h"
 
 namespace velta_tool {
@@ -150,8 +150,8 @@ Edges::Edges(std::span<const double> area)
 Description Describe(const DatumData& datum) {
   const std::span<const double> parameters(datum.parameters);
   Description description = {
-      {"source system", "sourceSystem", ToUtf8(datum.sourceDatumName)},
-      {"target system", "targetSystem", ToUtf8(datum.targetDatumName)},
+      {"source system", "sourceSystem", orx::ToUtf8(datum.sourceDatumName)},
+      {"target system", "targetSystem", orx::ToUtf8(datum.targetDatumName)},
       {"computation indicator", "computationIndicator", datum.computationIndicator},
       {"method", "method", MethodName(datum.computationIndicator)},
       {"height indicator", "heightIndicator", static_cast<std::int32_t>(datum.heightIndicator)},

@@ -14,7 +14,7 @@
 #include "orxregistry/bin_value.h"
 #include "orxregistry/in_file_key.h"
 #include "orxregistry/registry_key.h"
-#include "text.h"
+#include "orxutils/orx_string.h"
 
 namespace velta_tool {
 namespace {
@@ -70,7 +70,7 @@ void AddPlainValue(const TGenericRegistryKey& key, const std::wstring& name,
                    std::span<const std::uint8_t> bytes, ordered_json& json) {
   const std::uint32_t type = key.GetValueType(name);
   if (type == orx::kWideString) {
-    json["value"] = ToUtf8(orx::GetRegValue(key, name, std::wstring(), 0));
+    json["value"] = orx::ToUtf8(orx::GetRegValue(key, name, std::wstring(), 0));
     return;
   }
   if (key.GetValueDim(name) != 1 || bytes.empty() || bytes.size() > sizeof(std::uint64_t)) return;
@@ -83,7 +83,7 @@ ordered_json ValueJson(const TGenericRegistryKey& key, const std::wstring& name)
   const bool readable = key.GetValue(name, value, 0, false);
   const std::uint32_t size = key.GetValueSize(name);
   const std::span bytes(static_cast<const std::uint8_t*>(value.GetRawData()), readable ? size : 0);
-  ordered_json json = {{"name", ToUtf8(name)},
+  ordered_json json = {{"name", orx::ToUtf8(name)},
                        {"type", key.GetValueType(name)},
                        {"size", size},
                        {"dimension", key.GetValueDim(name)},
@@ -95,7 +95,7 @@ ordered_json ValueJson(const TGenericRegistryKey& key, const std::wstring& name)
 /// Writes a key with everything below it; a value takes one line.
 void WriteKey(const TGenericRegistryKey& key, const std::string& indent, Output& out) {
   std::string& text = out.pending();
-  text += indent + "{\"name\": " + ordered_json(ToUtf8(key.GetName())).dump() +
+  text += indent + "{\"name\": " + ordered_json(orx::ToUtf8(key.GetName())).dump() +
           ", \"dimension\": " + std::to_string(key.GetKeyDim()) + ", \"values\": [";
   std::string separator = "\n";
   for (const std::wstring& name : key.GetValueNames()) {

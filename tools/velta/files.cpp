@@ -11,7 +11,6 @@
 #include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
 #include "orxutils/path.h"
-#include "text.h"
 
 namespace velta_tool {
 namespace fs = std::filesystem;
@@ -36,7 +35,7 @@ CLI::Validator KindCheck(const std::string& extensions, bool (*accepts)(FileKind
 }  // namespace
 
 std::wstring ToWide(const std::string& argument) {
-  std::optional<std::wstring> wide = FromUtf8(argument);
+  std::optional<std::wstring> wide = orx::FromUtf8(argument);
   if (!wide) throw std::runtime_error(argument + ": the name is not UTF-8");
   return *std::move(wide);
 }

@@ -13,10 +13,10 @@
 #include "command.h"
 #include "description.h"
 #include "files.h"
+#include "orxutils/orx_string.h"
 #include "rtcm3/codec.h"
 #include "rtcm3/json_lines.h"
 #include "rtcm3/message.h"
-#include "text.h"
 #include "velta/rtcm_generator.h"
 
 namespace velta_tool {
@@ -66,7 +66,7 @@ std::runtime_error NoAreaError(const Options& options, const RTCMGenerator& gene
     const Edges area(datums[i].validityArea);
     text += "\n  latitude " + Decimal(area.south) + " to " + Decimal(area.north) + ", longitude " +
             Decimal(area.west) + " to " + Decimal(area.east) + " degrees (" +
-            ToUtf8(datums[i].targetDatumName) + ")";
+            orx::ToUtf8(datums[i].targetDatumName) + ")";
   }
   if (datums.size() > kMostAreasNamed) {
     text += "\n  and " + std::to_string(datums.size() - kMostAreasNamed) + " more";

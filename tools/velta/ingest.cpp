@@ -17,10 +17,10 @@
 #include "files.h"
 #include "ingest_report.h"
 #include "message_set.h"
+#include "orxutils/orx_string.h"
 #include "orxutils/path.h"
 #include "rtcm3/message_reader.h"
 #include "terminal.h"
-#include "text.h"
 #include "velta/rtcm_data_support.h"
 
 namespace velta_tool {
@@ -89,8 +89,8 @@ class Ingestion {
   explicit Ingestion(const Options& options)
       : fresh_(MakeSupport(options)),
         support_(MakeSupport(options)),
-        datumFiles_(ToPath(ToUtf8(support_->GetDatumPath()))),
-        projectionFiles_(ToPath(ToUtf8(support_->GetProjectionPath()))),
+        datumFiles_(ToPath(orx::ToUtf8(support_->GetDatumPath()))),
+        projectionFiles_(ToPath(orx::ToUtf8(support_->GetProjectionPath()))),
         report_(options.json, out_) {}
 
   void Read(const std::string& file) {
@@ -158,11 +158,12 @@ class Ingestion {
 
   std::vector<IngestedPart> PartsOf(const MessageSet& set) {
     const std::wstring name = support_->GetTargetDatumName();
-    const fs::path datum = ToPath(ToUtf8(support_->GetDatumPath() + name + L".dff"));
+    const fs::path datum = ToPath(orx::ToUtf8(support_->GetDatumPath() + name + L".dff"));
     std::vector<IngestedPart> parts = {
         {Used(set, {1021, 1022, 1023}), ToName(datum.filename()), datumFiles_.Changed(datum)}};
     if (set.Announces(1025) || set.Announces(1027)) {
-      const fs::path projection = ToPath(ToUtf8(support_->GetProjectionPath() + name + L".prj"));
+      const fs::path projection =
+          ToPath(orx::ToUtf8(support_->GetProjectionPath() + name + L".prj"));
       parts.push_back({Used(set, {1024, 1025, 1027}), ToName(projection.filename()),
                        projectionFiles_.Changed(projection)});
     }

@@ -1,9 +1,11 @@
 #include "orxutils/orx_string.h"
 
 #include <algorithm>
+#include <boost/locale/encoding_utf.hpp>
 #include <cwctype>
 
 namespace orx {
+namespace conv = boost::locale::conv;
 namespace {
 
 constexpr char32_t kReplacement = 0xFFFD;
@@ -12,6 +14,15 @@ constexpr char32_t kFirstSupplementary = 0x10000;
 
 constexpr bool IsHighSurrogate(char32_t unit) { return unit >= 0xD800 && unit <= 0xDBFF; }
 constexpr bool IsLowSurrogate(char32_t unit) { return unit >= 0xDC00 && unit <= 0xDFFF; }
+
+constexpr bool IsIn(char32_t c, char32_t first, char32_t last) { return c >= first && c <= last; }
+
+/// In a Turkish locale the C library's small letter of "I" is another than "i".
+wchar_t ToLower(wchar_t c) {
+  if (IsIn(static_cast<char32_t>(c), U'A', U'Z')) return static_cast<wchar_t>(c - L'A' + L'a');
+  const bool isAscii = static_cast<char32_t>(c) < 0x80;
+  return isAscii ? c : static_cast<wchar_t>(std::towlower(static_cast<std::wint_t>(c)));
+}
 
 }  // namespace
 
@@ -62,10 +73,28 @@ COrxStringT<wchar_t> FromUtf16(std::u16string_view text) {
   return wide;
 }
 
+std::string ToUtf8(std::wstring_view text) {
+  return conv::utf_to_utf<char>(text.data(), text.data() + text.size(), conv::skip);
+}
+
+std::optional<COrxStringT<wchar_t>> FromUtf8(std::string_view text) {
+  try {
+    return conv::utf_to_utf<wchar_t>(text.data(), text.data() + text.size(), conv::stop);
+  } catch (const conv::conversion_error&) {
+    return std::nullopt;
+  }
+}
+
+bool IsLetterOrDigit(wchar_t c) {
+  const auto point = static_cast<char32_t>(c);
+  if (IsIn(point, U'0', U'9') || IsIn(point, U'A', U'Z') || IsIn(point, U'a', U'z')) return true;
+  if (point == 0xB2 || point == 0xB3 || point == 0xB9) return true;
+  return IsIn(point, 0xC0, 0xFF) && point != 0xD7 && point != 0xF7;
+}
+
 bool EqualsIgnoringCase(std::wstring_view a, std::wstring_view b) {
-  return std::equal(a.begin(), a.end(), b.begin(), b.end(), [](wchar_t x, wchar_t y) {
-    return std::towlower(static_cast<wint_t>(x)) == std::towlower(static_cast<wint_t>(y));
-  });
+  return std::equal(a.begin(), a.end(), b.begin(), b.end(),
+                    [](wchar_t x, wchar_t y) { return ToLower(x) == ToLower(y); });
 }
 
 }  // namespace orx

@@ -1,44 +1,38 @@
 #include "userdirs/user_dirs.h"
 
-#include <cstdlib>
 #include <filesystem>
+#include <stdexcept>
 
+#include "environment.h"
 #include "orxutils/path.h"
 
 namespace orx {
 namespace {
 
-#ifdef _WIN32
-using NativeString = COrxStringT<wchar_t>;
-NativeString Variable(const wchar_t* name) {
-  const wchar_t* const value = _wgetenv(name);
-  return value ? value : NativeString();
+constexpr const char* kReplacement = "ORX_USER_GEO_DIR";
+
+/// \throws std::runtime_error when the directory has no name in wide text
+COrxStringT<wchar_t> NameOf(const Directory& directory) {
+  if (!IsText(directory.path)) {
+    throw std::runtime_error(directory.source + " is not UTF-8; set " + kReplacement);
+  }
+  COrxStringT<wchar_t> name = ToName(directory.path);
+  while (name.size() > 1 && (name.back() == L'/' || name.back() == L'\\')) name.pop_back();
+  return name;
 }
-NativeString BaseDirectory() { return Variable(L"LOCALAPPDATA"); }
-#define NATIVE(text) L##text
-#else
-using NativeString = COrxStringT<char>;
-NativeString Variable(const char* name) {
-  const char* const value = std::getenv(name);
-  return value ? value : NativeString();
-}
-NativeString BaseDirectory() {
-  const NativeString data = Variable("XDG_DATA_HOME");
-  return data.empty() ? Variable("HOME") + "/.local/share" : data;
-}
-#define NATIVE(text) text
-#endif
 
 }  // namespace
 
 COrxStringT<wchar_t> GetUserGeoDir() {
-  const NativeString replacement = Variable(NATIVE("ORX_USER_GEO_DIR"));
-  const std::filesystem::path directory =
-      replacement.empty() ? std::filesystem::path(BaseDirectory()) / "orx/geodata"
-                          : std::filesystem::path(replacement);
-  COrxStringT<wchar_t> name = ToName(directory);
-  while (name.size() > 1 && (name.back() == L'/' || name.back() == L'\\')) name.pop_back();
-  return name;
+  const std::filesystem::path replacement = Variable(kReplacement);
+  if (!replacement.empty()) return NameOf({kReplacement, replacement});
+  Directory data = DataDirectory();
+  // Below the working directory nobody would look for it.
+  if (!data.path.is_absolute()) {
+    throw std::runtime_error(data.source + " names no directory; set it or " + kReplacement);
+  }
+  data.path /= "orx/geodata";
+  return NameOf(data);
 }
 
 }  // namespace orx

@@ -9,7 +9,6 @@
 
 #include "orxutils/orx_string.h"
 #include "rtcm3/fields.h"
-#include "text.h"
 
 namespace velta_tool::rtcm3 {
 namespace {
@@ -28,7 +27,7 @@ class JsonWriter {
 
   void Text(const char* name, const std::string& text, std::uint32_t) {
     Name(name);
-    out_ += json(ToUtf8(orx::Widen(text))).dump();
+    out_ += json(orx::ToUtf8(orx::Widen(text))).dump();
   }
 
   template <class... Columns>
@@ -96,7 +95,7 @@ class JsonReader {
   void Text(const char* name, std::string& text, std::uint32_t& counter) {
     const json value = Take(name);
     if (!value.is_string()) throw TextError(name);
-    const std::optional<std::wstring> wide = FromUtf8(value.get_ref<const std::string&>());
+    const std::optional<std::wstring> wide = orx::FromUtf8(value.get_ref<const std::string&>());
     if (!wide || wide->size() > kMaxTextLength) throw TextError(name);
     for (const wchar_t c : *wide) {
       if (static_cast<char32_t>(c) > 0xFF) throw TextError(name);
