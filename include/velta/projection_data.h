@@ -40,6 +40,8 @@ struct ProjectionData {
 
   ProjectionData() = default;
   ProjectionData(const ProjectionData&) = delete;
+  /// Leaves the other without a projection object.
+  ProjectionData(ProjectionData&&) noexcept = default;
   ~ProjectionData() = default;
 
   /// Copies `rtcmProjName`, `table` and the projection's state; a target without a projection

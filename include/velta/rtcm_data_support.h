@@ -20,16 +20,24 @@ namespace orx::cs::velta {
 /// Turns received transformation messages into entries of the shared RTCM datum and projection
 /// files. A projection belongs to the datum that the same object ingested before it.
 ///
-/// Construction, destruction and ingestion must not run in two threads at the same time; the
-/// shared files themselves are guarded by their own mutexes.
+/// What a set does not bring stays as the object has it: a datum without a 1023 keeps the residual
+/// grid of the object's last datum, a 1021 the rotation point of its last 1022, and both are written
+/// into the entry. Who wants neither assigns an object that has never ingested (`support = fresh`)
+/// before each set.
+///
+/// Construction, destruction and ingestion must not run in two threads at the same time, nor a
+/// merge beside construction or destruction; the shared files themselves are guarded by their own
+/// mutexes.
 class RTCMDataSupport {
  public:
   /// Loads the sibling library if it can; makes no directory.
   /// \param datumDirectory directory of the datum files, ending in a separator; taken as it is.
   ///     Null: the user's geodetic directory and "/datums/rtcmdata/".
   /// \param projectionDirectory the same for projection files; null: "/projections/rtcmdata/"
-  VELTA_EXPORT explicit RTCMDataSupport(const wchar_t* datumDirectory = nullptr,
-                                        const wchar_t* projectionDirectory = nullptr);
+  /// \throws std::runtime_error when a directory is null and the user's has no name; the text names
+  ///     the environment variable
+  VELTA_EXPORT RTCMDataSupport(const wchar_t* datumDirectory = nullptr,
+                               const wchar_t* projectionDirectory = nullptr);
 
   RTCMDataSupport(const RTCMDataSupport&) = delete;
 
@@ -45,9 +53,10 @@ class RTCMDataSupport {
   VELTA_EXPORT static TDLLFuncWrapper DLLdatum;
   /// Loader of the sibling library for projection files; empty until first loaded.
   VELTA_EXPORT static TDLLFuncWrapper DLLprojection;
-  /// Shared datum file worked on last; owned by the sibling library.
+  /// Shared datum file worked on last; owned by the sibling library. Points nowhere once that has
+  /// been unloaded, which the end of any object does.
   VELTA_EXPORT static TCSInFileKey* GFFDatumFile;
-  /// Shared projection file worked on last; owned by the sibling library.
+  /// As GFFDatumFile, for the projection file worked on last.
   VELTA_EXPORT static TCSInFileKey* GFFProjectionFile;
 
   /// Loads the sibling library for datum files if it is not loaded.
@@ -99,7 +108,8 @@ class RTCMDataSupport {
   VELTA_EXPORT bool GetCustomProjectionData(CustomProjectionData& summary);
 
   /// Ingests a message set: its datum message, then the projection that its flags ask for. The
-  /// set's pointers and flags are kept; the records are only read during the call.
+  /// set's pointers and flags are kept; the records are only read during the call. When one of the
+  /// projection messages that the flags ask for is missing, neither is taken.
   /// \return 0, kNoDatumMessage, kMissing1023, kNoDatumName, kMissingProjectionPart, or a code of
   ///     ParseDatumMessages or ParseProjectionMessages
   VELTA_EXPORT ResultCode ParseRTCMMEssages(MsgUtilized& messages);
@@ -144,7 +154,8 @@ class RTCMDataSupport {
 
   /// Copies every entry of the datum file `source` into the shared datum file `target` and saves
   /// it. An entry that both hold gets the source's values; nothing is deleted. Holds the target's
-  /// mutex meanwhile, and gives the target back whatever the outcome.
+  /// mutex meanwhile, and gives the target back whatever the outcome. While an object is there, other
+  /// threads may ingest and merge meanwhile, but neither make nor end one.
   /// \return 0, kDatumFileTrouble, kNoSiblingLibrary, the loader's status, or the sibling
   ///     library's code
   VELTA_EXPORT static ResultCode MergeRTCMDatumfiles(const COrxStringT<wchar_t>& target,

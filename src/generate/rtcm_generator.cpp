@@ -1,5 +1,7 @@
 #include "velta/rtcm_generator.h"
 
+#include <utility>
+
 #include "generate/stored_entries.h"
 #include "records/projection_types.h"
 #include "store/gff_layout.h"
@@ -55,8 +57,10 @@ std::vector<DatumData, orx_dl_allocator<DatumData>> RTCMGenerator::getAllDatums(
   const TGenericRegistryKey container = OpenContainer(datumFile);
   datums.reserve(CountEntries(container));
   for (TGenRegKeyIterator walk(container); walk;) {
-    datums.emplace_back();
-    if (!ReadDatum(container, TGenericRegistryKey(walk++), datums.back())) datums.pop_back();
+    DatumData datum;
+    if (ReadDatum(container, TGenericRegistryKey(walk++), datum)) {
+      datums.push_back(std::move(datum));
+    }
   }
   return datums;
 }

@@ -44,16 +44,14 @@ ResultCode RTCMDataSupport::ParseRTCMMEssages(MsgUtilized& messages) {
   if (!isNamed) return kNoDatumName;
 
   // A projection is named after the datum that has just been ingested.
+  if (!info.use1025 && !info.use1027) return result;
+  // All of them are there before the first is taken.
+  if (info.use1024 && !messages.msg1024) return kMissingProjectionPart;
+  if (info.use1025 && !messages.msg1025) return kMissingProjectionPart;
+  if (info.use1027 && !messages.msg1027) return kMissingProjectionPart;
   const Rtcm1024* const planeGrid = info.use1024 ? messages.msg1024 : nullptr;
-  const bool lacksGrid = info.use1024 && !planeGrid;
-  if (info.use1025) {
-    if (lacksGrid || !messages.msg1025) return kMissingProjectionPart;
-    result = ParseProjectionMessages(*messages.msg1025, planeGrid);
-  }
-  if (info.use1027) {
-    if (lacksGrid || !messages.msg1027) return kMissingProjectionPart;
-    result = ParseProjectionMessages(*messages.msg1027, planeGrid);
-  }
+  if (info.use1025) result = ParseProjectionMessages(*messages.msg1025, planeGrid);
+  if (info.use1027) result = ParseProjectionMessages(*messages.msg1027, planeGrid);
   return result;
 }
 

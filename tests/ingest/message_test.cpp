@@ -30,7 +30,7 @@ TEST_F(MessageSetTest, IsCheckedAndTakenInOrder) {
        [](All& m) {
          m.info = {true, true}, m.msg1024 = nullptr;
        }},
-      {kMissingProjectionPart, "dp..", [](All& m) { m.info.use1027 = true, m.msg1027 = nullptr; }},
+      {kMissingProjectionPart, "d...", [](All& m) { m.info.use1027 = true, m.msg1027 = nullptr; }},
       {kSuccess, "dp..", [&](All& m) { m.info.use1026 = true, m.msg1026 = &ignored; }},
       {kBadComputationIndicator, "....", [&](All& m) { m.msg1021 = &bad; }},
       {kSuccess, "..dp", [&](All& m) { m.msg1021 = &bad, m.msg1022 = &m1022_; }},

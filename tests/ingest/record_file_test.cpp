@@ -71,7 +71,7 @@ TEST_P(RecordFileTest, DirectoryOrFileThatCannotBeUsedIsReported) {
   EXPECT_EQ(IngestEntry(), kNoDirectory);
   std::filesystem::remove(directory);
   std::filesystem::create_directories(path_);
-  EXPECT_EQ(IngestEntry(), kNoSuchFile);
+  EXPECT_EQ(IngestEntry(), kNoSharedFile);
   std::filesystem::remove(path_);
   WriteBytes(path_, "no registry file");
   EXPECT_EQ(IngestEntry(), trouble_);
@@ -112,7 +112,7 @@ TEST_P(RecordFileTest, MergeWithAFileThatCannotBeUsedLeavesTheTargetAlone) {
     EXPECT_EQ(ReadBytes(directory_ / "target"), before) << source;
   }
   EXPECT_EQ(Merge("rootless", "source"), trouble_);
-  EXPECT_EQ(Merge("missing", "source"), kNoSuchFile);
+  EXPECT_EQ(Merge("missing", "source"), kNoSharedFile);
   EXPECT_FALSE(std::filesystem::exists(directory_ / "missing"));
 }
 

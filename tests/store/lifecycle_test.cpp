@@ -49,6 +49,8 @@ TEST_F(LifecycleTest, SummariesFollowTheLastSetAndAnAssignment) {
   ProjectionData projection;
   projection = ProjectionData();
   EXPECT_TRUE(projection.geoProj);
+  const ProjectionData moved(std::move(projection));
+  EXPECT_TRUE(moved.geoProj);
 }
 
 TEST_F(LifecycleTest, OneObjectsEndUnloadsTheSiblingAndTheOtherGoesOn) {

@@ -15,7 +15,6 @@ using namespace orx::cs::velta;
 
 constexpr double kPi = 3.141592653589793;
 constexpr double kHalfSecond = 2.42406840554768e-06;  // radians
-constexpr auto kNoSuchFile = static_cast<ResultCode>(0x80070002);
 
 /// Names of the files that the worked messages become.
 constexpr auto *kDhdn = "AUTO_DHDN_BESEL", *kLocal = "Local_B_O_7";
