@@ -7,13 +7,15 @@ include(CMakePackageConfigHelpers)
 
 set(platform_libraries orxutils userdirs projmath orxregistry)
 set(package_directory ${CMAKE_INSTALL_LIBDIR}/cmake/velta)
-set_target_properties(${platform_libraries} velta RTCMGridHost PROPERTIES INSTALL_RPATH "$ORIGIN")
-set_target_properties(${platform_libraries} velta PROPERTIES
+set(velta_libraries velta velta-rtcm3)
+set_target_properties(${platform_libraries} ${velta_libraries} RTCMGridHost PROPERTIES
+  INSTALL_RPATH "$ORIGIN")
+set_target_properties(${platform_libraries} ${velta_libraries} PROPERTIES
   VERSION ${PROJECT_VERSION}
   SOVERSION ${PROJECT_VERSION_MAJOR})
 
 foreach(export orx velta)
-  set(targets ${export})
+  set(targets ${velta_libraries})
   if(export STREQUAL orx)
     set(targets ${platform_libraries})
   endif()
@@ -32,7 +34,7 @@ install(TARGETS velta-tool EXPORT veltaProgramTargets RUNTIME COMPONENT program)
 install(EXPORT veltaProgramTargets NAMESPACE velta:: DESTINATION ${package_directory}
         COMPONENT program)
 
-install(DIRECTORY include/ TYPE INCLUDE COMPONENT development)
+install(DIRECTORY include/ rtcm3/include/ TYPE INCLUDE COMPONENT development)
 foreach(library ${platform_libraries})
   install(DIRECTORY platform/${library}/include/ TYPE INCLUDE COMPONENT development)
 endforeach()

@@ -1,38 +1,37 @@
-// Puts a received datum into a file and lists what the file holds.
+// Reads an RTCM 3 stream from a file, puts its transformations into datum and projection files, and
+// lists what the last datum's file holds.
 
+#include <fstream>
 #include <iostream>
 
+#include "orxutils/orx_string.h"
+#include "rtcm3/message_reader.h"
+#include "rtcm3/message_sets.h"
 #include "velta/rtcm_data_support.h"
 #include "velta/rtcm_generator.h"
 
-int main() {
+int main(int argc, char** argv) {
   using namespace orx::cs::velta;
+  std::ifstream stream(argc > 1 ? argv[1] : "", std::ios::binary);
 
-  Rtcm1021 datum;  // as a decoder fills it, in the units of the message
-  datum.messageType = 21;
-  datum.systemId = 23;
-  datum.utilizedMsgIndicator = 1;  // a 1023 belongs to it
-  datum.sourceName = "ETRS89";
-  datum.targetName = "DHDN";
-  datum.phiV = 93600;     // 52 degrees, in 2"
-  datum.lambdaV = 16200;  // 9 degrees
-  datum.dPhiV = datum.dLambdaV = 7200;
-  datum.dX = -598100;  // millimetres
-  Rtcm1023 grid;
-  grid.systemId = 23;
-  grid.phi0 = 374400;  // 52 degrees, in 0.5"
-  grid.lambda0 = 64800;
-  grid.dPhi = grid.dLambda = 30;
-
+  const RTCMDataSupport fresh(L"datums/", L"projections/");
   RTCMDataSupport support(L"datums/", L"projections/");
-  MsgUtilized set;
-  set.info = support.GetUtilizedMessageInfo(datum);
-  set.msg1021 = &datum;
-  set.msg1023 = &grid;
-  if (support.ParseRTCMMEssages(set) != kSuccess) return 1;
+  rtcm3::MessageSets sets([&](const rtcm3::MessageSet& set) {
+    support = fresh;  // so that nothing of the last set gets into this one
+    MsgUtilized records = set.Records();
+    const ResultCode result = support.ParseRTCMMEssages(records);
+    std::cout << "system " << records.info.systemId << ": result " << result << '\n';
+    return result == kSuccess;
+  });
 
-  for (const DatumData& entry : RTCMGenerator(23, L"datums/DHDN.dff", L"").getAllDatums()) {
-    std::wcout << entry.sourceDatumName << L" to " << entry.targetDatumName << L": dX "
-               << entry.parameters[0] << L" m\n";
+  rtcm3::StreamCounts counts;
+  rtcm3::MessageReader messages(*stream.rdbuf(), counts);
+  while (const rtcm3::Message* message = messages.Next()) sets.Put(*message);
+  for (const std::string& remark : counts.frames.remarks) std::cout << remark << '\n';
+
+  const std::wstring file = support.GetDatumPath() + support.GetTargetDatumName() + L".dff";
+  for (const DatumData& entry : RTCMGenerator(0, file, L"").getAllDatums()) {
+    std::cout << orx::ToUtf8(entry.sourceDatumName) << " to " << orx::ToUtf8(entry.targetDatumName)
+              << ": dX " << entry.parameters[0] << " m\n";
   }
 }

@@ -5,14 +5,13 @@
 #include <string_view>
 
 #include "rtcm3/codec.h"
-#include "rtcm3/fields.h"
 #include "rtcm3/frame.h"
 #include "rtcm3/json_lines.h"
 
 namespace velta_fuzz {
 namespace {
 
-namespace rtcm3 = velta_tool::rtcm3;
+namespace rtcm3 = orx::cs::velta::rtcm3;
 
 void Try(std::string_view line) {
   constexpr std::size_t kFrameHeader = 3;
@@ -21,9 +20,9 @@ void Try(std::string_view line) {
     const rtcm3::Message message = rtcm3::ParseJsonLine(line);
     std::string frame;
     rtcm3::Encode(message, frame);
-    const auto* const payload = reinterpret_cast<const std::uint8_t*>(frame.data()) + kFrameHeader;
     rtcm3::Message decoded;
-    const auto result = rtcm3::Decode({payload, frame.size() - kFrameOverhead}, decoded);
+    const std::string_view payload(frame.data() + kFrameHeader, frame.size() - kFrameOverhead);
+    const auto result = rtcm3::Decode(payload, decoded);
     std::string written;
     std::string again;
     rtcm3::AppendJsonLine(message, written);

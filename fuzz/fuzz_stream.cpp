@@ -2,17 +2,16 @@
 
 #include <cstdlib>
 #include <cstring>
-#include <map>
 #include <random>
 #include <sstream>
 #include <string>
 #include <vector>
 
-#include "message_set.h"
 #include "rtcm3/codec.h"
 #include "rtcm3/frame.h"
 #include "rtcm3/json_lines.h"
 #include "rtcm3/message_reader.h"
+#include "rtcm3/message_sets.h"
 #include "support/temporary_directory.h"
 #include "velta/rtcm_generator.h"
 
@@ -22,7 +21,7 @@ namespace velta_fuzz {
 namespace {
 
 namespace velta = orx::cs::velta;
-namespace rtcm3 = velta_tool::rtcm3;
+namespace rtcm3 = orx::cs::velta::rtcm3;
 
 void Require(bool holds) {
   if (!holds) std::abort();
@@ -87,24 +86,24 @@ void Ingest(const std::string& stream) {
   const velta_test::TemporaryDirectory directory;
   const std::wstring path = (directory / "").wstring();
   velta::RTCMDataSupport support(path.c_str(), path.c_str());
-  std::map<std::uint32_t, velta_tool::MessageSet> sets;
-  std::stringbuf in(stream);
-  rtcm3::StreamCounts counts;
-  rtcm3::MessageReader reader(in, counts);
-  while (const rtcm3::Message* message = reader.Next()) {
-    Show(*message);
-    const std::uint32_t system = rtcm3::SystemIdOf(*message);
-    velta_tool::MessageSet& set = sets[system];
-    set.Put(*message, support);
-    if (!set.Complete()) continue;
+  unsigned taken = 0;
+  rtcm3::MessageSets sets([&](const rtcm3::MessageSet& set) {
     velta::MsgUtilized records = set.Records();
     const velta::ResultCode result = support.ParseRTCMMEssages(records);
     // Whatever comes over the wire can be refused; a file that does not take it is a fault.
     Require(result != velta::kDatumFileTrouble && result != velta::kProjectionFileTrouble &&
             result != velta::kEntryNotWritten);
     Generate(support);
-    sets.erase(system);
+    return ++taken % 2 == 0;
+  });
+  std::stringbuf in(stream);
+  rtcm3::StreamCounts counts;
+  rtcm3::MessageReader reader(in, counts);
+  while (const rtcm3::Message* message = reader.Next()) {
+    Show(*message);
+    sets.Put(*message);
   }
+  sets.Incomplete();
 }
 
 }  // namespace

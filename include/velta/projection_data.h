@@ -57,6 +57,13 @@ struct ProjectionData {
   }
 };
 
+/// Cassini-Soldner and Mercator have no scale factor among their parameters, all other types of a
+/// 1025 have one.
+/// \param projectionType a type code of ProjectionData::projList
+constexpr bool HasScaleFactor(std::uint32_t projectionType) {
+  return projectionType != ProjectionData::CS && projectionType != ProjectionData::MC;
+}
+
 /// Summary of a projection for the caller's own list of projections.
 struct CustomProjectionData {
   COrxStringT<wchar_t> projectionName;     ///< name that the projection goes by

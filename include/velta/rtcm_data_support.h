@@ -21,9 +21,9 @@ namespace orx::cs::velta {
 /// files. A projection belongs to the datum that the same object ingested before it.
 ///
 /// What a set does not bring stays as the object has it: a datum without a 1023 keeps the residual
-/// grid of the object's last datum, a 1021 the rotation point of its last 1022, and both are written
-/// into the entry. Who wants neither assigns an object that has never ingested (`support = fresh`)
-/// before each set.
+/// grid of the object's last datum, a 1021 the rotation point of its last 1022, and both are
+/// written into the entry. Who wants neither assigns an object that has never ingested (`support =
+/// fresh`) before each set.
 ///
 /// Construction, destruction and ingestion must not run in two threads at the same time, nor a
 /// merge beside construction or destruction; the shared files themselves are guarded by their own
@@ -154,9 +154,9 @@ class RTCMDataSupport {
 
   /// Copies every entry of the datum file `source` into the shared datum file `target` and saves
   /// it. An entry that both hold gets the source's values; nothing is deleted. Holds the target's
-  /// mutex meanwhile, and gives the target back whatever the outcome. While an object is there, other
-  /// threads may ingest and merge meanwhile, but neither make nor end one.
-  /// \return 0, kDatumFileTrouble, kNoSiblingLibrary, the loader's status, or the sibling
+  /// mutex meanwhile, and gives the target back whatever the outcome. While an object is there,
+  /// other threads may ingest and merge meanwhile, but neither make nor end one. \return 0,
+  /// kDatumFileTrouble, kNoSiblingLibrary, the loader's status, or the sibling
   ///     library's code
   VELTA_EXPORT static ResultCode MergeRTCMDatumfiles(const COrxStringT<wchar_t>& target,
                                                      const COrxStringT<wchar_t>& source);

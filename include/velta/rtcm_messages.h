@@ -166,6 +166,19 @@ struct UtilizedMsgInfo {
   std::int32_t systemId = -1;
 };
 
+/// The first message that a datum message can announce; the last is 1027.
+inline constexpr unsigned kFirstAnnounced = 1023;
+
+/// The flags of the messages 1023 to 1027, in this order.
+inline constexpr bool UtilizedMsgInfo::*kMessageFlags[] = {
+    &UtilizedMsgInfo::use1023, &UtilizedMsgInfo::use1024, &UtilizedMsgInfo::use1025,
+    &UtilizedMsgInfo::use1026, &UtilizedMsgInfo::use1027};
+
+/// The bit of a datum message's `utilizedMsgIndicator` that announces a message, 1023 to 1027.
+constexpr std::uint32_t AnnouncementBit(unsigned number) {
+  return std::uint32_t{1} << (number - kFirstAnnounced);
+}
+
 /// The messages received for one transformation. The records stay the caller's; a copy of the
 /// set points at the same records.
 struct MsgUtilized {

@@ -1,25 +1,16 @@
 // From a message set to its datum and its projection.
 
-#include <iterator>
-
 #include "velta/rtcm_data_support.h"
 
 namespace orx::cs::velta {
-namespace {
-
-/// By bit of the utilized message indicator.
-constexpr bool UtilizedMsgInfo::*kFlags[] = {&UtilizedMsgInfo::use1023, &UtilizedMsgInfo::use1024,
-                                             &UtilizedMsgInfo::use1025, &UtilizedMsgInfo::use1026,
-                                             &UtilizedMsgInfo::use1027};
-
-}  // namespace
 
 UtilizedMsgInfo& RTCMDataSupport::GetUtilizedMessageInfo(RtcmBasicTransformMessage& message) {
   msgUtilized = MsgUtilized();
   UtilizedMsgInfo& info = msgUtilized.info;
   info.systemId = static_cast<std::int32_t>(message.systemId);
-  for (unsigned bit = 0; bit < std::size(kFlags); ++bit) {
-    info.*kFlags[bit] = (message.utilizedMsgIndicator >> bit & 1U) != 0;
+  unsigned number = kFirstAnnounced;
+  for (const auto flag : kMessageFlags) {
+    info.*flag = (message.utilizedMsgIndicator & AnnouncementBit(number++)) != 0;
   }
   return info;
 }

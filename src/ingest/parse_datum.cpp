@@ -7,11 +7,6 @@
 #include "velta/rtcm_data_support.h"
 
 namespace orx::cs::velta {
-namespace {
-
-constexpr std::uint32_t kGridAnnounced = 1;  // bit 0 of the utilized message indicator
-
-}  // namespace
 
 ResultCode RTCMDataSupport::ParseDatumMessages(const Rtcm1021& message, const Rtcm1023* grid) {
   return ParseDatum(message, nullptr, grid);
@@ -27,7 +22,7 @@ ResultCode RTCMDataSupport::ParseDatum(const RtcmBasicTransformMessage& message,
   datumEntryName.clear();
   if (grid) {
     ConvertEllipsoidalGrid(*grid, datum.grid);
-  } else if (message.utilizedMsgIndicator & kGridAnnounced) {
+  } else if (message.utilizedMsgIndicator & AnnouncementBit(1023)) {
     return kMissing1023;
   }
   datum.targetDatumName = CleanDatumName(message.targetName);

@@ -1,6 +1,5 @@
 #pragma once
 
-#include <cstdint>
 #include <memory>
 #include <string_view>
 
@@ -20,11 +19,6 @@ struct ProjectionType {
 
 /// \return null for a code without a type string
 const ProjectionType* FindProjectionType(int code);
-
-/// Cassini-Soldner and Mercator have no scale factor among their parameters.
-constexpr bool HasScaleFactor(std::uint32_t code) {
-  return code != ProjectionData::CS && code != ProjectionData::MC;
-}
 
 /// The first code of a type string, ignoring case; NONE for an unknown one.
 ProjectionData::projList FirstCodeOf(std::wstring_view name);

@@ -10,7 +10,7 @@
 namespace velta_test {
 namespace {
 
-namespace rtcm3 = velta_tool::rtcm3;
+namespace rtcm3 = orx::cs::velta::rtcm3;
 
 /// The units that fields may lose in all. Fields that are not there are not kept, or set by the
 /// test.
@@ -24,6 +24,7 @@ struct Kept {
   void Number(const char* name, unsigned width, auto& value) {
     if (kLimits.contains(name)) visit(name, width, value);
   }
+  void BitSet(const char* /*name*/, unsigned /*width*/, auto& /*value*/) {}
   void Points(unsigned width, auto... columns) { rtcm3::VisitPoints(*this, width, columns...); }
 };
 

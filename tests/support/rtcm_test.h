@@ -5,7 +5,7 @@
 #include "support/file_bytes.h"
 #include "support/gff_tree.h"
 #include "support/temporary_directory.h"
-#include "tools/worked_messages.h"
+#include "support/worked_messages.h"
 #include "velta/rtcm_data_support.h"
 #include "velta/rtcm_generator.h"
 
@@ -25,7 +25,7 @@ constexpr int kDhdnSet = k1021 | k1023 | k1024 | k1025, kLocalSet = k1022 | k102
 
 /// A message's fields by their names; null when there is no message.
 inline Json ToJson(const RtcmMessage* message) {
-  return message ? Json::parse(JsonOf(velta_tool::rtcm3::FromRecord(*message))) : Json();
+  return message ? Json::parse(JsonOf(orx::cs::velta::rtcm3::FromRecord(*message))) : Json();
 }
 
 /// The worked messages, and an ingestion object with directories of its own, which do not exist

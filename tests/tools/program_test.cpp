@@ -1,17 +1,13 @@
 #include <gtest/gtest.h>
 
-#include <cstdlib>
 #include <sstream>
 #include <string>
 #include <vector>
 
 #include "support/file_bytes.h"
+#include "support/run_program.h"
 #include "support/temporary_directory.h"
-#include "tools/worked_messages.h"
-
-#ifndef _WIN32
-#include <sys/wait.h>
-#endif
+#include "support/worked_messages.h"
 
 namespace velta_test {
 namespace {
@@ -24,20 +20,22 @@ struct Outcome {
 /// Calls the program with a directory of the test's own.
 class ProgramTest : public testing::Test {
  protected:
-  /// \param arguments as typed; "@" begins the name of a file of the test's directory, "%" that of
-  ///     an example stream
+  /// \param arguments as typed, without quotation marks; "@" begins the name of a file of the
+  ///     test's directory, "%" that of an example stream
   /// \param input what standard input gives
   Outcome Run(const std::string& arguments, const std::string& input = "") {
     WriteBytes(directory_ / "stdin", input);
-    std::string call = (std::filesystem::path(".") / "velta").make_preferred().string();
-    for (const char c : " " + arguments + " <@stdin >@stdout 2>@stderr") {
-      const std::string streams = EXAMPLE_STREAMS "/", own = (directory_ / "").string();
-      call += c == '@' ? own : c == '%' ? streams : std::string(1, c);
+    std::string named;
+    for (const char c : arguments) {
+      const std::string streams = EXAMPLE_STREAMS "/";
+      const std::string own = (directory_ / "").string();
+      named += c == '@' ? own : c == '%' ? streams : std::string(1, c);
     }
-    int status = std::system(call.c_str());
-#ifndef _WIN32
-    status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-#endif
+    std::vector<std::string> call = {PROGRAM};
+    std::istringstream words(named);
+    for (std::string word; words >> word;) call.push_back(word);
+    const int status =
+        RunProgram(call, directory_ / "stdin", directory_ / "stdout", directory_ / "stderr");
     return {status, ReadBytes(directory_ / "stdout"), ReadBytes(directory_ / "stderr")};
   }
 
@@ -48,6 +46,7 @@ class ProgramTest : public testing::Test {
 ///
 ///     $ arguments        the call
 ///     < 1021 name=value  on its standard input: the frame of a worked message, fields changed
+///     <- 1021 name=value the same frame without the last byte of its payload
 ///     <+ 1021 name=value the same message as a line of JSON
 ///     <| 3FC0            a frame of these bytes
 ///     << text            a line of text
@@ -72,10 +71,17 @@ std::string ChangedJson(const std::string& text) {
   return json;
 }
 
+/// A frame without the last byte of its payload.
+std::string CutShort(const std::string& frame) {
+  std::string cut;
+  orx::cs::velta::rtcm3::AppendFrame(PayloadOf(frame).substr(0, PayloadOf(frame).size() - 1), cut);
+  return cut;
+}
+
 std::vector<Call> ReadSession(const std::string& name) {
-  const std::string_view marks = "$ < <+ <| << ~ = > !";
+  const std::string_view marks = "$ < <- <+ <| << ~ = > !";
   std::vector<Call> calls;
-  std::ifstream lines(TOOL_TESTS "/sessions/" + name);
+  std::ifstream lines(SESSIONS "/" + name);
   for (std::string line; std::getline(lines, line);) {
     const std::size_t space = std::min(line.find(' '), line.size());
     const std::string mark = line.substr(0, space);
@@ -84,8 +90,9 @@ std::vector<Call> ReadSession(const std::string& name) {
     if (mark == "$") calls.emplace_back().arguments = text;
     Call& call = calls.at(calls.size() - 1);
     if (mark == "<") call.input += FrameOf(ChangedJson(text));
+    if (mark == "<-") call.input += CutShort(FrameOf(ChangedJson(text)));
     if (mark == "<+") call.input += ChangedJson(text) + "\n";
-    if (mark == "<|") velta_tool::rtcm3::AppendFrame(FromHex(text), call.input);
+    if (mark == "<|") orx::cs::velta::rtcm3::AppendFrame(FromHex(text), call.input);
     if (mark == "<<") call.input += text + "\n";
     if (mark == "~") call.damaged = text;
     if (mark == "=") call.status = std::stoi(text);

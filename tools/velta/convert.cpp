@@ -7,13 +7,15 @@
 
 #include "command.h"
 #include "files.h"
+#include "interrupt.h"
 #include "rtcm3/codec.h"
-#include "rtcm3/fields.h"
 #include "rtcm3/json_lines.h"
 #include "rtcm3/message_reader.h"
+#include "stream_notes.h"
 #include "terminal.h"
 
 namespace velta_tool {
+namespace rtcm3 = orx::cs::velta::rtcm3;
 namespace {
 
 struct Conversion {
@@ -26,35 +28,47 @@ int DecodeStream(const Conversion& files) {
   Output out(files.to);
   Progress progress;
   rtcm3::StreamCounts counts;
+  StreamNotes notes(files.from, counts);
+  const auto finish = [&] {
+    out.Flush();
+    progress.Clear();
+    notes.Tell();
+    if (PassedOver(counts)) ReportNote(files.from + ": " + Summary(counts));
+    if (counts.shortMessages > 0) {
+      ReportFailure(files.from + ": " + std::to_string(counts.shortMessages) +
+                    " messages end before their last field");
+      return kFailed;
+    }
+    if (counts.frames.frames == 0) {
+      ReportFailure(files.from + ": no RTCM 3 frame in it");
+      return kFailed;
+    }
+    return kDone;
+  };
+  FinishWhenInterrupted(finish);
   rtcm3::MessageReader messages(in.buffer(), counts, [&] {
     out.Flush();
+    notes.Tell();
     progress.Show(counts.frames.bytes);
   });
   while (const rtcm3::Message* message = messages.Next()) {
     rtcm3::AppendJsonLine(*message, out.pending());
     out.FlushMuch();
   }
-  out.Flush();
-  for (const std::string& remark : counts.frames.remarks) ReportNote(files.from + ": " + remark);
-  if (counts.PassedOver()) ReportNote(files.from + ": " + Summary(counts));
-  if (counts.shortMessages > 0) {
-    ReportFailure(files.from + ": " + std::to_string(counts.shortMessages) +
-                  " messages end before their last field");
-    return kFailed;
-  }
-  if (counts.frames.frames == 0) {
-    ReportFailure(files.from + ": no RTCM 3 frame in it");
-    return kFailed;
-  }
-  return kDone;
+  return finish();
 }
 
 int EncodeLines(const Conversion& files) {
   Input in(files.from);
   Output out(files.to);
+  int status = kDone;
+  const auto finish = [&] {
+    out.Flush();
+    return status;
+  };
+  FinishWhenInterrupted(finish);
   std::istream lines(&in.buffer());
   lines.exceptions(std::ios::badbit);
-  int status = kDone;
   std::string line;
   for (std::size_t number = 1; std::getline(lines, line); ++number) {
     if (line.find_first_not_of(" \t\r") == std::string::npos) continue;
@@ -67,8 +81,7 @@ int EncodeLines(const Conversion& files) {
     const bool mayWait = in.buffer().in_avail() <= 0;
     mayWait ? out.Flush() : out.FlushMuch();
   }
-  out.Flush();
-  return status;
+  return finish();
 }
 
 CLI::App* AddConversion(CLI::App& program, Action& action, const std::string& name,

@@ -190,8 +190,8 @@ Description Describe(const Rtcm1025& projection) {
       {"false easting", "falseEasting", Metres(projection.fe), "m"},
       {"false northing", "falseNorthing", Metres(projection.fn), "m"},
   };
-  // These two have no scale factor; their messages come with a 0.
-  if (type != ProjectionData::CS && type != ProjectionData::MC) {
+  // Those without a scale factor come with a 0.
+  if (orx::cs::velta::HasScaleFactor(type)) {
     description.push_back({"scale", "scale", Factor(projection.addSNO)});
   }
   return description;

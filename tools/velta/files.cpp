@@ -7,6 +7,7 @@
 #include <system_error>
 
 #include "command.h"
+#include "interrupt.h"
 #include "orxregistry/in_file_key.h"
 #include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
@@ -23,6 +24,31 @@ constexpr std::string_view kStandardStream = "-";
 std::runtime_error FileError(const std::string& name, const std::string& what) {
   return std::runtime_error(name + ": " + what + ": " + std::generic_category().message(errno));
 }
+
+/// Passes on what a stream has, and lets the user end the program where the stream waits for more.
+class InterruptibleBuffer : public std::streambuf {
+ public:
+  explicit InterruptibleBuffer(std::streambuf& source) : source_(source), memory_(kInputBuffer) {}
+
+ private:
+  int_type underflow() override {
+    if (!Await()) return traits_type::eof();
+    const auto room = static_cast<std::streamsize>(memory_.size());
+    const std::streamsize there = std::clamp<std::streamsize>(source_.in_avail(), 1, room);
+    const std::streamsize got = source_.sgetn(memory_.data(), there);
+    setg(memory_.data(), memory_.data(), memory_.data() + got);
+    return got > 0 ? traits_type::to_int_type(memory_.front()) : traits_type::eof();
+  }
+
+  /// \return false at the end
+  bool Await() {
+    const WaitingForInput waiting;
+    return source_.sgetc() != traits_type::eof();
+  }
+
+  std::streambuf& source_;
+  std::vector<char> memory_;
+};
 
 CLI::Validator KindCheck(const std::string& extensions, bool (*accepts)(FileKind)) {
   return CLI::Validator(
@@ -69,15 +95,19 @@ const CLI::Validator kProjectionFile =
 const CLI::Validator kDatumOrProjectionFile =
     KindCheck(".dff or .prj", [](FileKind kind) { return kind != FileKind::kOther; });
 
-Input::Input(const std::string& name) : memory_(kInputBuffer), buffer_(std::cin.rdbuf()) {
-  if (name == kStandardStream) return;
+Input::Input(const std::string& name) : memory_(kInputBuffer) {
+  if (name == kStandardStream) {
+    buffer_ = std::make_unique<InterruptibleBuffer>(*std::cin.rdbuf());
+    return;
+  }
   const fs::path path = ToPath(name);
   if (fs::is_directory(path)) throw std::runtime_error(name + ": is a directory");
   file_.pubsetbuf(memory_.data(), static_cast<std::streamsize>(memory_.size()));
+  const WaitingForInput waiting;  // for whoever writes into a pipe of that name
   if (!file_.open(orx::ToSystemPath(path), std::ios::in | std::ios::binary)) {
     throw FileError(name, "cannot be read");
   }
-  buffer_ = &file_;
+  buffer_ = std::make_unique<InterruptibleBuffer>(file_);
 }
 
 Output::Output(const std::string& name) : name_(name), buffer_(std::cout.rdbuf()) {

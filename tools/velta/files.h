@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <filesystem>
 #include <fstream>
+#include <memory>
 #include <streambuf>
 #include <string>
 #include <vector>
@@ -44,7 +45,7 @@ class Input {
  private:
   std::vector<char> memory_;
   std::filebuf file_;
-  std::streambuf* buffer_;
+  std::unique_ptr<std::streambuf> buffer_;
 };
 
 /// A file to write or, under the name "-", standard output.

@@ -20,8 +20,10 @@
 #include "velta/rtcm_generator.h"
 
 namespace velta_tool {
+namespace rtcm3 = orx::cs::velta::rtcm3;
 namespace {
 
+using orx::cs::velta::AnnouncementBit;
 using orx::cs::velta::RTCMGenerator;
 using rtcm3::Message;
 
@@ -29,11 +31,6 @@ constexpr double kMaxLatitude = 90;
 constexpr double kMaxLongitude = 360;
 constexpr std::int32_t kMaxSystemId = 255;
 constexpr std::size_t kMostAreasNamed = 10;
-/// Bits of a datum message's indicator.
-constexpr std::uint32_t kAnnounce1023 = 1U << 0;
-constexpr std::uint32_t kAnnounce1024 = 1U << 1;
-constexpr std::uint32_t kAnnounce1025 = 1U << 2;
-constexpr std::uint32_t kAnnounce1027 = 1U << 4;
 
 struct Options {
   std::string datum;
@@ -90,7 +87,7 @@ std::vector<Message> Generate(const Options& options) {
     messages.push_back(rtcm3::FromRecord(*datum));
     if (const auto grid = generator.get1023(latitude, longitude, 0)) {
       messages.emplace_back(*grid);
-      announced |= kAnnounce1023;
+      announced |= AnnouncementBit(1023);
     } else {
       ReportNote(options.datum + ": no usable residual grid covers the position, no 1023 sent");
     }
@@ -105,13 +102,12 @@ std::vector<Message> Generate(const Options& options) {
                                  Decimal(*options.easting) + " metres");
       }
       messages.emplace_back(*grid);
-      announced |= kAnnounce1024;
+      announced |= AnnouncementBit(1024);
     }
     const auto projection = generator.getRtcmProjMessage();
     if (!projection) throw std::runtime_error(options.projection + ": no usable projection in it");
     messages.push_back(rtcm3::FromRecord(*projection));
-    announced |=
-        std::holds_alternative<rtcm3::Rtcm1025>(messages.back()) ? kAnnounce1025 : kAnnounce1027;
+    announced |= AnnouncementBit(rtcm3::NumberOf(messages.back()));
   }
 
   std::visit(

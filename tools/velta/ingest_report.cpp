@@ -1,32 +1,41 @@
 #include "ingest_report.h"
 
+#include <algorithm>
 #include <nlohmann/json.hpp>
+#include <utility>
 
 #include "command.h"
+#include "stream_notes.h"
 
 namespace velta_tool {
 namespace {
 
 using nlohmann::ordered_json;
 
-std::string Joined(const std::vector<unsigned>& numbers) {
+std::string Joined(const std::vector<std::string>& words, const char* separator) {
   std::string text;
-  for (const unsigned number : numbers)
-    text += (text.empty() ? "" : " + ") + std::to_string(number);
+  for (const std::string& word : words) text += (text.empty() ? "" : separator) + word;
   return text;
 }
 
+std::string Joined(const std::vector<unsigned>& numbers) {
+  std::vector<std::string> words;
+  for (const unsigned number : numbers) words.push_back(std::to_string(number));
+  return Joined(words, " + ");
+}
+
+/// What is new and, of a set that failed, what did not get in.
 std::string SetText(const IngestedSet& set) {
-  const bool done = set.result == orx::cs::velta::kSuccess;
+  const bool isDone = set.result == orx::cs::velta::kSuccess;
   std::string text = "system " + std::to_string(set.systemId);
   std::string separator = ": ";
+  const auto add = [&](const std::string& what) { text += std::exchange(separator, "; ") + what; };
   for (const IngestedPart& part : set.parts) {
-    text += separator + Joined(part.messages);
-    text += part.added || done ? " in " + part.file : "";
-    text += part.added ? ", added" : done ? ", already there" : ", failed";
-    separator = "; ";
+    const std::string messages = Joined(part.messages);
+    if (part.added) add(messages + " in " + part.file + ", added");
+    if (!part.added && !isDone) add(messages + ", not added");
   }
-  if (!set.leftOut.empty()) text += "; not announced: " + Joined(set.leftOut);
+  if (!set.changed.empty()) add("the datum message has changed: " + Joined(set.changed, ", "));
   return text;
 }
 
@@ -38,13 +47,18 @@ ordered_json SetJson(const IngestedSet& set) {
   return {{"systemId", set.systemId},
           {"result", CodeText(set.result)},
           {"parts", parts},
-          {"notAnnounced", set.leftOut}};
+          {"changed", set.changed},
+          {"notAnnounced", set.notAnnounced}};
 }
 
 std::string TotalsText(const IngestTotals& totals) {
-  return "sets: " + std::to_string(totals.ingested) + " ingested, " +
-         std::to_string(totals.failed) + " failed, " + std::to_string(totals.incomplete) +
-         " incomplete\n" + Summary(totals.stream);
+  std::string text = "sets: " + std::to_string(totals.ingested) + " ingested";
+  if (totals.alreadyThere > 0)
+    text += " (" + std::to_string(totals.alreadyThere) + " already there)";
+  return text + ", " + std::to_string(totals.failed) + " failed, " +
+         std::to_string(totals.incomplete) +
+         " incomplete; repeated messages: " + std::to_string(totals.repeats) + "\n" +
+         Summary(totals.stream);
 }
 
 ordered_json TotalsJson(const IngestTotals& totals) {
@@ -53,10 +67,13 @@ ordered_json TotalsJson(const IngestTotals& totals) {
     messages[std::to_string(rtcm3::kFirstMessage + i)] = totals.stream.messages[i];
   }
   return {{"ingested", totals.ingested},
+          {"alreadyThere", totals.alreadyThere},
           {"failed", totals.failed},
           {"incomplete", totals.incomplete},
+          {"repeats", totals.repeats},
           {"frames", totals.stream.frames.frames},
           {"messages", messages},
+          {"cutMessages", totals.stream.cutMessages},
           {"otherMessages", totals.stream.otherMessages},
           {"shortMessages", totals.stream.shortMessages},
           {"skippedBytes", totals.stream.frames.skippedBytes},
@@ -64,6 +81,11 @@ ordered_json TotalsJson(const IngestTotals& totals) {
 }
 
 }  // namespace
+
+bool IngestedSet::HasNews() const {
+  return !changed.empty() ||
+         std::any_of(parts.begin(), parts.end(), [](const auto& part) { return part.added; });
+}
 
 void IngestReport::Add(const IngestedSet& set) {
   out_.pending() += (json_ ? SetJson(set).dump() : SetText(set)) + '\n';

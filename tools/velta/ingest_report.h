@@ -11,6 +11,8 @@
 
 namespace velta_tool {
 
+namespace rtcm3 = orx::cs::velta::rtcm3;
+
 /// One of the two files that a set goes into.
 struct IngestedPart {
   std::vector<unsigned> messages;  ///< what goes there
@@ -22,13 +24,19 @@ struct IngestedSet {
   std::uint32_t systemId;
   orx::cs::velta::ResultCode result;
   std::vector<IngestedPart> parts;
-  std::vector<unsigned> leftOut;  ///< received, but not announced by the datum message
+  std::vector<std::string> changed;    ///< fields of the datum message that were other before
+  std::vector<unsigned> notAnnounced;  ///< received, but not announced by the datum message
+
+  /// True when a file has got an entry, or the datum has changed.
+  bool HasNews() const;
 };
 
 struct IngestTotals {
   std::size_t ingested = 0;
+  std::size_t alreadyThere = 0;  ///< of those ingested
   std::size_t failed = 0;
   std::size_t incomplete = 0;
+  std::uint64_t repeats = 0;  ///< messages that brought nothing new
   rtcm3::StreamCounts stream;
 };
 

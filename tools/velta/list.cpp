@@ -13,6 +13,7 @@
 #include "velta/rtcm_generator.h"
 
 namespace velta_tool {
+namespace rtcm3 = orx::cs::velta::rtcm3;
 namespace {
 
 using orx::cs::velta::DatumData;
@@ -44,10 +45,10 @@ int ListProjection(const Options& options) {
   const auto record = RTCMGenerator(0, L"", ToWide(options.file)).getRtcmProjMessage();
   if (!record) throw std::runtime_error(options.file + ": no usable projection in it");
   const rtcm3::Message message = rtcm3::FromRecord(*record);
-  const auto* oblique = std::get_if<rtcm3::Rtcm1027>(&message);
+  const auto* oblique = std::get_if<orx::cs::velta::Rtcm1027>(&message);
   Output out;
-  Print(oblique ? Describe(*oblique) : Describe(std::get<rtcm3::Rtcm1025>(message)), options.json,
-        out);
+  Print(oblique ? Describe(*oblique) : Describe(std::get<orx::cs::velta::Rtcm1025>(message)),
+        options.json, out);
   out.Flush();
   return kDone;
 }

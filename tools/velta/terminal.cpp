@@ -1,6 +1,7 @@
 #include "terminal.h"
 
 #include <cstdio>
+#include <utility>
 
 #include "orxutils/file_funcs.h"
 
@@ -16,8 +17,8 @@ constexpr double kMegabyte = 1e6;
 Progress::Progress()
     : next_(Clock::now() + kLongInput), terminal_(orx::FileFuncs::isTerminal(stderr)) {}
 
-Progress::~Progress() {
-  if (shown_) std::fprintf(stderr, "%24s\r", "");
+void Progress::Clear() {
+  if (std::exchange(shown_, false)) std::fprintf(stderr, "%24s\r", "");
 }
 
 // The cursor goes back to the start of the line, so that any other output covers the text.

@@ -9,13 +9,14 @@ namespace velta_tool {
 class Progress {
  public:
   Progress();
-  /// Takes away what was shown.
-  ~Progress();
+  ~Progress() { Clear(); }
   Progress(const Progress&) = delete;
   Progress& operator=(const Progress&) = delete;
 
   /// \param bytes read so far
   void Show(std::uint64_t bytes);
+  /// Takes away what was shown.
+  void Clear();
 
  private:
   using Clock = std::chrono::steady_clock;

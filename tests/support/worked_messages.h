@@ -12,29 +12,32 @@ namespace velta_test {
 /// What a file of seven lines has about a message, 1021 to 1027: worked_messages.jsonl its JSON,
 /// worked_frames.hex the frame that an independent encoder made of this.
 inline std::string Worked(unsigned message, const std::string& file = "worked_messages.jsonl") {
-  std::ifstream lines(TOOL_TESTS "/" + file);
+  std::ifstream lines(WORKED_MESSAGES "/" + file);
   std::string line;
-  for (unsigned n = velta_tool::rtcm3::kFirstMessage; n <= message; ++n) std::getline(lines, line);
+  for (unsigned n = orx::cs::velta::rtcm3::kFirstMessage; n <= message; ++n)
+    std::getline(lines, line);
   return line;
 }
 
 template <class Record>
 Record WorkedRecord(unsigned message) {
-  return std::get<Record>(velta_tool::rtcm3::ParseJsonLine(Worked(message)));
+  return std::get<Record>(orx::cs::velta::rtcm3::ParseJsonLine(Worked(message)));
 }
 
-inline std::string JsonOf(const velta_tool::rtcm3::Message& message) {
+inline std::string JsonOf(const orx::cs::velta::rtcm3::Message& message) {
   std::string line;
-  velta_tool::rtcm3::AppendJsonLine(message, line);
+  orx::cs::velta::rtcm3::AppendJsonLine(message, line);
   line.pop_back();
   return line;
 }
 
 inline std::string FrameOf(const std::string& json) {
   std::string frame;
-  velta_tool::rtcm3::Encode(velta_tool::rtcm3::ParseJsonLine(json), frame);
+  orx::cs::velta::rtcm3::Encode(orx::cs::velta::rtcm3::ParseJsonLine(json), frame);
   return frame;
 }
+
+inline std::string PayloadOf(const std::string& frame) { return frame.substr(3, frame.size() - 6); }
 
 inline std::string FromHex(const std::string& hex) {
   std::string bytes;

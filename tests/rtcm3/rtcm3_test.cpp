@@ -2,19 +2,18 @@
 
 #include <cstdint>
 #include <regex>
-#include <span>
 #include <sstream>
 #include <string>
 #include <vector>
 
 #include "orxutils/orx_string.h"
-#include "rtcm3/fields.h"
-#include "tools/worked_messages.h"
+#include "support/worked_messages.h"
 
 namespace velta_test {
 namespace {
 
-using namespace velta_tool::rtcm3;
+using namespace orx::cs::velta;
+using namespace orx::cs::velta::rtcm3;
 
 std::string Frame(const std::string& payload) {
   std::string frame;
@@ -95,13 +94,10 @@ TEST_F(FrameReaderTest, LiveFrameIsHandedOutBeforeMoreIsAwaited) {
   EXPECT_EQ(payloads, kBoth);
 }
 
-std::string PayloadOf(const std::string& frame) { return frame.substr(3, frame.size() - 6); }
-
 /// What comes out of a payload: the message's JSON, or nothing when it is too short.
 std::string JsonOfPayload(const std::string& payload) {
   Message message;
-  const std::span bytes(reinterpret_cast<const std::uint8_t*>(payload.data()), payload.size());
-  return Decode(bytes, message) == Decoded::kMessage ? JsonOf(message) : "";
+  return Decode(payload, message) < Decoded::kOther ? JsonOf(message) : "";
 }
 
 /// For each message from 1021 to 1027.
@@ -111,13 +107,53 @@ class Codec : public testing::TestWithParam<unsigned> {
 };
 INSTANTIATE_TEST_SUITE_P(Of, Codec, testing::Range(1021U, 1028U));
 
-TEST_P(Codec, WorkedMessageIsItsFrameBothWaysUnlessItIsCut) {
+TEST_P(Codec, WorkedMessageIsItsFrameBothWaysAndMayGrow) {
   EXPECT_EQ(FrameOf(json), FromHex(Worked(GetParam(), "worked_frames.hex")));
+  EXPECT_EQ(JsonOfPayload(PayloadOf(FrameOf(json)) + "grown"), json);
+}
+
+TEST_P(Codec, CutMessageIsTakenWhenItsLastFieldLacksLessThanAByte) {
   const std::string payload = PayloadOf(FrameOf(json));
-  for (std::size_t size = 0; size < payload.size(); ++size) {
+  const std::string cut = payload.substr(0, payload.size() - 1);
+  Message message;
+  // The last fields of a datum message are shorter than what a byte takes with it.
+  const bool isTaken = GetParam() > 1022;
+  EXPECT_EQ(Decode(cut, message), isTaken ? Decoded::kCutMessage : Decoded::kTooShort);
+  EXPECT_EQ(JsonOfPayload(cut), isTaken ? JsonOfPayload(cut + '\0') : "");
+  for (std::size_t size = 0; size < cut.size(); ++size) {
     EXPECT_EQ(JsonOfPayload(payload.substr(0, size)), "") << size;
   }
-  EXPECT_EQ(JsonOfPayload(payload + "grown"), json);
+}
+
+TEST(Indicator, IsReadFromEitherEndAndWrittenInItsOrder) {
+  // As it is sent, as the record has it, and as it is written then.
+  const std::tuple<std::string, std::uint32_t, std::string> cases[] = {
+      {"0000000000", 0, "0000000000"},   {"1000000000", 1, "1000000000"},
+      {"1010000000", 5, "1010000000"},   {"0000100000", 16, "0000100000"},
+      {"0000000101", 5, "1010000000"},   {"0000010000", 16, "0000100000"},
+      {"1000000001", 513, "1000000001"}, {"1111111111", 1023, "1111111111"},
+  };
+  const auto payloadOf = [](const std::string& indicator) {
+    const std::string number = "001111111101";
+    const std::string noNames = "0000000000";
+    const std::string systemId = "00000001";
+    std::string bits = number + noNames + systemId + indicator;
+    bits.resize(416, '0');
+    std::string payload;
+    for (std::size_t i = 0; i < bits.size(); i += 8) {
+      payload += static_cast<char>(std::stoi(bits.substr(i, 8), nullptr, 2));
+    }
+    return payload;
+  };
+  for (const auto& [sent, indicator, written] : cases) {
+    SCOPED_TRACE(sent);
+    Message message;
+    ASSERT_EQ(Decode(payloadOf(sent), message), Decoded::kMessage);
+    EXPECT_EQ(std::get<Rtcm1021>(message).utilizedMsgIndicator, indicator);
+    std::string frame;
+    Encode(message, frame);
+    EXPECT_EQ(PayloadOf(frame), payloadOf(written));
+  }
 }
 
 std::string ErrorOf(const std::string& line) {
@@ -149,7 +185,10 @@ TEST(Encode, RecordThatDoesNotFitIsRefusedWhole) {
   datum.targetName.assign(32, 'x');
   Rtcm1023 grid;
   grid.residualH[15] = 256;
+  Rtcm1021 reserved;
+  reserved.utilizedMsgIndicator = 32;
   std::string out = "before";
+  EXPECT_THROW(Encode(reserved, out), FieldError);
   EXPECT_THROW(Encode(datum, out), FieldError);
   EXPECT_THROW(Encode(grid, out), FieldError);
   EXPECT_EQ(out, "before");

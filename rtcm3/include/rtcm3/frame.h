@@ -4,19 +4,20 @@
 #include <cstdint>
 #include <functional>
 #include <optional>
-#include <span>
 #include <streambuf>
 #include <string>
 #include <string_view>
 #include <vector>
 
-namespace velta_tool::rtcm3 {
+#include "rtcm3/export.h"
+
+namespace orx::cs::velta::rtcm3 {
 
 /// The most bytes that a frame can carry.
 inline constexpr std::size_t kMaxPayload = 1023;
 
 /// Appends a frame around a payload of at most kMaxPayload bytes.
-void AppendFrame(std::string_view payload, std::string& out);
+VELTA_RTCM3_EXPORT void AppendFrame(std::string_view payload, std::string& out);
 
 /// What a stream held so far.
 struct FrameCounts {
@@ -24,29 +25,32 @@ struct FrameCounts {
   std::uint64_t frames = 0;        ///< whole, with the right checksum
   std::uint64_t skippedBytes = 0;  ///< outside those frames
   std::uint64_t badCrcs = 0;       ///< places that looked like a frame but for the checksum
-  /// Where bytes were passed over and why, up to the first kMostRemarks of a stream.
+  /// What is worth telling of, with its place, up to the first kMostRemarks of a stream: where
+  /// bytes were passed over and why, and what messages lack.
   std::vector<std::string> remarks;
 };
 
-inline constexpr std::size_t kMostRemarks = 10;
+inline constexpr std::size_t kMostRemarks = 10;  ///< of a stream
 
 /// Finds the frames in a stream of bytes. After a place that fails, the search goes on one byte
 /// behind its first.
 class FrameReader {
  public:
-  using Payload = std::span<const std::uint8_t>;
-
   /// \param in stays the caller's and must outlive the reader; takes what has arrived without
   ///     waiting for more, so that a live stream is followed frame by frame
   /// \param counts the caller's too; counted on from what they hold
   /// \param beforeRead called each time before the stream is asked, which may have to wait
-  FrameReader(std::streambuf& in, FrameCounts& counts, std::function<void()> beforeRead = {});
+  VELTA_RTCM3_EXPORT FrameReader(std::streambuf& in, FrameCounts& counts,
+                                 std::function<void()> beforeRead = {});
+  VELTA_RTCM3_EXPORT ~FrameReader();
+  FrameReader(const FrameReader&) = delete;
+  FrameReader& operator=(const FrameReader&) = delete;
 
   /// \return the next frame's payload, valid until the next call; nothing at the end
-  std::optional<Payload> Next();
+  VELTA_RTCM3_EXPORT std::optional<std::string_view> Next();
 
   /// Adds a remark about the last frame.
-  void Remark(const std::string& what) { RemarkAt(frameAt_, what); }
+  VELTA_RTCM3_EXPORT void Remark(const std::string& what);
 
  private:
   std::uint64_t Place() const { return counts_.bytes - bytesBefore_ - (end_ - begin_); }
@@ -73,4 +77,4 @@ class FrameReader {
   bool endsInFrame_ = false;  ///< the stream ends before what looks like a frame does
 };
 
-}  // namespace velta_tool::rtcm3
+}  // namespace orx::cs::velta::rtcm3

@@ -5,7 +5,7 @@
 #include <boost/endian/conversion.hpp>
 #include <cstring>
 
-namespace velta_tool::rtcm3 {
+namespace orx::cs::velta::rtcm3 {
 namespace {
 
 constexpr std::uint8_t kPreamble = 0xD3;
@@ -40,7 +40,9 @@ FrameReader::FrameReader(std::streambuf& in, FrameCounts& counts, std::function<
       buffer_(kBufferSize),
       bytesBefore_(counts.bytes) {}
 
-std::optional<FrameReader::Payload> FrameReader::Next() {
+FrameReader::~FrameReader() = default;
+
+std::optional<std::string_view> FrameReader::Next() {
   while (SkipToPreamble()) {
     const std::size_t size = FrameSize();
     if (size == 0) {
@@ -59,11 +61,14 @@ std::optional<FrameReader::Payload> FrameReader::Next() {
     ++counts_.frames;
     frameAt_ = Place();
     begin_ += size;
-    return Payload(frame + kHeaderSize, checked - kHeaderSize);
+    const char* const payload = reinterpret_cast<const char*>(frame) + kHeaderSize;
+    return std::string_view(payload, checked - kHeaderSize);
   }
   EndSkipping();
   return std::nullopt;
 }
+
+void FrameReader::Remark(const std::string& what) { RemarkAt(frameAt_, what); }
 
 void FrameReader::RemarkAt(std::uint64_t place, const std::string& what) {
   if (remarksLeft_ == 0) return;
@@ -144,4 +149,4 @@ bool FrameReader::Fill() {
   return got > 0;
 }
 
-}  // namespace velta_tool::rtcm3
+}  // namespace orx::cs::velta::rtcm3

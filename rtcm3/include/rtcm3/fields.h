@@ -1,92 +1,65 @@
 #pragma once
 
-#include <concepts>
 #include <cstdint>
-#include <limits>
-#include <stdexcept>
-#include <string>
-#include <string_view>
 #include <type_traits>
-#include <utility>
 
 #include "rtcm3/message.h"
 
-/// The fields of each message in the order in which they travel. Decoding, encoding and both
-/// directions of JSON walk these lists with a visitor that has
+/// The fields of each message in the order in which they travel. Decoding, encoding, comparing and
+/// both directions of JSON walk these lists with a visitor that has
 ///
 ///     Number(name, width, value)         an integer of `width` bits, signed as the member is
+///     BitSet(name, width, value)         a set of `width` bits, of which bit 0 is sent first
 ///     Text(name, text, counter)          a 5-bit count of characters and the characters
 ///     Points(width, {name, values}...)   for each grid point one integer of every column
+///
+/// A name is that of the record's member; what it counts, the member's comment says.
 
-namespace velta_tool::rtcm3 {
-
-/// Bits of a text's count of characters.
-inline constexpr unsigned kTextCounterWidth = 5;
-/// The most characters that a text can have.
-inline constexpr std::size_t kMaxTextLength = (1U << kTextCounterWidth) - 1;
-
-/// A field holds, or is given, what the message cannot carry; the text names field and range.
-struct FieldError : std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
+namespace orx::cs::velta::rtcm3 {
 
 /// The values that a field can take.
 struct FieldRange {
-  std::int64_t min;
-  std::int64_t max;
+  std::int64_t min;  ///< the smallest
+  std::int64_t max;  ///< the largest
 
+  /// Of a field of `width` bits, signed as the record's member is.
   template <class Member>
   static constexpr FieldRange Of(unsigned width) {
     const std::int64_t values = std::int64_t{1} << width;
     if constexpr (std::is_signed_v<Member>) return {-values / 2, values / 2 - 1};
     return {0, values - 1};
   }
-
-  template <class Integer>
-  constexpr bool Holds(Integer value) const {
-    return std::cmp_greater_equal(value, min) && std::cmp_less_equal(value, max);
-  }
-
-  /// The error that a field's value is outside.
-  FieldError Error(std::string_view field, const std::string& value) const {
-    return FieldError(std::string(field) + " must be an integer from " + std::to_string(min) +
-                      " to " + std::to_string(max) + ", not " + value);
-  }
 };
-
-/// The error that a text is too long or has characters that do not travel.
-inline FieldError TextError(std::string_view field) {
-  return FieldError(std::string(field) + " must be a text of at most " +
-                    std::to_string(kMaxTextLength) + " ISO 8859-1 characters");
-}
 
 /// One value of each grid point.
 template <class Values>
 struct Column {
-  const char* name;
-  Values& values;
+  const char* name;  ///< of the field
+  Values& values;    ///< an array, a value for each point
 };
+/// Deduces the kind of the values.
 template <class Values>
 Column(const char*, Values&) -> Column<Values>;
 
 /// Hands the values of the columns to `visit.Number`, point by point as they travel.
 template <class Visitor, class... Columns>
 void VisitPoints(Visitor& visit, unsigned width, Columns... columns) {
-  for (int i = 0; i < orx::cs::velta::kResidualGridPoints; ++i) {
+  for (int i = 0; i < kResidualGridPoints; ++i) {
     (visit.Number(columns.name, width, columns.values[i]), ...);
   }
 }
 
-template <class Record, class Plain>
-concept Is = std::same_as<std::remove_const_t<Record>, Plain>;
+/// True when a record, const or not, is one of some kinds.
+template <class Record, class... Kinds>
+inline constexpr bool kIsOneOf = (std::is_same_v<std::remove_const_t<Record>, Kinds> || ...);
 
+/// Hands each field of a 1021 or 1022 to the visitor.
 template <class Visitor, class Record>
-requires Is<Record, Rtcm1021> || Is<Record, Rtcm1022>
-void VisitFields(Visitor& visit, Record& record) {
+std::enable_if_t<kIsOneOf<Record, Rtcm1021, Rtcm1022>> VisitFields(Visitor& visit, Record& record) {
   visit.Text("sourceName", record.sourceName, record.sourceNameCounter);
   visit.Text("targetName", record.targetName, record.targetNameCounter);
   visit.Number("systemId", 8, record.systemId);
-  visit.Number("utilizedMsgIndicator", 10, record.utilizedMsgIndicator);
+  visit.BitSet("utilizedMsgIndicator", 10, record.utilizedMsgIndicator);
   visit.Number("plateNumber", 5, record.plateNumber);
   visit.Number("computationIndicator", 4, record.computationIndicator);
   visit.Number("heightIndicator", 2, record.heightIndicator);
@@ -101,7 +74,7 @@ void VisitFields(Visitor& visit, Record& record) {
   visit.Number("r2", 32, record.r2);
   visit.Number("r3", 32, record.r3);
   visit.Number("dS", 25, record.dS);
-  if constexpr (Is<Record, Rtcm1022>) {
+  if constexpr (kIsOneOf<Record, Rtcm1022>) {
     visit.Number("xp", 35, record.xp);
     visit.Number("yp", 35, record.yp);
     visit.Number("zp", 35, record.zp);
@@ -132,9 +105,9 @@ void VisitGridEnd(Visitor& visit, Record& record) {
   visit.Number("mjd", 16, record.mjd);
 }
 
+/// As above, for a 1023.
 template <class Visitor, class Record>
-requires Is<Record, Rtcm1023>
-void VisitFields(Visitor& visit, Record& record) {
+std::enable_if_t<kIsOneOf<Record, Rtcm1023>> VisitFields(Visitor& visit, Record& record) {
   VisitGridStart(visit, record);
   visit.Number("phi0", 21, record.phi0);
   visit.Number("lambda0", 22, record.lambda0);
@@ -149,9 +122,9 @@ void VisitFields(Visitor& visit, Record& record) {
   VisitGridEnd(visit, record);
 }
 
+/// As above, for a 1024.
 template <class Visitor, class Record>
-requires Is<Record, Rtcm1024>
-void VisitFields(Visitor& visit, Record& record) {
+std::enable_if_t<kIsOneOf<Record, Rtcm1024>> VisitFields(Visitor& visit, Record& record) {
   VisitGridStart(visit, record);
   visit.Number("north0", 25, record.north0);
   visit.Number("east0", 26, record.east0);
@@ -165,9 +138,9 @@ void VisitFields(Visitor& visit, Record& record) {
   VisitGridEnd(visit, record);
 }
 
+/// As above, for a 1025.
 template <class Visitor, class Record>
-requires Is<Record, Rtcm1025>
-void VisitFields(Visitor& visit, Record& record) {
+std::enable_if_t<kIsOneOf<Record, Rtcm1025>> VisitFields(Visitor& visit, Record& record) {
   visit.Number("systemId", 8, record.systemId);
   visit.Number("projectionType", 6, record.projectionType);
   visit.Number("laNO", 34, record.laNO);
@@ -177,9 +150,9 @@ void VisitFields(Visitor& visit, Record& record) {
   visit.Number("fn", 35, record.fn);
 }
 
+/// As above, for a 1026.
 template <class Visitor, class Record>
-requires Is<Record, Rtcm1026>
-void VisitFields(Visitor& visit, Record& record) {
+std::enable_if_t<kIsOneOf<Record, Rtcm1026>> VisitFields(Visitor& visit, Record& record) {
   visit.Number("systemId", 8, record.systemId);
   visit.Number("projectionType", 6, record.projectionType);
   visit.Number("laFO", 34, record.laFO);
@@ -190,9 +163,9 @@ void VisitFields(Visitor& visit, Record& record) {
   visit.Number("nfo", 35, record.nfo);
 }
 
+/// As above, for a 1027.
 template <class Visitor, class Record>
-requires Is<Record, Rtcm1027>
-void VisitFields(Visitor& visit, Record& record) {
+std::enable_if_t<kIsOneOf<Record, Rtcm1027>> VisitFields(Visitor& visit, Record& record) {
   visit.Number("systemId", 8, record.systemId);
   visit.Number("projectionType", 6, record.projectionType);
   visit.Number("rectificationFlag", 1, record.rectificationFlag);
@@ -205,4 +178,4 @@ void VisitFields(Visitor& visit, Record& record) {
   visit.Number("npc", 35, record.npc);
 }
 
-}  // namespace velta_tool::rtcm3
+}  // namespace orx::cs::velta::rtcm3

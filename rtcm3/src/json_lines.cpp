@@ -7,10 +7,11 @@
 #include <type_traits>
 #include <variant>
 
+#include "field_range.h"
 #include "orxutils/orx_string.h"
 #include "rtcm3/fields.h"
 
-namespace velta_tool::rtcm3 {
+namespace orx::cs::velta::rtcm3 {
 namespace {
 
 using nlohmann::json;
@@ -25,9 +26,11 @@ class JsonWriter {
     Append(value);
   }
 
+  void BitSet(const char* name, unsigned width, std::uint32_t value) { Number(name, width, value); }
+
   void Text(const char* name, const std::string& text, std::uint32_t) {
     Name(name);
-    out_ += json(orx::ToUtf8(orx::Widen(text))).dump();
+    out_ += json(ToUtf8(Widen(text))).dump();
   }
 
   template <class... Columns>
@@ -75,10 +78,10 @@ class JsonWriter {
 template <class Member>
 Member Integer(const std::string& field, unsigned width, const json& value) {
   const FieldRange range = FieldRange::Of<Member>(width);
-  const bool held = value.is_number_unsigned()  ? range.Holds(value.get<std::uint64_t>())
-                    : value.is_number_integer() ? range.Holds(value.get<std::int64_t>())
+  const bool held = value.is_number_unsigned()  ? Holds(range, value.get<std::uint64_t>())
+                    : value.is_number_integer() ? Holds(range, value.get<std::int64_t>())
                                                 : false;
-  if (!held) throw range.Error(field, value.dump());
+  if (!held) throw RangeError(range, field, value.dump());
   return static_cast<Member>(value.get<std::int64_t>());
 }
 
@@ -92,15 +95,19 @@ class JsonReader {
     value = Integer<Member>(name, width, Take(name));
   }
 
+  void BitSet(const char* name, unsigned width, std::uint32_t& value) {
+    Number(name, width, value);
+  }
+
   void Text(const char* name, std::string& text, std::uint32_t& counter) {
     const json value = Take(name);
     if (!value.is_string()) throw TextError(name);
-    const std::optional<std::wstring> wide = orx::FromUtf8(value.get_ref<const std::string&>());
+    const std::optional<std::wstring> wide = FromUtf8(value.get_ref<const std::string&>());
     if (!wide || wide->size() > kMaxTextLength) throw TextError(name);
     for (const wchar_t c : *wide) {
       if (static_cast<char32_t>(c) > 0xFF) throw TextError(name);
     }
-    text = orx::Narrow(*wide);
+    text = Narrow(*wide);
     counter = static_cast<std::uint32_t>(text.size());
   }
 
@@ -163,4 +170,4 @@ Message ParseJsonLine(std::string_view line) {
   return message;
 }
 
-}  // namespace velta_tool::rtcm3
+}  // namespace orx::cs::velta::rtcm3

@@ -4,15 +4,27 @@
 #include <type_traits>
 #include <variant>
 
-#include "rtcm3/bits.h"
+#include "bits.h"
+#include "field_range.h"
 #include "rtcm3/fields.h"
 #include "rtcm3/frame.h"
 
-namespace velta_tool::rtcm3 {
+namespace orx::cs::velta::rtcm3 {
 namespace {
 
 constexpr unsigned kMessageNumberWidth = 12;
 constexpr unsigned kCharacterWidth = 8;
+
+/// The lower half of a set of bits, as they are sent: reserved bits for who numbers them in the
+/// right order, announcements for who numbers them from the other end.
+constexpr std::uint32_t LowerHalf(unsigned width) { return (1U << width / 2) - 1; }
+
+/// The bits of a set in the opposite order.
+std::uint32_t Mirrored(std::uint32_t bits, unsigned width) {
+  std::uint32_t mirrored = 0;
+  for (unsigned i = 0; i < width; ++i) mirrored |= (bits >> i & 1U) << (width - 1 - i);
+  return mirrored;
+}
 
 class FieldReader {
  public:
@@ -25,6 +37,12 @@ class FieldReader {
     } else {
       value = static_cast<Member>(bits_.Unsigned(width));
     }
+  }
+
+  void BitSet(const char*, unsigned width, std::uint32_t& value) {
+    const auto sent = static_cast<std::uint32_t>(bits_.Unsigned(width));
+    const bool isFromTheOtherEnd = (sent & ~LowerHalf(width)) == 0;
+    value = isFromTheOtherEnd ? sent : Mirrored(sent, width);
   }
 
   void Text(const char*, std::string& text, std::uint32_t& counter) {
@@ -48,11 +66,20 @@ class FieldWriter {
 
   template <class Member>
   void Number(const char* name, unsigned width, Member value) {
-    const FieldRange range = FieldRange::Of<Member>(width);
     const auto wide =
         static_cast<std::conditional_t<std::is_same_v<Member, bool>, int, Member>>(value);
-    if (!range.Holds(wide)) throw range.Error(name, std::to_string(wide));
+    CheckRange(FieldRange::Of<Member>(width), name, wide);
     bits_.Write(static_cast<std::uint64_t>(value), width);
+  }
+
+  void BitSet(const char* name, unsigned width, std::uint32_t value) {
+    CheckRange(FieldRange::Of<std::uint32_t>(width), name, value);
+    const bool hasReservedAlone = value != 0 && (value & LowerHalf(width)) == 0;
+    if (hasReservedAlone) {
+      throw FieldError(std::string(name) + " must not be " + std::to_string(value) +
+                       ": its reserved bits alone would be read as announcements");
+    }
+    bits_.Write(Mirrored(value, width), width);
   }
 
   void Text(const char* name, const std::string& text, std::uint32_t) {
@@ -72,12 +99,16 @@ class FieldWriter {
 
 }  // namespace
 
-Decoded Decode(std::span<const std::uint8_t> payload, Message& message) {
-  BitReader bits(payload);
-  if (!Reset(message, bits.Unsigned(kMessageNumberWidth))) return Decoded::kOther;
+Decoded Decode(std::string_view payload, Message& message) {
+  constexpr std::size_t kByte = 8;
+  BitReader bits({reinterpret_cast<const std::uint8_t*>(payload.data()), payload.size()});
+  const std::uint64_t number = bits.Unsigned(kMessageNumberWidth);
+  if (bits.Missing() > 0 || !Reset(message, number)) return Decoded::kOther;
   FieldReader reader(bits);
   std::visit([&reader](auto& record) { VisitFields(reader, record); }, message);
-  return bits.Overrun() ? Decoded::kTooShort : Decoded::kMessage;
+  const std::size_t missing = bits.Missing();
+  if (missing == 0) return Decoded::kMessage;
+  return missing < kByte && bits.LastIsCut() ? Decoded::kCutMessage : Decoded::kTooShort;
 }
 
 void Encode(const Message& message, std::string& out) {
@@ -90,4 +121,4 @@ void Encode(const Message& message, std::string& out) {
   AppendFrame(payload, out);
 }
 
-}  // namespace velta_tool::rtcm3
+}  // namespace orx::cs::velta::rtcm3

@@ -7,7 +7,7 @@
 #include <span>
 #include <string>
 
-namespace velta_tool::rtcm3 {
+namespace orx::cs::velta::rtcm3 {
 
 /// The widest field that the reader and the writer take, in bits.
 inline constexpr unsigned kMaxFieldWidth = 57;
@@ -17,13 +17,12 @@ class BitReader {
  public:
   explicit BitReader(std::span<const std::uint8_t> bytes) : bytes_(bytes), end_(bytes.size() * 8) {}
 
-  /// \return the field; 0 when the bytes end before it, which Overrun() then tells
+  /// \return the field, zeros standing for bits behind the end
   std::uint64_t Unsigned(unsigned width) {
-    const std::size_t start = position_;
+    last_ = position_;
     position_ += width;
-    if (position_ > end_) return 0;
-    const auto offset = static_cast<unsigned>(start % 8);
-    return Window(start / 8) << offset >> (64 - width);
+    const auto offset = static_cast<unsigned>(last_ % 8);
+    return Window(last_ / 8) << offset >> (64 - width);
   }
 
   /// As Unsigned, two's complement.
@@ -32,8 +31,10 @@ class BitReader {
     return top >> (64 - width);
   }
 
-  /// True when more was read than there is.
-  bool Overrun() const { return position_ > end_; }
+  /// How many bits were read that are not there.
+  std::size_t Missing() const { return position_ > end_ ? position_ - end_ : 0; }
+  /// True when the field read last has its begin, but not its end.
+  bool LastIsCut() const { return last_ < end_ && position_ > end_; }
 
  private:
   /// The 64 bits that begin at a byte; zeros stand for what lies behind the end.
@@ -49,6 +50,7 @@ class BitReader {
 
   std::span<const std::uint8_t> bytes_;
   std::size_t position_ = 0;
+  std::size_t last_ = 0;  ///< where the field read last begins
   std::size_t end_;
 };
 
@@ -77,4 +79,4 @@ class BitWriter {
   unsigned pendingBits_ = 0;
 };
 
-}  // namespace velta_tool::rtcm3
+}  // namespace orx::cs::velta::rtcm3
