@@ -13,6 +13,7 @@
 #include "rtcm3/message_reader.h"
 #include "rtcm3/message_sets.h"
 #include "support/temporary_directory.h"
+#include "velta/rtcm_data_support.h"
 #include "velta/rtcm_generator.h"
 
 extern "C" std::size_t LLVMFuzzerMutate(std::uint8_t* data, std::size_t size, std::size_t maxSize);

@@ -29,7 +29,17 @@ int DecodeStream(const Conversion& files) {
   Progress progress;
   rtcm3::StreamCounts counts;
   StreamNotes notes(files.from, counts);
+  rtcm3::MessageReader messages(in.buffer(), counts, [&] {
+    out.Flush();
+    notes.Tell();
+    progress.Show(counts.frames.bytes);
+  });
   const auto finish = [&] {
+    // Also what an interrupted reader holds back.
+    while (const rtcm3::Message* message = messages.Next()) {
+      rtcm3::AppendJsonLine(*message, out.pending());
+      out.FlushMuch();
+    }
     out.Flush();
     progress.Clear();
     notes.Tell();
@@ -46,15 +56,6 @@ int DecodeStream(const Conversion& files) {
     return kDone;
   };
   FinishWhenInterrupted(finish);
-  rtcm3::MessageReader messages(in.buffer(), counts, [&] {
-    out.Flush();
-    notes.Tell();
-    progress.Show(counts.frames.bytes);
-  });
-  while (const rtcm3::Message* message = messages.Next()) {
-    rtcm3::AppendJsonLine(*message, out.pending());
-    out.FlushMuch();
-  }
   return finish();
 }
 

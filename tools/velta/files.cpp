@@ -32,7 +32,7 @@ class InterruptibleBuffer : public std::streambuf {
 
  private:
   int_type underflow() override {
-    if (!Await()) return traits_type::eof();
+    if (IsInterrupted() || !Await()) return traits_type::eof();
     const auto room = static_cast<std::streamsize>(memory_.size());
     const std::streamsize there = std::clamp<std::streamsize>(source_.in_avail(), 1, room);
     const std::streamsize got = source_.sgetn(memory_.data(), there);

@@ -119,7 +119,8 @@ class Ingestion {
       stream_->notes.Tell();
       progress_.Show(totals_.stream.frames.bytes);
     });
-    while (const rtcm3::Message* message = messages.Next()) Take(*message);
+    stream_->messages = &messages;
+    TakeAll(messages);
     EndStream();
   }
 
@@ -155,10 +156,17 @@ class Ingestion {
     std::string name;
     StreamNotes notes;
     std::uint64_t framesBefore;
+    rtcm3::MessageReader* messages = nullptr;
   };
+
+  void TakeAll(rtcm3::MessageReader& messages) {
+    while (const rtcm3::Message* message = messages.Next()) Take(*message);
+  }
 
   void EndStream() {
     if (!stream_) return;
+    // The reader may hold back what looks like the begin of a longer frame.
+    if (IsInterrupted() && stream_->messages) TakeAll(*stream_->messages);
     stream_->notes.Tell();
     if (totals_.stream.frames.frames == stream_->framesBefore) {
       Fail(stream_->name + ": no RTCM 3 frame in it");

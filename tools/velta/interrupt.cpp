@@ -19,12 +19,15 @@ std::mutex& Work() {
   return *work;
 }
 
+bool isInterrupted = false;  ///< belongs to whoever holds the work
+
 }  // namespace
 
 void FinishWhenInterrupted(std::function<int()> finish) {
   Work();
   orx::OnInterrupt([finish = std::move(finish)] {
     const std::lock_guard<std::mutex> working(Work());
+    isInterrupted = true;
     int status = kFailed;
     try {
       status = finish();
@@ -34,6 +37,8 @@ void FinishWhenInterrupted(std::function<int()> finish) {
     std::_Exit(status);
   });
 }
+
+bool IsInterrupted() { return isInterrupted; }
 
 WaitingForInput::WaitingForInput() { Work().unlock(); }
 

@@ -9,6 +9,10 @@ namespace velta_tool {
 /// \param finish does what is done at the end of the input, and answers with the exit status
 void FinishWhenInterrupted(std::function<int()> finish);
 
+/// True once the program has been asked to end: no more input is to be awaited. What has been read
+/// is still to be taken, by `finish`.
+bool IsInterrupted();
+
 /// While one is there the program waits for input, and may be ended.
 class WaitingForInput {
  public:
