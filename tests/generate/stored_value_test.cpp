@@ -92,7 +92,8 @@ TEST_F(StoredValueTest, MissingFilesAndEntriesGiveNothing) {
   copy.setDatumFileName(DatumFile().wstring());
   const auto datum = copy.getRtcmDatumMessage(kLatitude, kLongitude, 0);
   EXPECT_EQ(datum->sourceNameCounter * 100 + datum->targetNameCounter, 1315U);
-  EXPECT_FALSE(copy.get1024(0, 0, 0) || copy.getRtcmProjMessage());
+  EXPECT_FALSE(copy.get1024(0, 0, 0));
+  EXPECT_FALSE(copy.getRtcmProjMessage());
   copy.setProjFileName(ProjectionFile().wstring());
   EXPECT_EQ(copy.getRtcmProjMessage()->systemId, 77U);
   for (const Json& root : {Json{{"no entry", Json::object()}}, Json::object()}) {
@@ -149,7 +150,8 @@ TEST_F(StoredValueTest, EveryNumberIsTruncatedIntoItsField) {
   const Json datum = datum_, projection = projection_;
   const Json tests = Json::parse(ReadBytes(STORED_NUMBERS));
   for (const Json& test : tests) {
-    datum_ = datum, projection_ = projection;
+    datum_ = datum;
+    projection_ = projection;
     DatumEntry().merge_patch(test["stored"]), ProjectionEntry().merge_patch(test["stored"]);
     const RTCMGenerator generator = Written();
     const double first = test["at"][0], second = test["at"][1];
@@ -179,7 +181,8 @@ TEST_F(StoredValueTest, DatumsAreListedInPhysicalUnits) {
               method == 3 ? std::vector({7.0, 8.0, 10.0, 0.0}) : std::vector({7.0, 0.0, 0.0, 0.0}));
     EXPECT_EQ(std::vector({datum.validityArea[3], datum.validityCentre[1], datum.grid.bounds[5]}),
               std::vector({2 * kPi, 0.25 + kPi, 9.999999999999999e-05}));
-    EXPECT_FALSE(datum.grid.hasTable || datum.grid.centerN != 0.0);
+    EXPECT_FALSE(datum.grid.hasTable);
+    EXPECT_FALSE(datum.grid.centerN != 0.0);
   }
 }
 

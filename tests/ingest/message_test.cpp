@@ -13,7 +13,9 @@ using MessageTest = RtcmTest;
 TEST_F(MessageSetTest, IsCheckedAndTakenInOrder) {
   EXPECT_EQ(support_.GetUtilizedMessageInfo(m1021_).systemId, 23);
   Rtcm1021 bad, nameless = m1021_;
-  bad.computationIndicator = 4, nameless.utilizedMsgIndicator = 0, nameless.targetName.clear();
+  bad.computationIndicator = 4;
+  nameless.utilizedMsgIndicator = 0;
+  nameless.targetName.clear();
   const Rtcm1025 unsupported;
   const Rtcm1026 ignored;
   using All = MsgUtilized;
@@ -28,7 +30,8 @@ TEST_F(MessageSetTest, IsCheckedAndTakenInOrder) {
       {kMissingProjectionPart, "d...", [](All& m) { m.info.use1024 = true, m.msg1024 = nullptr; }},
       {kSuccess, "d...",
        [](All& m) {
-         m.info = {true, true}, m.msg1024 = nullptr;
+         m.info = {true, true};
+         m.msg1024 = nullptr;
        }},
       {kMissingProjectionPart, "d...", [](All& m) { m.info.use1027 = true, m.msg1027 = nullptr; }},
       {kSuccess, "dp..", [&](All& m) { m.info.use1026 = true, m.msg1026 = &ignored; }},
@@ -52,8 +55,11 @@ TEST_F(MessageSetTest, IsCheckedAndTakenInOrder) {
 }
 
 TEST_F(MessageTest, FirstOfEachKindMakesAFileWithItsEntry) {
-  m1023_.vertShiftIndicator = false, m1023_.meanDPhi = -124, m1027_.diffARSG = -1212342;
-  m1023_.horInterpolationMethod = 0x1FE, m1023_.vertInterpolationMethod = 3;
+  m1023_.vertShiftIndicator = false;
+  m1023_.meanDPhi = -124;
+  m1027_.diffARSG = -1212342;
+  m1023_.horInterpolationMethod = 0x1FE;
+  m1023_.vertInterpolationMethod = 3;
   // The 1021 has no rotation point and keeps that of the 1022.
   EXPECT_EQ(Ingest(kLocalSet) + Ingest(kDhdnSet), kSuccess);
   const Json files = Json::parse(ReadBytes(FIRST_ENTRIES));
@@ -75,7 +81,9 @@ TEST_F(MessageTest, NamesAreCleanedAndKeptWhole) {
   m1021_.phiV = m1021_.lambdaV = m1023_.phi0 = m1023_.lambda0 = INT32_MIN;
   const char* const entry = "S_-2147483648_-2147483648_T_-2147483648_-2147483648";
   for (const auto& [target, cleanTarget, source, cleanSource, plate, region] : cases) {
-    m1021_.targetName = target, m1021_.sourceName = source, m1021_.plateNumber = plate;
+    m1021_.targetName = target;
+    m1021_.sourceName = source;
+    m1021_.plateNumber = plate;
     EXPECT_EQ(Ingest(k1021 | k1023), kSuccess) << target;
     EXPECT_EQ(support_.GetTargetDatumName(), cleanTarget);
     EXPECT_EQ(support_.GetSourceDatumName(), cleanSource);
@@ -90,7 +98,8 @@ TEST_F(MessageTest, NamesAreCleanedAndKeptWhole) {
 TEST_F(MessageTest, WithoutAGridADatumKeepsTheObjectsAndAProjectionHasNone) {
   m1021_.utilizedMsgIndicator = 0xFE;
   EXPECT_EQ(Ingest(k1021) + Ingest(kDhdnSet), kSuccess);
-  m1021_.phiV = -5, m1025_.systemId = 99;
+  m1021_.phiV = -5;
+  m1025_.systemId = 99;
   EXPECT_EQ(Ingest(k1021 | k1025), kSuccess);
   Json datum = ReadGff(DatumFile())[kDhdn], projection = ReadGff(ProjectionFile())[kDhdn];
   const Json none = {0.0, 0.0, 0.0};
@@ -114,7 +123,9 @@ TEST_F(MessageTest, RefusedDatumWritesNothing) {
 }
 
 TEST_F(MessageTest, ParametersFollowTheProjectionType) {
-  m1025_.fe = 0xFFFFFFFFFFFFFFFF, m1025_.fn = -5, m1025_.laNO = -7;
+  m1025_.fe = 0xFFFFFFFFFFFFFFFF;
+  m1025_.fn = -5;
+  m1025_.laNO = -7;
   const Json tests = Json::parse(ReadBytes(PROJECTION_TYPES));
   std::string name = "a";
   for (const Json& test : tests) {

@@ -14,7 +14,8 @@ class RecordFileTest : public RtcmTest, public testing::WithParamInterface<bool>
  protected:
   /// Ingests the messages, or the same with another place for their entry.
   ResultCode IngestEntry(int number = 0) {
-    m1021_.phiV = number, m1024_.north0 = number;
+    m1021_.phiV = number;
+    m1024_.north0 = number;
     return Ingest(isDatum_ ? k1021 | k1023 : kDhdnSet);
   }
   /// A file of entries that hold the file's name and a value of its own.
@@ -53,7 +54,8 @@ TEST_P(RecordFileTest, EntryAlreadyPresentIsLeftAloneAndAnotherAppendedToTheFirs
   root[kDhdn]["dimension"] = 3;
   WriteGff(path_, {{"first of two", root[kDhdn]}, {kDhdn, Json::object()}});
   const std::string one = ReadBytes(path_);
-  m1021_.dX = 1, m1025_.fe = 1;
+  m1021_.dX = 1;
+  m1025_.fe = 1;
   EXPECT_EQ(IngestEntry(), kSuccess);
   EXPECT_EQ(ReadBytes(path_), one);
   EXPECT_EQ(IngestEntry(1) + IngestEntry(2), kSuccess);
@@ -131,7 +133,8 @@ class DescriptionTest : public RtcmTest {
   template <class Change>
   ResultCode AddProjection(const Change& change) {
     ProjectionData projection;
-    projection.rtcmProjName = L"AUTO_DHDN_BESEL", projection.prjType = L"TMERC";
+    projection.rtcmProjName = L"AUTO_DHDN_BESEL";
+    projection.prjType = L"TMERC";
     projection.geoProj = std::make_unique<orx::cs::projmath::TUTMProj>(
         6377397.155, 6356078.963, 8.999999998, 1.0, 0.0, 3500000.0, 0.0);
     change(projection);

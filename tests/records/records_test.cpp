@@ -21,7 +21,9 @@ Doubles All(const double (&array)[count]) {
 TEST(EllipsoidalGrid, IsScaledToTheLastBitAndTheNextReplacesIt) {
   constexpr double kHalf = 2.42406840554768e-06;
   Rtcm1023 message;
-  message.horShiftIndicator = true, message.phi0 = 374415, message.lambda0 = 64815;
+  message.horShiftIndicator = true;
+  message.phi0 = 374415;
+  message.lambda0 = 64815;
   message.dPhi = message.dLambda = 30;
   TableData table;
   ConvertEllipsoidalGrid(message, table);
@@ -29,16 +31,22 @@ TEST(EllipsoidalGrid, IsScaledToTheLastBitAndTheNextReplacesIt) {
             (Doubles{0.9074984889848849, 0.0002181661564992912, 0.15700691062732322,
                      0.0002181661564992912, 7.27220521664304e-05, 7.27220521664304e-05}));
   message = Rtcm1023();
-  message.phi0 = -2, message.dLambda = 0x60000000;  // three of them do not fit in 32 bits
+  // three of them do not fit in 32 bits
+  message.phi0 = -2;
+  message.dLambda = 0x60000000;
   ConvertEllipsoidalGrid(message, table);
   EXPECT_EQ(All(table.bounds), (Doubles{-2 * kHalf, 0.0, -536870912.0 * 0.5 * kHalf,
                                         536870912.0 * kHalf, 0.0, 1610612736.0 * kHalf}));
-  EXPECT_TRUE(table.hasTable && !table.horShift);
+  EXPECT_TRUE(table.hasTable);
+  EXPECT_TRUE(!table.horShift);
 }
 
 TEST(PlaneGrid, IsScaledInWholeMetresOf32Bits) {
   Rtcm1024 message;
-  message.north0 = -500000000, message.east0 = 4000000000U, message.dN = 2, message.dE = 3;
+  message.north0 = -500000000;
+  message.east0 = 4000000000U;
+  message.dN = 2;
+  message.dE = 3;
   TableData table;
   ConvertPlaneGrid(table, message);
   EXPECT_EQ(All(table.bounds), (Doubles{-705032734.0, 60.0, 1345294291.0, 90.0, 20.0, 30.0}));
@@ -47,7 +55,9 @@ TEST(PlaneGrid, IsScaledInWholeMetresOf32Bits) {
 TEST(ValidityArea, LiesAroundItsCentreOrBeginsThere) {
   constexpr double kTwo = 9.69627362219072e-06;
   Rtcm1021 message;
-  message.phiV = 10, message.lambdaV = -4, message.dPhiV = 5;
+  message.phiV = 10;
+  message.lambdaV = -4;
+  message.dPhiV = 5;
   DatumData datum;
   ConvertValidityArea(message, datum);
   EXPECT_EQ(All(datum.validityArea), (Doubles{7.5 * kTwo, 5 * kTwo, -4 * kTwo, 6.283185307179586}));

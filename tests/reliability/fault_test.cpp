@@ -263,10 +263,12 @@ TEST(NextSave, MakesTheNameDurableThatSomebodyElseGave) {
   stage.Create();
   stage.tree.emplace(stage.Name(), nullptr, nullptr, true, 97);
   FileFaults::ForgetFlush(stage.path);
-  EXPECT_TRUE(stage.Add(L"S_1", "to a file as it was found") && FileFaults::IsDurable());
+  EXPECT_TRUE(stage.Add(L"S_1", "to a file as it was found"));
+  EXPECT_TRUE(FileFaults::IsDurable());
   stage.Append(L"S_2", "somebody else's");
   FileFaults::ForgetFlush(stage.path);
-  EXPECT_TRUE(stage.Add(L"S_3", "to a file that changed") && FileFaults::IsDurable());
+  EXPECT_TRUE(stage.Add(L"S_3", "to a file that changed"));
+  EXPECT_TRUE(FileFaults::IsDurable());
 }
 
 TEST(SaveAfresh, KeepsModeAndLinksAndIsNotNeeded) {
@@ -297,7 +299,8 @@ TEST(Load, SeesAWholeTreeWhileAnUnfinishedSaveIsWrittenOver) {
   stage.Append(L"S_2", std::string(whole + 1500, 'u'));
   stage.SetBytes(stage.Bytes().substr(0, 2 * whole + 1000));
   FileFaults::meanwhile = [&] {
-    EXPECT_TRUE(stage.Append(L"S_3", std::string(whole, 'x')) && stage.Append(L"S_4", "y"));
+    EXPECT_TRUE(stage.Append(L"S_3", std::string(whole, 'x')));
+    EXPECT_TRUE(stage.Append(L"S_4", "y"));
   };
   const orx::TCSInFileKey tree = stage.Load();
   EXPECT_EQ(tree.GetErrorState(), orx::kRegistryOk);

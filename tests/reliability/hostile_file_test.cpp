@@ -84,8 +84,10 @@ const struct Hostile {
 void Look(const RegistryFile& file, orx::RegistryError answer) {
   const orx::cs::velta::RTCMGenerator generator(1, file.Name(), file.Name());
   EXPECT_TRUE(generator.getAllDatums().empty());
-  EXPECT_FALSE(generator.getRtcmDatumMessage(0.9, 0.15, 0) || generator.get1023(0.9, 0.15, 0));
-  EXPECT_FALSE(generator.get1024(5e6, 3e6, 0) || generator.getRtcmProjMessage());
+  EXPECT_FALSE(generator.getRtcmDatumMessage(0.9, 0.15, 0));
+  EXPECT_FALSE(generator.get1023(0.9, 0.15, 0));
+  EXPECT_FALSE(generator.get1024(5e6, 3e6, 0));
+  EXPECT_FALSE(generator.getRtcmProjMessage());
   orx::TCSInFileKey tree = file.Load();
   Describe(tree);
   EXPECT_EQ(tree.GetErrorState(), answer);

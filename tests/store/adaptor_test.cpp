@@ -22,14 +22,18 @@ void ExpectKind(std::uint32_t type, std::uint32_t size) {
   const ValueDescriptor others[] = {{type, size + 1, 1}, {type == 2 ? 3U : 2U, size, 1}, {5, 0, 1}};
   TBinValue<T> value;
   for (const ValueDescriptor& other : others) {
-    EXPECT_TRUE(!value.GetData() && value.GetType() + value.GetSize() + value.GetByteSize() == 0);
+    EXPECT_TRUE(!value.GetData());
+    EXPECT_TRUE(value.GetType() + value.GetSize() + value.GetByteSize() == 0);
     EXPECT_EQ(value.SetFromDescriptor({type, size, 1}, ones.data(), false), kSuccess);
-    EXPECT_TRUE(value.GetType() == type && value.GetSize() == size && Held(value) == ones);
+    EXPECT_TRUE(value.GetType() == type);
+    EXPECT_TRUE(value.GetSize() == size);
+    EXPECT_TRUE(Held(value) == ones);
     EXPECT_EQ(value.SetFromDescriptor(other, ones.data(), true), kValueRefused);
   }
   EXPECT_TRUE(value.SetData(type, nullptr, size, true) && Held(value) == ones);  // the old value
   EXPECT_TRUE(value.SetData(0, nullptr, 0, true) && !value.GetData());
-  EXPECT_TRUE(value.Assign(TBinValue<T>(T())) == 0 && Held(value) == std::string(size, '\0'));
+  EXPECT_TRUE(value.Assign(TBinValue<T>(T())) == 0);
+  EXPECT_TRUE(Held(value) == std::string(size, '\0'));
 }
 
 TEST(TypedValue, TakesItsKindAndRefusesOthers) {
@@ -37,7 +41,8 @@ TEST(TypedValue, TakesItsKindAndRefusesOthers) {
   ExpectKind<unsigned int>(3, 4), ExpectKind<bool>(3, 1);
   ExpectKind<BinaryType<unsigned int>>(1, 4);
   TBinValue<bool> flag(false);
-  EXPECT_TRUE(flag.SetData(3, "\x80", 1, false) && flag.GetTypedValue());
+  EXPECT_TRUE(flag.SetData(3, "\x80", 1, false));
+  EXPECT_TRUE(flag.GetTypedValue());
 }
 
 TEST(StringValue, HoldsTextAsItIsStored) {
@@ -45,12 +50,17 @@ TEST(StringValue, HoldsTextAsItIsStored) {
   EXPECT_EQ(Held(value), std::string("A\0\xe9\0\x3c\xd8\x0d\xdf\0\0", 10));
   const std::string odd = "?" + Held(value);
   TBinValue<std::wstring> read;
-  EXPECT_TRUE(read.SetData(5, odd.data() + 1, 0, false) && Held(read) == Held(value));
+  EXPECT_TRUE(read.SetData(5, odd.data() + 1, 0, false));
+  EXPECT_TRUE(Held(read) == Held(value));
   const void* const own = static_cast<const char16_t*>(read.GetData()) + 1;
-  EXPECT_TRUE(read.SetData(5, own, 0, false) && read.GetTypedValue() == L"\u00e9\U0001F30D");
-  EXPECT_TRUE(read.SetData(5, nullptr, 0, false) && Held(read) == std::string(2, '\0'));
-  EXPECT_TRUE(read.Assign(value) == kSuccess && Held(read) == Held(value));
-  EXPECT_FALSE(read.SetData(5, u"A", 2, true) || read.SetData(1, u"A", 0, true));
+  EXPECT_TRUE(read.SetData(5, own, 0, false));
+  EXPECT_TRUE(read.GetTypedValue() == L"\u00e9\U0001F30D");
+  EXPECT_TRUE(read.SetData(5, nullptr, 0, false));
+  EXPECT_TRUE(Held(read) == std::string(2, '\0'));
+  EXPECT_TRUE(read.Assign(value) == kSuccess);
+  EXPECT_TRUE(Held(read) == Held(value));
+  EXPECT_FALSE(read.SetData(5, u"A", 2, true));
+  EXPECT_FALSE(read.SetData(1, u"A", 0, true));
 }
 
 TEST(BlockValue, IsHeldWhereItsSizeAndTheCopyFlagSay) {
@@ -59,12 +69,16 @@ TEST(BlockValue, IsHeldWhereItsSizeAndTheCopyFlagSay) {
                                             {9U, true, Storage::kShared},
                                             {9U, false, Storage::kBorrowed}}) {
     TSimpleBinValue value;
-    EXPECT_TRUE(value.SetData(1, kBytes, size, copy) && value.valid());
+    EXPECT_TRUE(value.SetData(1, kBytes, size, copy));
+    EXPECT_TRUE(value.valid());
     EXPECT_TRUE(value.storage() == storage && Held(value) == std::string(kBytes, size)) << size;
     EXPECT_EQ(value.GetData() == kBytes, storage == Storage::kBorrowed);
-    EXPECT_TRUE(value.SetData(3, nullptr, 7, copy) && !value.valid() && !value.GetData());
+    EXPECT_TRUE(value.SetData(3, nullptr, 7, copy));
+    EXPECT_TRUE(!value.valid());
+    EXPECT_TRUE(!value.GetData());
     EXPECT_EQ(value.GetType() * 10 + value.GetSize(), 37U);
-    EXPECT_TRUE(value.SetData(5, u"abc", 0, copy) && Held(value) == std::string("a\0b\0c\0\0", 8));
+    EXPECT_TRUE(value.SetData(5, u"abc", 0, copy));
+    EXPECT_TRUE(Held(value) == std::string("a\0b\0c\0\0", 8));
   }
 }
 
@@ -75,7 +89,8 @@ TEST(BlockValue, SharesABlockAndCanBeSetFromItsOwnBytes) {
     EXPECT_EQ(sharer.Assign(value), kSuccess);
     EXPECT_EQ(sharer.GetData(), value.GetData());
     EXPECT_EQ(sharer.Assign(TSimpleBinValue(1, kBytes, 9)), kSuccess);
-    EXPECT_TRUE(sharer.storage() == Storage::kShared && Held(sharer) == "012345678");
+    EXPECT_TRUE(sharer.storage() == Storage::kShared);
+    EXPECT_TRUE(Held(sharer) == "012345678");
     std::string expected = kBytes;
     for (const auto& [from, size] : {std::pair{2U, 12U}, {1U, 6U}, {2U, 3U}}) {
       value.SetData(1, static_cast<const char*>(value.GetData()) + from, size, copy);

@@ -30,19 +30,22 @@ TEST_F(LifecycleTest, DirectoriesAreTakenAsGivenOrTheUsers) {
 TEST_F(LifecycleTest, SummariesFollowTheLastSetAndAnAssignment) {
   CustomDatumData d;
   CustomProjectionData p;
-  EXPECT_FALSE(support_.GetCustomDatumData(d) || support_.GetCustomProjectionData(p));
+  EXPECT_FALSE(support_.GetCustomDatumData(d));
+  EXPECT_FALSE(support_.GetCustomProjectionData(p));
   EXPECT_EQ(d.datumGroup + d.transformationDll, L"RTCMRTCMGridHost.dll");
   EXPECT_EQ(p.projectionGroup + p.transformationDll + p.unitName, L"RTCMRTCMGridHost.dllMeters");
   support_.SetDatumEllipsoidName(L"Bessel"), m1021_.targetName = "D";
   ASSERT_EQ(Ingest(kDhdnSet), kSuccess);
-  EXPECT_TRUE(support_.GetCustomDatumData(d) && support_.GetCustomProjectionData(p));
+  EXPECT_TRUE(support_.GetCustomDatumData(d));
+  EXPECT_TRUE(support_.GetCustomProjectionData(p));
   EXPECT_EQ(d.datumName + d.ellipsoidName, L"DBessel");
   EXPECT_EQ(p.projectionName + p.datumName + p.projectionType, L"DDTMERC");
   EXPECT_EQ(support_.GetDatumSourceEllipsoid().second, 6356752.314);
   EXPECT_EQ(support_.GetDatumTargetEllipsoid().kind, orx::cs::projmath::Ellipsoid::kSemiMinorAxis);
   RTCMDataSupport other(L"a/", L"b/");
   other = support_;
-  EXPECT_FALSE(other.GetCustomDatumData(d) || other.GetCustomProjectionData(p));
+  EXPECT_FALSE(other.GetCustomDatumData(d));
+  EXPECT_FALSE(other.GetCustomProjectionData(p));
   EXPECT_EQ(d.datumName + p.projectionName + p.projectionType, L"DD");
   EXPECT_EQ(other.GetSourceDatumName() + other.GetRegionName(), L"ETRF89_ETRF89Europe");
   EXPECT_EQ(other.GetDatumPath() + other.GetProjectionPath(), datumPath_ + projectionPath_);
@@ -56,9 +59,13 @@ TEST_F(LifecycleTest, SummariesFollowTheLastSetAndAnAssignment) {
 TEST_F(LifecycleTest, OneObjectsEndUnloadsTheSiblingAndTheOtherGoesOn) {
   const std::wstring path = DatumFile().wstring();
   ASSERT_EQ(Ingest(k1021 | k1023), kSuccess);
-  EXPECT_TRUE(RTCMDataSupport::DLLdatum && RTCMDataSupport::DLLprojection && IsSiblingLoaded());
+  EXPECT_TRUE(RTCMDataSupport::DLLdatum);
+  EXPECT_TRUE(RTCMDataSupport::DLLprojection);
+  EXPECT_TRUE(IsSiblingLoaded());
   { const RTCMDataSupport other; }
-  EXPECT_FALSE(RTCMDataSupport::DLLdatum || RTCMDataSupport::DLLprojection || IsSiblingLoaded());
+  EXPECT_FALSE(RTCMDataSupport::DLLdatum);
+  EXPECT_FALSE(RTCMDataSupport::DLLprojection);
+  EXPECT_FALSE(IsSiblingLoaded());
   RTCMDataSupport::ReleasePtrDatumGFF(path), RTCMDataSupport::ReleasePtrProjectionGFF(path);
   ASSERT_EQ(Ingest(kDhdnSet), kSuccess);
   orx::TCSInFileKey* file = nullptr;

@@ -29,7 +29,8 @@ class WithoutSiblingTest : public testing::Test {
 
 TEST_F(WithoutSiblingTest, AbsentLibraryIsReportedByTheFirstUse) {
   const RTCMDataSupport support;
-  EXPECT_FALSE(RTCMDataSupport::DLLdatum || RTCMDataSupport::DLLprojection);
+  EXPECT_FALSE(RTCMDataSupport::DLLdatum);
+  EXPECT_FALSE(RTCMDataSupport::DLLprojection);
   ExpectOfBothKinds(kNoSiblingLibrary, kNoSiblingLibrary);
 }
 
@@ -37,7 +38,8 @@ TEST_F(WithoutSiblingTest, FileThatIsNoLibraryGivesTheLoadersStatus) {
   std::ofstream(SIBLING_FILE) << "no library";
   EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrDatumGFF(L"x.dff", &file_), kSiblingNotLoadable);
   EXPECT_EQ(RTCMDataSupport::GetUnlockedPtrProjectionGFF(L"x.prj", &file_), kSiblingNotLoadable);
-  EXPECT_FALSE(RTCMDataSupport::DLLdatum || RTCMDataSupport::DLLprojection);
+  EXPECT_FALSE(RTCMDataSupport::DLLdatum);
+  EXPECT_FALSE(RTCMDataSupport::DLLprojection);
   // Once the half-loaded library is held, it is the entry point that is missing.
   const RTCMDataSupport support;
   ExpectOfBothKinds(kSiblingNotLoadable, kNoSiblingLibrary);
