@@ -1,10 +1,10 @@
 // From a datum entry to the record of its 1021 or 1022.
 
 #include "generate/make_record.h"
-#include "generate/stored_entries.h"
 #include "records/message_units.h"
 #include "records/truncation.h"
 #include "store/gff_layout.h"
+#include "store/stored_entries.h"
 #include "velta/rtcm_generator.h"
 
 namespace orx::cs::velta {

@@ -1,11 +1,11 @@
 // From a stored residual grid to the record of its 1023 or 1024.
 
 #include "generate/make_record.h"
-#include "generate/stored_entries.h"
 #include "projmath/rect_rgn.h"
 #include "records/message_units.h"
 #include "records/truncation.h"
 #include "store/residual_grid.h"
+#include "store/stored_entries.h"
 #include "velta/rtcm_generator.h"
 
 namespace orx::cs::velta {

@@ -1,12 +1,12 @@
 // From a projection entry to the record of its 1025 or 1027.
 
 #include "generate/make_record.h"
-#include "generate/stored_entries.h"
 #include "records/message_units.h"
 #include "records/projection_types.h"
 #include "records/truncation.h"
 #include "store/gff_layout.h"
-#include "store/shared_file.h"
+#include "store/registry_tree.h"
+#include "store/stored_entries.h"
 #include "velta/rtcm_generator.h"
 
 namespace orx::cs::velta {

@@ -2,33 +2,12 @@
 
 #include <utility>
 
-#include "generate/stored_entries.h"
 #include "records/projection_types.h"
 #include "store/gff_layout.h"
-#include "store/residual_grid.h"
+#include "store/stored_entries.h"
 
 namespace orx::cs::velta {
 namespace {
-
-bool ReadDatum(const TGenericRegistryKey& container, const TGenericRegistryKey& entry,
-               DatumData& datum) {
-  const TGenericRegistryKey standard = OpenExisting(entry, layout::kStandardDatum);
-  projmath::TRectRgn area;
-  if (!ReadValidityArea(standard, area)) return false;
-  if (!ReadTransformation(container, standard, datum)) return false;
-  const TGenericRegistryKey gridKey = OpenExisting(entry, layout::kDatumGrid.key);
-  StoredGrid grid;
-  if (!ReadGridArea(gridKey, layout::kDatumGrid, grid)) return false;
-  if (!ReadGridValues(gridKey, grid)) return false;
-  datum.validityArea[0] = area.south;
-  datum.validityArea[1] = area.northExtent;
-  datum.validityArea[2] = area.west;
-  datum.validityArea[3] = area.eastExtent;
-  datum.validityCentre[0] = area.south + area.northExtent * 0.5;
-  datum.validityCentre[1] = area.west + area.eastExtent * 0.5;
-  datum.grid = grid.table;
-  return true;
-}
 
 /// Those of the keys that may be datum entries.
 std::size_t CountEntries(const TGenericRegistryKey& container) {

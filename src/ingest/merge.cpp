@@ -4,6 +4,7 @@
 
 #include "orxregistry/in_file_key.h"
 #include "orxregistry/registry_key.h"
+#include "store/registry_tree.h"
 #include "store/shared_file.h"
 #include "velta/rtcm_data_support.h"
 

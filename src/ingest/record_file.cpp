@@ -1,6 +1,7 @@
 #include "ingest/record_file.h"
 
 #include "orxutils/file_funcs.h"
+#include "store/registry_tree.h"
 
 namespace orx::cs::velta {
 

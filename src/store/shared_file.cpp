@@ -46,13 +46,4 @@ void ReadIfLost(TInFileKey& file) {
   if (file.GetErrorState() == kCannotBeOpened) file.Reload();
 }
 
-TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key) {
-  TGenRegKeyIterator walk(key);
-  return TGenericRegistryKey(walk++);
-}
-
-TGenericRegistryKey ContainerOf(const TInKey& tree) {
-  return FirstSubKey(TGenericRegistryKey(TGenericRegistryKeyPtr(tree)));
-}
-
 }  // namespace orx::cs::velta

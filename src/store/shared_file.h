@@ -10,10 +10,6 @@ namespace orx::cs::velta {
 
 inline constexpr const wchar_t* kSiblingLibrary = L"RTCMGridHost.dll";
 
-/// What registry trees are made and opened with.
-inline constexpr const wchar_t* kTreeDescription = L"Sylbri RTCM System";
-inline constexpr unsigned kTreeFlags = 97;
-
 struct FileKind {
   const wchar_t* extension;
   TDLLFuncWrapper& loader;     ///< of the sibling library
@@ -84,11 +80,5 @@ class Change {
 /// Reads a tree again that could not be read when a change of it was forgotten. To be called with
 /// the tree's lock, before anything is looked up in it.
 void ReadIfLost(TInFileKey& file);
-
-/// The first sub-key, null when there is none.
-TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key);
-
-/// The container key of a tree: the first under its root; null when there is none.
-TGenericRegistryKey ContainerOf(const TInKey& tree);
 
 }  // namespace orx::cs::velta

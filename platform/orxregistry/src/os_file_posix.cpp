@@ -12,6 +12,8 @@
 #include <cstdlib>
 #include <new>
 
+#include "lock_wait.h"
+#include "orxutils/file_error.h"
 #include "orxutils/file_funcs.h"
 #include "os_file.h"
 
@@ -28,6 +30,12 @@ auto Retry(Call call) {
   auto result = call();
   while (result < 0 && errno == EINTR) result = call();
   return result;
+}
+
+/// Keeps the system's error when a call has failed.
+bool Check(bool done) {
+  if (!done) KeepFileError();
+  return done;
 }
 
 FileStamp ToStamp(const struct stat& status) {
@@ -49,6 +57,13 @@ bool RenameToNewName(const char* from, const char* to) {
   return true;
 }
 
+bool Lock(int handle, const std::filesystem::path& path) {
+  if (Retry([&] { return flock(handle, LOCK_EX | LOCK_NB); }) == 0) return true;
+  if (errno != EWOULDBLOCK) return Check(false);
+  const LockWait waiting(path);
+  return Check(Retry([&] { return flock(handle, LOCK_EX); }) == 0);
+}
+
 bool HasOtherName(int handle) {
   struct stat status;
   return fstat(handle, &status) == 0 && status.st_nlink > 1;
@@ -58,7 +73,7 @@ bool HasOtherName(int handle) {
 
 std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
   const int handle = Retry([&] { return open(path.c_str(), kToRead); });
-  if (handle < 0) return std::nullopt;
+  if (!Check(handle >= 0)) return std::nullopt;
   return File(handle);
 }
 
@@ -66,15 +81,15 @@ std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool cre
   const int flags = O_RDWR | O_CLOEXEC | (create ? O_CREAT | O_NOFOLLOW : 0);
   for (;;) {
     const int handle = Retry([&] { return open(path.c_str(), flags, kNewFileMode); });
-    if (handle < 0) return std::nullopt;
+    if (!Check(handle >= 0)) return std::nullopt;
     File file(handle);
     // A process that was stopped in RenameToNewName leaves a finished file with two names. It is
     // not locked here: a caller that holds it by its right name would wait for itself.
     if (create && HasOtherName(handle)) {
-      if (unlink(path.c_str()) != 0 && errno != ENOENT) return std::nullopt;
+      if (!Check(unlink(path.c_str()) == 0 || errno == ENOENT)) return std::nullopt;
       continue;
     }
-    if (Retry([&] { return flock(handle, LOCK_EX); }) != 0) return std::nullopt;
+    if (!Lock(handle, path)) return std::nullopt;
     // While this waited, the file may have got its name, or been replaced by another of this name.
     if (create && HasOtherName(handle)) continue;
     const std::optional<FileStamp> opened = file.Stamp();
@@ -90,7 +105,7 @@ File::~File() {
 
 std::optional<FileStamp> File::Stamp() const {
   struct stat status;
-  if (fstat(handle_, &status) != 0) return std::nullopt;
+  if (!Check(fstat(handle_, &status) == 0)) return std::nullopt;
   return ToStamp(status);
 }
 
@@ -100,7 +115,7 @@ std::optional<std::size_t> File::Read(std::uint64_t offset, unsigned char* to,
   while (done < size) {
     const ssize_t count = Retry(
         [&] { return pread(handle_, to + done, size - done, static_cast<off_t>(offset + done)); });
-    if (count < 0) return std::nullopt;
+    if (!Check(count >= 0)) return std::nullopt;
     if (count == 0) break;
     done += static_cast<std::size_t>(count);
   }
@@ -113,14 +128,14 @@ bool File::Write(std::uint64_t offset, const unsigned char* from, std::size_t si
     const ssize_t count = Retry([&] {
       return pwrite(handle_, from + done, size - done, static_cast<off_t>(offset + done));
     });
-    if (count <= 0) return false;
+    if (!Check(count > 0)) return false;
     done += static_cast<std::size_t>(count);
   }
   return true;
 }
 
 bool File::Truncate(std::uint64_t size) {
-  return Retry([&] { return ftruncate(handle_, static_cast<off_t>(size)); }) == 0;
+  return Check(Retry([&] { return ftruncate(handle_, static_cast<off_t>(size)); }) == 0);
 }
 
 bool File::TakeAccessOf(const File& other) {
@@ -136,7 +151,7 @@ bool File::TakeAccessOf(const File& other) {
 }
 
 bool File::Flush() {
-  return Retry([&] { return fdatasync(handle_); }) == 0;
+  return Check(Retry([&] { return fdatasync(handle_); }) == 0);
 }
 
 Memory::Memory(std::size_t size) {
@@ -163,7 +178,7 @@ std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
   const bool renamed = replace ? std::rename(from.c_str(), to.c_str()) == 0
                                : RenameToNewName(from.c_str(), to.c_str());
-  return renamed && FileFuncs::flushName(to);
+  return Check(renamed && FileFuncs::flushName(to));
 }
 
 std::filesystem::path WithoutLinks(const std::filesystem::path& path) {

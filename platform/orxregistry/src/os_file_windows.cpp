@@ -6,6 +6,8 @@
 #include <string>
 #include <vector>
 
+#include "lock_wait.h"
+#include "orxutils/file_error.h"
 #include "orxutils/path.h"
 #include "os_file.h"
 
@@ -23,6 +25,12 @@ constexpr DWORD kLockedByteHigh = 0x7FFFFFFF;
 constexpr auto kFileRenameInfoEx = static_cast<FILE_INFO_BY_HANDLE_CLASS>(22);
 constexpr DWORD kReplaceIfExists = 1;
 constexpr DWORD kPosixSemantics = 2;
+
+/// Keeps the system's error when a call has failed.
+bool Check(bool done) {
+  if (!done) KeepFileError();
+  return done;
+}
 
 HANDLE Open(const std::filesystem::path& path, DWORD access, DWORD disposition,
             DWORD flags = FILE_ATTRIBUTE_NORMAL) {
@@ -53,10 +61,17 @@ std::optional<FileStamp> StampOfOpen(HANDLE handle) {
   return stamp;
 }
 
-bool Lock(HANDLE handle) {
-  OVERLAPPED place = {};
-  place.OffsetHigh = kLockedByteHigh;
-  return LockFileEx(handle, LOCKFILE_EXCLUSIVE_LOCK, 0, 1, 0, &place);
+bool Lock(HANDLE handle, const std::filesystem::path& path) {
+  const auto ask = [handle](DWORD flags) {
+    OVERLAPPED place = {};
+    place.OffsetHigh = kLockedByteHigh;
+    return LockFileEx(handle, LOCKFILE_EXCLUSIVE_LOCK | flags, 0, 1, 0, &place) != 0;
+  };
+  if (ask(LOCKFILE_FAIL_IMMEDIATELY)) return true;
+  const DWORD error = GetLastError();
+  if (error != ERROR_LOCK_VIOLATION && error != ERROR_IO_PENDING) return Check(false);
+  const LockWait waiting(path);
+  return Check(ask(0));
 }
 
 /// Replaces a file that others have open: they keep the old one.
@@ -106,7 +121,7 @@ bool PutBack(const std::filesystem::path& path) {
   const std::filesystem::path old = OldNameOf(path);
   const HANDLE handle = Open(old, GENERIC_READ, OPEN_EXISTING);
   if (!handle) return false;
-  if (Lock(handle)) Move(old, path, 0);  // fails where there is a file of that name again
+  if (Lock(handle, path)) Move(old, path, 0);  // fails where there is a file of that name again
   CloseHandle(handle);
   return true;
 }
@@ -121,7 +136,7 @@ HANDLE OpenOrPutBack(const std::filesystem::path& path, DWORD access, DWORD disp
 
 std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
   const HANDLE handle = OpenOrPutBack(path, GENERIC_READ, OPEN_EXISTING);
-  if (!handle) return std::nullopt;
+  if (!Check(handle != nullptr)) return std::nullopt;
   return File(handle);
 }
 
@@ -129,9 +144,9 @@ std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool cre
   for (;;) {
     const HANDLE handle =
         OpenOrPutBack(path, GENERIC_READ | GENERIC_WRITE, create ? OPEN_ALWAYS : OPEN_EXISTING);
-    if (!handle) return std::nullopt;
+    if (!Check(handle != nullptr)) return std::nullopt;
     File file(handle);
-    if (!Lock(handle)) return std::nullopt;
+    if (!Lock(handle, path)) return std::nullopt;
     // While this waited, the file may have been replaced by another of the same name.
     const std::optional<FileStamp> opened = file.Stamp();
     const std::optional<FileStamp> named = StampOf(path);
@@ -159,6 +174,7 @@ std::optional<std::size_t> File::Read(std::uint64_t offset, unsigned char* to,
     DWORD count = 0;
     if (!ReadFile(handle_, to + done, wanted, &count, &place)) {
       if (GetLastError() == ERROR_HANDLE_EOF) break;
+      KeepFileError();
       return std::nullopt;
     }
     if (count == 0) break;
@@ -173,7 +189,8 @@ bool File::Write(std::uint64_t offset, const unsigned char* from, std::size_t si
     OVERLAPPED place = At(offset + done);
     const auto wanted = static_cast<DWORD>(std::min(size - done, kLargestCall));
     DWORD count = 0;
-    if (!WriteFile(handle_, from + done, wanted, &count, &place) || count == 0) return false;
+    const bool written = WriteFile(handle_, from + done, wanted, &count, &place) && count > 0;
+    if (!Check(written)) return false;
     done += count;
   }
   return true;
@@ -182,12 +199,12 @@ bool File::Write(std::uint64_t offset, const unsigned char* from, std::size_t si
 bool File::Truncate(std::uint64_t size) {
   LARGE_INTEGER end;
   end.QuadPart = static_cast<LONGLONG>(size);
-  return SetFilePointerEx(handle_, end, nullptr, FILE_BEGIN) && SetEndOfFile(handle_);
+  return Check(SetFilePointerEx(handle_, end, nullptr, FILE_BEGIN) && SetEndOfFile(handle_));
 }
 
 bool File::TakeAccessOf(const File&) { return true; }
 
-bool File::Flush() { return FlushFileBuffers(handle_) != 0; }
+bool File::Flush() { return Check(FlushFileBuffers(handle_) != 0); }
 
 Memory::Memory(std::size_t size) : bytes_(new unsigned char[size]) {}
 
@@ -203,9 +220,10 @@ std::optional<FileStamp> StampOf(const std::filesystem::path& path) {
 bool Rename(const std::filesystem::path& from, const std::filesystem::path& to, bool replace) {
   if (!replace) {
     PutBack(to);
-    return Move(from, to, 0);
+    return Check(Move(from, to, 0));
   }
-  return RenameOver(from, to) || Move(from, to, MOVEFILE_REPLACE_EXISTING) || SwapIn(from, to);
+  return Check(RenameOver(from, to) || Move(from, to, MOVEFILE_REPLACE_EXISTING) ||
+               SwapIn(from, to));
 }
 
 std::filesystem::path WithoutLinks(const std::filesystem::path& path) { return path; }

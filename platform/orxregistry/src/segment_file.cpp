@@ -6,6 +6,7 @@
 #include <utility>
 
 #include "key_tree.h"
+#include "orxutils/file_error.h"
 #include "orxutils/file_funcs.h"
 
 #define XXH_INLINE_ALL
@@ -266,11 +267,15 @@ AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
     // An append needs less room, and fewer rights. But the new file may have the name already.
     const std::optional<os::FileStamp> named = os::StampOf(path);
     if (!named || !named->IsSameFile(at.stamp)) return AppendResult::kFailed;
+    ForgetFileError();
   }
   FinishSegment(segment, 0, at.end, at.superseded);
   // Before anything is promised that could go with the name.
   at.isNameDurable = at.isNameDurable || FileFuncs::flushName(path);
-  if (!at.isNameDurable) return AppendResult::kFailed;
+  if (!at.isNameDurable) {
+    KeepFileError();
+    return AppendResult::kFailed;
+  }
   const bool cutOff = at.stamp.size == at.end || file->Truncate(at.end);
   const bool written =
       cutOff && file->Write(at.end, segment.data(), segment.size()) && file->Flush();

@@ -7,6 +7,7 @@
 #include <optional>
 #include <system_error>
 
+#include "orxutils/file_error.h"
 #include "orxutils/file_funcs.h"
 #include "orxutils/path.h"
 
@@ -47,8 +48,18 @@ bool MakeDirectory(const fs::path& path, std::error_code& error) {
   if (fs::is_directory(path, error)) return true;
   const fs::path parent = path.has_parent_path() ? path.parent_path() : ".";
   if (parent != path && !MakeDirectory(parent, error)) return false;
-  if (!fs::create_directory(path, error)) return fs::is_directory(path, error);  // another's
+  if (!fs::create_directory(path, error)) {
+    std::error_code ignored;
+    if (fs::is_directory(path, ignored)) {  // another's
+      error.clear();
+      return true;
+    }
+    errno = error.value();
+    KeepFileError();
+    return false;
+  }
   if (flushName(path)) return true;
+  KeepFileError();
   fs::remove(path, error);
   return false;
 }

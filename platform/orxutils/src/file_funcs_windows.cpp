@@ -7,6 +7,7 @@
 #include <filesystem>
 #include <memory>
 
+#include "orxutils/file_error.h"
 #include "orxutils/file_funcs.h"
 #include "orxutils/path.h"
 
@@ -50,9 +51,12 @@ bool createDirectoryTree(const COrxStringT<wchar_t>& name) {
   const std::filesystem::path path = name;
   const std::filesystem::path parent = path.parent_path();
   if (parent != path) createDirectoryTree(parent.wstring());
-  // Others may be making it, too.
-  CreateDirectoryW(ToPath(name)->c_str(), nullptr);
-  return isDirExists(name);
+  if (CreateDirectoryW(ToPath(name)->c_str(), nullptr)) return true;
+  const DWORD error = GetLastError();
+  if (isDirExists(name)) return true;  // others have made it
+  SetLastError(error);
+  KeepFileError();
+  return false;
 }
 
 bool flushName(const std::filesystem::path&) noexcept {

@@ -3,6 +3,7 @@
 #include <boost/thread/recursive_mutex.hpp>
 #include <cstdint>
 #include <filesystem>
+#include <functional>
 #include <memory>
 
 #include "orxregistry/export.h"
@@ -23,6 +24,13 @@ enum RegistryError : std::uint32_t {
 
 /// The only registry version there is.
 inline constexpr unsigned kRegistryVersion = 512;
+
+/// Hears of a file whose lock another process holds, from a thread of its own.
+using AwaitedLock = std::function<void(const COrxStringT<wchar_t>& file)>;
+
+/// Has it told when a save waits for a file's lock for more than a second.
+/// \param tell may be empty; to be set before the first save
+ORXREGISTRY_EXPORT void OnAwaitedLock(AwaitedLock tell);
 
 /// A registry tree.
 class ORXREGISTRY_EXPORT TInKey {
@@ -61,7 +69,7 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
   /// Appends what changed since the last save to the tree's own file, which is made for a new tree,
   /// or writes the file afresh when more than half of it is superseded. Durable when it returns
   /// true. When it returns false, what was durable stays loadable and the tree keeps its changes
-  /// for another try.
+  /// for another try; KeptFileError() tells what the system said.
   /// \param flag no meaning here
   /// \param registryVersion kRegistryVersion
   bool Save(bool flag, unsigned registryVersion);

@@ -1,4 +1,4 @@
-#include "generate/stored_entries.h"
+#include "store/stored_entries.h"
 
 #include <algorithm>
 
@@ -6,7 +6,8 @@
 #include "orxutils/file_funcs.h"
 #include "records/message_units.h"
 #include "store/gff_layout.h"
-#include "store/shared_file.h"
+#include "store/registry_tree.h"
+#include "store/residual_grid.h"
 
 namespace orx::cs::velta {
 namespace {
@@ -55,6 +56,26 @@ bool ReadTransformation(const TGenericRegistryKey& container, const TGenericRegi
   datum.heightIndicator = static_cast<std::uint32_t>(height);
   return Read(standard, layout::kSourceDatumName, datum.sourceDatumName) &&
          Read(container, layout::kDatumFileName, datum.targetDatumName);
+}
+
+bool ReadDatum(const TGenericRegistryKey& container, const TGenericRegistryKey& entry,
+               DatumData& datum) {
+  const TGenericRegistryKey standard = OpenExisting(entry, layout::kStandardDatum);
+  projmath::TRectRgn area;
+  if (!ReadValidityArea(standard, area)) return false;
+  if (!ReadTransformation(container, standard, datum)) return false;
+  const TGenericRegistryKey gridKey = OpenExisting(entry, layout::kDatumGrid.key);
+  StoredGrid grid;
+  if (!ReadGridArea(gridKey, layout::kDatumGrid, grid)) return false;
+  if (!ReadGridValues(gridKey, grid)) return false;
+  datum.validityArea[0] = area.south;
+  datum.validityArea[1] = area.northExtent;
+  datum.validityArea[2] = area.west;
+  datum.validityArea[3] = area.eastExtent;
+  datum.validityCentre[0] = area.south + area.northExtent * 0.5;
+  datum.validityCentre[1] = area.west + area.eastExtent * 0.5;
+  datum.grid = grid.table;
+  return true;
 }
 
 }  // namespace orx::cs::velta

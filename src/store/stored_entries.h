@@ -23,4 +23,10 @@ bool ReadValidityArea(const TGenericRegistryKey& standard, projmath::TRectRgn& a
 bool ReadTransformation(const TGenericRegistryKey& container, const TGenericRegistryKey& standard,
                         DatumData& datum);
 
+/// Reads a whole datum entry, as RTCMGenerator::getAllDatums() gives it.
+/// \return false when anything of it is missing or of another kind or size; `datum` is then half
+///     filled
+bool ReadDatum(const TGenericRegistryKey& container, const TGenericRegistryKey& entry,
+               DatumData& datum);
+
 }  // namespace orx::cs::velta

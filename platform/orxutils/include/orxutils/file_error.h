@@ -1,0 +1,23 @@
+#pragma once
+
+#include <string>
+
+#include "orxutils/export.h"
+
+/// Why a file could not be used. Operations on files answer only whether they worked; the first of
+/// the system's calls that failed meanwhile is kept, in each thread its own.
+namespace orx {
+
+/// Keeps the system's last error, unless one is kept already. To be called right behind a call that
+/// failed.
+ORXUTILS_EXPORT void KeepFileError() noexcept;
+
+/// Forgets the error that is kept. To be called before an operation of which one wants to know why
+/// it failed.
+ORXUTILS_EXPORT void ForgetFileError() noexcept;
+
+/// What the system says of the error that is kept, in UTF-8: "No space left on device". Empty when
+/// none is.
+ORXUTILS_EXPORT std::string KeptFileError();
+
+}  // namespace orx
