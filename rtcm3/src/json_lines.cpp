@@ -4,6 +4,8 @@
 #include <charconv>
 #include <nlohmann/json.hpp>
 #include <optional>
+#include <set>
+#include <string>
 #include <type_traits>
 #include <variant>
 
@@ -74,6 +76,18 @@ class JsonWriter {
   std::string& out_;
 };
 
+/// The begin of a text that is not ours, for an error that names it.
+std::string Excerpt(std::string text) {
+  constexpr std::size_t kMost = 40;
+  if (text.size() <= kMost) return text;
+  const auto isInsideCharacter = [](char c) {
+    return (static_cast<unsigned char>(c) & 0xC0U) == 0x80U;
+  };
+  std::size_t end = kMost;
+  while (isInsideCharacter(text[end])) --end;
+  return text.substr(0, end) + "...";
+}
+
 /// The integer that a JSON value holds, if it holds one of the range.
 template <class Member>
 Member Integer(const std::string& field, unsigned width, const json& value) {
@@ -81,7 +95,7 @@ Member Integer(const std::string& field, unsigned width, const json& value) {
   const bool held = value.is_number_unsigned()  ? Holds(range, value.get<std::uint64_t>())
                     : value.is_number_integer() ? Holds(range, value.get<std::int64_t>())
                                                 : false;
-  if (!held) throw RangeError(range, field, value.dump());
+  if (!held) throw RangeError(range, field, Excerpt(value.dump()));
   return static_cast<Member>(value.get<std::int64_t>());
 }
 
@@ -118,7 +132,7 @@ class JsonReader {
 
   /// \throws FieldError when something is left
   void Finish() const {
-    if (!object_.empty()) throw FieldError(object_.begin().key() + " is no field of the message");
+    if (!object_.empty()) throw FieldError(Excerpt(object_.begin().key()) + " is no field of the message");
   }
 
   json Take(const char* name) {
@@ -147,6 +161,25 @@ class JsonReader {
   json& object_;
 };
 
+/// Parses a line that holds an object of numbers, texts and arrays of numbers.
+/// \throws FieldError for anything else, and for a name that comes twice
+json ParseFlatObject(std::string_view line) {
+  constexpr int kDepthOfFields = 1;
+  std::set<std::string> names;
+  const auto check = [&names](int depth, json::parse_event_t event, json& parsed) {
+    const bool opens =
+        event == json::parse_event_t::array_start || event == json::parse_event_t::object_start;
+    if (opens && depth > kDepthOfFields) throw FieldError("a field has fields of its own");
+    if (event != json::parse_event_t::key || depth > kDepthOfFields) return true;
+    const auto& name = parsed.get_ref<const std::string&>();
+    if (!names.insert(name).second) throw FieldError(Excerpt(name) + " comes twice");
+    return true;
+  };
+  json object = json::parse(line, check, false);
+  if (!object.is_object()) throw FieldError("not a JSON object");
+  return object;
+}
+
 }  // namespace
 
 void AppendJsonLine(const Message& message, std::string& out) {
@@ -157,13 +190,16 @@ void AppendJsonLine(const Message& message, std::string& out) {
 }
 
 Message ParseJsonLine(std::string_view line) {
-  json object = json::parse(line, nullptr, false);
-  if (!object.is_object()) throw FieldError("not a JSON object");
+  if (line.size() > kMaxJsonLine) {
+    throw FieldError("longer than " + std::to_string(kMaxJsonLine) + " bytes");
+  }
+  json object = ParseFlatObject(line);
   JsonReader reader(object);
   Message message;
   const json number = reader.Take("message");
   if (!number.is_number_unsigned() || !Reset(message, number.get<std::uint64_t>())) {
-    throw FieldError("message must be an integer from 1021 to 1027, not " + number.dump());
+    throw FieldError("message must be an integer from 1021 to 1027, not " +
+                     Excerpt(number.dump()));
   }
   std::visit([&reader](auto& record) { VisitFields(reader, record); }, message);
   reader.Finish();

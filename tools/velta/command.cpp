@@ -4,11 +4,15 @@
 #include <cstdio>
 #include <iostream>
 
+#include "terminal.h"
+
 namespace velta_tool {
 
-void ReportFailure(std::string_view what) { std::cerr << "velta: " << what << '\n'; }
+void ReportFailure(std::string_view what) {
+  std::cerr << WithoutControls("velta: " + std::string(what) + '\n');
+}
 
-void ReportNote(std::string_view what) { std::cerr << "velta: note: " << what << '\n'; }
+void ReportNote(std::string_view what) { ReportFailure("note: " + std::string(what)); }
 
 std::string CodeText(orx::cs::velta::ResultCode code) {
   char text[sizeof "0x00000000"];

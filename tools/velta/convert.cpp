@@ -1,8 +1,8 @@
 #include <CLI/App.hpp>
 #include <CLI/Config.hpp>
 #include <CLI/Formatter.hpp>
-#include <istream>
 #include <memory>
+#include <streambuf>
 #include <string>
 
 #include "command.h"
@@ -25,7 +25,7 @@ struct Conversion {
 
 int DecodeStream(const Conversion& files) {
   Input in(files.from);
-  Output out(files.to);
+  Output out(files.to, OutputKind::kText, {files.from});
   Progress progress;
   rtcm3::StreamCounts counts;
   StreamNotes notes(files.from, counts);
@@ -40,7 +40,7 @@ int DecodeStream(const Conversion& files) {
       rtcm3::AppendJsonLine(*message, out.pending());
       out.FlushMuch();
     }
-    out.Flush();
+    counts.frames.frames > 0 ? out.Finish() : out.Discard();
     progress.Clear();
     notes.Tell();
     if (PassedOver(counts)) ReportNote(files.from + ": " + Summary(counts));
@@ -59,22 +59,37 @@ int DecodeStream(const Conversion& files) {
   return finish();
 }
 
+/// Reads a line without its end. Of one that is too long to be a message's, it keeps just so much
+/// that it is refused.
+/// \return false at the end of the input
+bool ReadLine(std::streambuf& in, std::string& line) {
+  using Traits = std::streambuf::traits_type;
+  line.clear();
+  for (;;) {
+    const Traits::int_type next = in.sbumpc();
+    if (Traits::eq_int_type(next, Traits::eof())) return !line.empty();
+    const char c = Traits::to_char_type(next);
+    if (c == '\n') return true;
+    if (line.size() <= rtcm3::kMaxJsonLine) line += c;
+  }
+}
+
 int EncodeLines(const Conversion& files) {
   Input in(files.from);
-  Output out(files.to);
+  Output out(files.to, OutputKind::kFrames, {files.from});
   int status = kDone;
+  bool hasFrames = false;
   const auto finish = [&] {
-    out.Flush();
+    status == kDone || hasFrames ? out.Finish() : out.Discard();
     return status;
   };
   FinishWhenInterrupted(finish);
-  std::istream lines(&in.buffer());
-  lines.exceptions(std::ios::badbit);
   std::string line;
-  for (std::size_t number = 1; std::getline(lines, line); ++number) {
+  for (std::size_t number = 1; ReadLine(in.buffer(), line); ++number) {
     if (line.find_first_not_of(" \t\r") == std::string::npos) continue;
     try {
       rtcm3::Encode(rtcm3::ParseJsonLine(line), out.pending());
+      hasFrames = true;
     } catch (const rtcm3::FieldError& error) {
       ReportFailure(files.from + ":" + std::to_string(number) + ": " + error.what());
       status = kFailed;
@@ -89,8 +104,11 @@ CLI::App* AddConversion(CLI::App& program, Action& action, const std::string& na
                         const std::string& help, int (*work)(const Conversion&)) {
   const auto files = std::make_shared<Conversion>();
   CLI::App* command = program.add_subcommand(name, help);
-  command->add_option("FILE", files->from, "the input, \"-\" for standard input")->required();
+  command->add_option("FILE", files->from, "the input, \"-\" for standard input")
+      ->required()
+      ->check(kFileName);
   command->add_option("-o,--output", files->to, "the output, \"-\" for standard output")
+      ->check(kFileName)
       ->capture_default_str();
   command->callback([&action, files, work] { action = [files, work] { return work(*files); }; });
   return command;

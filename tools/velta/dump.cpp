@@ -129,7 +129,9 @@ void AddDump(CLI::App& program, Action& action) {
   const auto file = std::make_shared<std::string>();
   CLI::App* command =
       program.add_subcommand("dump", "Shows everything that a datum or projection file holds.");
-  command->add_option("FILE", *file, "the file, whatever its extension")->required();
+  command->add_option("FILE", *file, "the file, whatever its extension")
+      ->required()
+      ->check(kFileName);
   command->footer(
       "Prints the tree of keys as JSON: the values of a key with type (1 bytes, 2 signed integer,\n"
       "3 unsigned integer, 5 text), size in bytes, dimension and bytes, and what integers and\n"

@@ -2,9 +2,12 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <cstdio>
 #include <iostream>
+#include <random>
 #include <stdexcept>
 #include <system_error>
+#include <utility>
 
 #include "command.h"
 #include "interrupt.h"
@@ -12,6 +15,7 @@
 #include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
 #include "orxutils/path.h"
+#include "terminal.h"
 
 namespace velta_tool {
 namespace fs = std::filesystem;
@@ -49,6 +53,21 @@ class InterruptibleBuffer : public std::streambuf {
   std::streambuf& source_;
   std::vector<char> memory_;
 };
+
+bool IsInput(const std::string& input, const fs::path& path) {
+  if (input == kStandardStream) return orx::FileFuncs::isSameFile(stdin, path);
+  std::error_code ignored;
+  return fs::equivalent(orx::ToSystemPath(ToPath(input)), path, ignored);
+}
+
+/// True for a file that is one, whatever its name, and for the name of one.
+bool IsRegistryFile(const std::string& name) {
+  if (KindOf(name) != FileKind::kOther) return true;
+  if (!orx::FileFuncs::isFileExists(ToWide(name))) return false;
+  const std::uint32_t error =
+      orx::TInFileKey(ToWide(name), nullptr, nullptr, true, 0).GetErrorState();
+  return error == orx::kRegistryOk || error == orx::kDamaged;
+}
 
 CLI::Validator KindCheck(const std::string& extensions, bool (*accepts)(FileKind)) {
   return CLI::Validator(
@@ -88,6 +107,8 @@ void RequireFile(const std::string& file) {
   }
 }
 
+const CLI::Validator kFileName([](std::string& name) { return name.empty() ? "the name is empty" : ""; },
+                               "");
 const CLI::Validator kDatumFile =
     KindCheck(".dff", [](FileKind kind) { return kind == FileKind::kDatum; });
 const CLI::Validator kProjectionFile =
@@ -110,13 +131,38 @@ Input::Input(const std::string& name) : memory_(kInputBuffer) {
   buffer_ = std::make_unique<InterruptibleBuffer>(file_);
 }
 
-Output::Output(const std::string& name) : name_(name), buffer_(std::cout.rdbuf()) {
-  if (name == kStandardStream) return;
-  const fs::path path = orx::ToSystemPath(ToPath(name));
-  if (!file_.open(path, std::ios::out | std::ios::binary | std::ios::trunc)) {
-    throw FileError(name, "cannot be written");
+Output::Output(const std::string& name, OutputKind kind, const std::vector<std::string>& inputs)
+    : name_(name), kind_(kind), buffer_(std::cout.rdbuf()) {
+  if (name == kStandardStream) {
+    const bool isTerminal = orx::FileFuncs::isTerminal(stdout);
+    if (isTerminal && kind == OutputKind::kFrames) {
+      throw WrongCall("frames are not written to a terminal: name a file with -o, or use a pipe");
+    }
+    return;
   }
+  const fs::path path = orx::ToSystemPath(ToPath(name));
+  for (const std::string& input : inputs) {
+    if (IsInput(input, path)) throw WrongCall(name + ": is the input, too");
+  }
+  if (IsRegistryFile(name)) throw WrongCall(name + ": a datum or projection file is not replaced");
+  Open(path);
   buffer_ = &file_;
+}
+
+void Output::Open(const fs::path& path) {
+  std::error_code error;
+  const fs::file_status status = fs::status(path, error);
+  fs::path opened = path;
+  if (!fs::exists(status) || fs::is_regular_file(status)) {
+    place_ = fs::exists(status) ? fs::canonical(path) : path;
+    do {
+      beside_ = place_;
+      beside_ += "." + std::to_string(std::random_device()()) + ".part";
+    } while (fs::exists(beside_, error));
+    opened = beside_;
+  }
+  if (!file_.open(opened, std::ios::out | std::ios::binary)) Fail();
+  if (fs::exists(status) && !beside_.empty()) fs::permissions(beside_, status.permissions(), error);
 }
 
 void Output::FlushMuch() {
@@ -124,12 +170,39 @@ void Output::FlushMuch() {
 }
 
 void Output::Flush() {
+  if (kind_ == OutputKind::kText) pending_ = WithoutControls(std::move(pending_));
   const auto size = static_cast<std::streamsize>(pending_.size());
   const bool written = buffer_->sputn(pending_.data(), size) == size && buffer_->pubsync() == 0;
   pending_.clear();
-  if (!written) {
-    throw FileError(name_ == kStandardStream ? "standard output" : name_, "cannot be written");
+  if (!written) Fail();
+}
+
+void Output::Finish() {
+  Flush();
+  if (beside_.empty()) return;
+  if (!file_.close()) Fail();
+  std::error_code error;
+  fs::rename(beside_, place_, error);
+  if (error) {
+    errno = error.value();
+    Fail();
   }
+  beside_.clear();
+}
+
+void Output::Discard() {
+  if (beside_.empty()) return;
+  file_.close();
+  std::error_code ignored;
+  fs::remove(beside_, ignored);
+  beside_.clear();
+}
+
+void Output::Fail() {
+  const int reason = errno;
+  Discard();
+  errno = reason;
+  throw FileError(name_ == kStandardStream ? "standard output" : name_, "cannot be written");
 }
 
 bool ReportErrorState(const std::string& file, std::uint32_t error) {

@@ -5,6 +5,7 @@
 #include <filesystem>
 #include <fstream>
 #include <memory>
+#include <stdexcept>
 #include <streambuf>
 #include <string>
 #include <vector>
@@ -28,6 +29,14 @@ FileKind KindOf(const std::string& file);
 /// \throws std::runtime_error when there is no such file
 void RequireFile(const std::string& file);
 
+/// What nobody should have asked for: it is refused before anything is done.
+struct WrongCall : std::runtime_error {
+  using std::runtime_error::runtime_error;
+};
+
+/// Accepts any name but an empty one, which is mostly a variable that is not set.
+extern const CLI::Validator kFileName;
+
 /// Accepts names of datum files, or of datum and projection files.
 extern const CLI::Validator kDatumFile;
 extern const CLI::Validator kProjectionFile;
@@ -48,25 +57,48 @@ class Input {
   std::unique_ptr<std::streambuf> buffer_;
 };
 
-/// A file to write or, under the name "-", standard output.
+/// What is written to an output.
+enum class OutputKind { kText, kFrames };
+
+/// A file to write or, under the name "-", standard output. A file is written beside its place and
+/// gets its name when it is whole; until then what was there stays. Control characters, which may
+/// come from a stream or a file, are written as "\u001b" is.
 class Output {
  public:
+  /// Standard output, for text.
+  Output() : Output("-", OutputKind::kText, {}) {}
+
+  /// \param inputs the names of the files that are read meanwhile
+  /// \throws WrongCall for frames to a terminal, for an input's or a registry file's name
   /// \throws std::runtime_error when the file cannot be made
-  explicit Output(const std::string& name = "-");
+  Output(const std::string& name, OutputKind kind, const std::vector<std::string>& inputs);
   Output(const Output&) = delete;
   Output& operator=(const Output&) = delete;
+  ~Output() { Discard(); }
 
-  /// Text that goes out when there is much of it, or by Flush().
+  /// What goes out when there is much of it, or by Flush().
   std::string& pending() { return pending_; }
-  /// Writes the pending text if there is much of it.
+  /// Writes what is pending if it is much.
   /// \throws std::runtime_error when it cannot be written
   void FlushMuch();
-  /// Writes the pending text.
+  /// Writes what is pending.
   /// \throws std::runtime_error when it cannot be written
   void Flush();
 
+  /// Writes what is pending, and gives the file its name.
+  /// \throws std::runtime_error when that cannot be done
+  void Finish();
+  /// Leaves what is at the file's place as it is.
+  void Discard();
+
  private:
+  void Open(const std::filesystem::path& path);
+  [[noreturn]] void Fail();
+
   std::string name_;
+  OutputKind kind_;
+  std::filesystem::path place_;
+  std::filesystem::path beside_;  ///< empty when nothing is written beside its place
   std::filebuf file_;
   std::streambuf* buffer_;
   std::string pending_;

@@ -121,14 +121,13 @@ std::vector<Message> Generate(const Options& options) {
 }
 
 int Run(const Options& options) {
-  const std::vector<Message> messages = Generate(options);
-  std::string text;
-  for (const Message& message : messages) {
-    options.json ? rtcm3::AppendJsonLine(message, text) : rtcm3::Encode(message, text);
+  Output out(options.output, options.json ? OutputKind::kText : OutputKind::kFrames,
+             {options.datum, options.projection});
+  for (const Message& message : Generate(options)) {
+    options.json ? rtcm3::AppendJsonLine(message, out.pending())
+                 : rtcm3::Encode(message, out.pending());
   }
-  Output out(options.output);
-  out.pending() = text;
-  out.Flush();
+  out.Finish();
   return kDone;
 }
 
@@ -158,7 +157,9 @@ void AddGenerate(CLI::App& program, Action& action) {
   command->add_option("--system-id", options->systemId, "System Identification Number")
       ->check(CLI::Range(0, kMaxSystemId))
       ->capture_default_str();
-  command->add_option("-o,--output", options->output, "the output")->capture_default_str();
+  command->add_option("-o,--output", options->output, "the output")
+      ->check(kFileName)
+      ->capture_default_str();
   command->add_flag("--json", options->json,
                     "print JSON lines as \"velta decode\" does, no frames");
   command->footer(

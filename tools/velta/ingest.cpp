@@ -324,7 +324,9 @@ void AddIngest(CLI::App& program, Action& action) {
   const auto options = std::make_shared<Options>();
   CLI::App* command = program.add_subcommand(
       "ingest", "Puts the message sets of RTCM 3 streams into datum and projection files.");
-  command->add_option("FILE", options->files, "the streams, \"-\" for standard input")->required();
+  command->add_option("FILE", options->files, "the streams, \"-\" for standard input")
+      ->required()
+      ->check(kFileName);
   auto* dir = command->add_option("--dir", options->dir,
                                   "the files go to datums/rtcmdata and projections/rtcmdata in\n"
                                   "this directory");
@@ -334,6 +336,7 @@ void AddIngest(CLI::App& program, Action& action) {
                                             "directory of the projection files (.prj)");
   datumDir->needs(projectionDir)->excludes(dir);
   projectionDir->needs(datumDir)->excludes(dir);
+  for (CLI::Option* const directory : {dir, datumDir, projectionDir}) directory->check(kFileName);
   command->add_flag("--json", options->json, "print the result as JSON, one object a line");
   command->footer(
       "A set is a datum message (1021 or 1022) and the messages that it announces, all with the\n"

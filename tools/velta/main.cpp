@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "command.h"
+#include "files.h"
 #include "orxutils/file_funcs.h"
 
 namespace {
@@ -55,11 +56,15 @@ int Run(std::vector<std::string> arguments) {
 
 int main(int argc, char** argv) {
   try {
+    orx::FileFuncs::openStandardStreams();
     std::ios::sync_with_stdio(false);
     for (std::FILE* stream : {stdin, stdout, stderr}) orx::FileFuncs::setBinaryMode(stream);
     return Run(orx::FileFuncs::programArguments(argc, argv));
+  } catch (const WrongCall& error) {
+    ReportFailure(error.what());
+    return kWrongCall;
   } catch (const std::exception& error) {
-    std::fprintf(stderr, "velta: %s\n", error.what());
+    ReportFailure(error.what());
     return kFailed;
   }
 }

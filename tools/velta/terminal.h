@@ -2,8 +2,16 @@
 
 #include <chrono>
 #include <cstdint>
+#include <string>
 
 namespace velta_tool {
+
+/// Text as a terminal may get it: control characters, but for the ends of lines, as "\\u001b", as
+/// they are in JSON.
+std::string WithoutControls(std::string text);
+
+/// A name from a stream or a file as a terminal may get it: on one line, too.
+std::string Printable(const std::string& name);
 
 /// Shows on standard error, when that is a terminal, how much of a long input has been read.
 class Progress {

@@ -1,4 +1,5 @@
 #include <fcntl.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -95,6 +96,20 @@ bool flushName(const fs::path& path) noexcept try {
 }
 
 bool isTerminal(std::FILE* file) { return isatty(fileno(file)) != 0; }
+
+bool isSameFile(std::FILE* file, const fs::path& path) {
+  struct stat own;
+  struct stat named;
+  return fstat(fileno(file), &own) == 0 && stat(path.c_str(), &named) == 0 &&
+         own.st_dev == named.st_dev && own.st_ino == named.st_ino;
+}
+
+void openStandardStreams() {
+  // The lowest that is free is given out: the missing ones, one after another.
+  int handle = open("/dev/null", O_RDWR);
+  while (handle >= 0 && handle <= STDERR_FILENO) handle = open("/dev/null", O_RDWR);
+  if (handle >= 0) close(handle);
+}
 
 void setBinaryMode(std::FILE*) {}
 

@@ -3,6 +3,7 @@
 #include <io.h>
 #include <windows.h>
 
+#include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <memory>
@@ -64,6 +65,27 @@ bool flushName(const std::filesystem::path&) noexcept {
 }
 
 bool isTerminal(std::FILE* file) { return _isatty(_fileno(file)) != 0; }
+
+bool isSameFile(std::FILE* file, const std::filesystem::path& path) {
+  const HANDLE named = CreateFileW(ToSystemPath(path).c_str(), 0,
+                                   FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
+                                   OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
+  if (named == INVALID_HANDLE_VALUE) return false;
+  const auto open = reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(file)));
+  BY_HANDLE_FILE_INFORMATION a;
+  BY_HANDLE_FILE_INFORMATION b;
+  const bool areKnown =
+      GetFileInformationByHandle(open, &a) && GetFileInformationByHandle(named, &b);
+  CloseHandle(named);
+  return areKnown && a.dwVolumeSerialNumber == b.dwVolumeSerialNumber &&
+         a.nFileIndexHigh == b.nFileIndexHigh && a.nFileIndexLow == b.nFileIndexLow;
+}
+
+void openStandardStreams() {
+  for (std::FILE* const stream : {stdin, stdout, stderr}) {
+    if (_fileno(stream) < 0 && !std::freopen("NUL", stream == stdin ? "r" : "w", stream)) return;
+  }
+}
 
 void setBinaryMode(std::FILE* file) {
   _setmode(_fileno(file), _O_BINARY);

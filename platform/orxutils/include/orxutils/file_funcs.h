@@ -29,6 +29,13 @@ ORXUTILS_EXPORT bool flushName(const std::filesystem::path& path) noexcept;
 /// True when an open file is a terminal.
 ORXUTILS_EXPORT bool isTerminal(std::FILE* file);
 
+/// True when an open file is the one of that path, by whatever name.
+ORXUTILS_EXPORT bool isSameFile(std::FILE* file, const std::filesystem::path& path);
+
+/// Opens those of the program's three standard streams that it was started without on the null
+/// device, so that no file of its own gets their place.
+ORXUTILS_EXPORT void openStandardStreams();
+
 /// Has an open file's bytes pass as they are, line ends included; a console takes them for UTF-8
 /// until the program ends.
 ORXUTILS_EXPORT void setBinaryMode(std::FILE* file);
