@@ -1,11 +1,16 @@
 #include "description.h"
 
+#include <algorithm>
 #include <array>
+#include <cmath>
 #include <cstdio>
 #include <span>
 #include <string_view>
+#include <utility>
 
 #include "orxutils/orx_string.h"
+#include "records/projection_types.h"
+#include "terminal.h"
 #include "velta/projection_data.h"
 
 namespace velta_tool {
@@ -14,16 +19,9 @@ namespace {
 using nlohmann::ordered_json;
 using orx::cs::velta::DatumData;
 using orx::cs::velta::ProjectionData;
-using orx::cs::velta::Rtcm1025;
-using orx::cs::velta::Rtcm1027;
 using orx::cs::velta::TableData;
 
 constexpr double kArcSecondsPerRadian = kDegreesPerRadian * 3600;
-constexpr double kMessageAngle = 1.1e-8;      // degrees
-constexpr double kMessageLength = 0.001;      // metres
-constexpr double kMessageScale = 1e-5;        // ppm
-constexpr double kMessageScaleBase = 993000;  // ppm
-constexpr double kPpm = 1e-6;
 constexpr std::uint32_t kMolodenskiBadekas = 3;
 
 constexpr std::size_t kLabelWidth = 26;
@@ -34,7 +32,7 @@ constexpr const char* kMethods[] = {"Helmert, approximate", "Helmert, strict",
                                     "abridged Molodenski", "Molodenski-Badekas"};
 
 struct ProjectionName {
-  std::uint32_t code;
+  int code;
   const char* name;
 };
 constexpr ProjectionName kProjections[] = {
@@ -49,13 +47,14 @@ constexpr ProjectionName kProjections[] = {
     {ProjectionData::MC, "Mercator"},
     {ProjectionData::PS, "Polar stereographic"},
     {ProjectionData::DS, "Double stereographic"},
+    {ProjectionData::ROM, "Rectified oblique Mercator"},
 };
 
 std::string MethodName(std::uint32_t method) {
   return method < std::size(kMethods) ? kMethods[method] : "unknown";
 }
 
-std::string NameOfProjection(std::uint32_t code) {
+std::string NameOfProjection(int code) {
   for (const auto& [known, name] : kProjections) {
     if (known == code) return name;
   }
@@ -74,32 +73,73 @@ ordered_json Scaled(std::span<const double> values, double factor) {
   return scaled;
 }
 
-void AddGrid(const TableData& grid, Description& description) {
+/// How the grid of a datum and that of a projection are told.
+struct GridTerms {
+  const char* areaUnit;
+  const char* unit;  ///< of spacing and residuals
+  double factor;     ///< from what is stored to that unit
+  const char* north;
+  const char* northKey;
+  const char* east;
+  const char* eastKey;
+};
+constexpr GridTerms kEllipsoidalGrid{"degrees",
+                                     "arc-seconds",
+                                     kArcSecondsPerRadian,
+                                     "latitude residuals",
+                                     "latitudeResiduals",
+                                     "longitude residuals",
+                                     "longitudeResiduals"};
+constexpr GridTerms kPlaneGrid{"m",
+                               "m",
+                               1,
+                               "northing residuals",
+                               "northingResiduals",
+                               "easting residuals",
+                               "eastingResiduals"};
+
+void AddGrid(const TableData& grid, const ordered_json& area, const GridTerms& terms,
+             Description& description) {
+  // An entry without a grid has one of no extent.
+  if (grid.bounds[1] == 0 && grid.bounds[3] == 0) {
+    description.push_back({"grid", "gridArea", nullptr});
+    return;
+  }
   const std::span<const double> mean(grid.meanValue);
   const Description properties = {
-      {"grid area", "gridArea", EdgesJson(grid.bounds), "degrees"},
-      {"grid spacing", "gridSpacing",
-       Scaled(std::span(grid.bounds).subspan(4), kArcSecondsPerRadian), "arc-seconds"},
+      {"grid area", "gridArea", area, terms.areaUnit},
+      {"grid spacing", "gridSpacing", Scaled(std::span(grid.bounds).subspan(4), terms.factor),
+       terms.unit},
       {"horizontal shifts", "horShift", grid.horShift},
       {"vertical shifts", "vertShift", grid.vertShift},
       {"horizontal interpolation", "horInterpolation", grid.horInterpolation},
       {"vertical interpolation", "vertInterpolation", grid.vertInterpolation},
-      {"mean residuals", "meanResiduals", Scaled(mean.first(2), kArcSecondsPerRadian),
-       "arc-seconds"},
+      {"mean residuals", "meanResiduals", Scaled(mean.first(2), terms.factor), terms.unit},
       {"mean height residual", "meanHeightResidual", mean[2], "m"},
-      {"latitude residuals", "latitudeResiduals", Scaled(grid.dNdLatData, kArcSecondsPerRadian),
-       "arc-seconds"},
-      {"longitude residuals", "longitudeResiduals", Scaled(grid.dEdLonData, kArcSecondsPerRadian),
-       "arc-seconds"},
+      {terms.north, terms.northKey, Scaled(grid.dNdLatData, terms.factor), terms.unit},
+      {terms.east, terms.eastKey, Scaled(grid.dEdLonData, terms.factor), terms.unit},
       {"height residuals", "heightResiduals", Scaled(grid.dHData, 1), "m"},
   };
   description.insert(description.end(), properties.begin(), properties.end());
 }
 
-double Degrees(auto angle) { return static_cast<double>(angle) * kMessageAngle; }
-double Metres(auto length) { return static_cast<double>(length) * kMessageLength; }
-double Factor(auto scale) {
-  return (static_cast<double>(scale) * kMessageScale + kMessageScaleBase) * kPpm;
+ordered_json EllipsoidJson(double a, double b) {
+  ordered_json ellipsoid = {{"a", a}, {"b", b}};
+  if (a != b) ellipsoid["1/f"] = a / (a - b);
+  return ellipsoid;
+}
+
+/// True when two numbers, or all of two lists of them, differ by no more than the rounding of their
+/// computation. The smallest step of a message is ten times as large, that of the scale factor.
+bool IsSame(const ordered_json& a, const ordered_json& b) {
+  constexpr double kRounding = 1e-12;
+  if (a.is_number_float() && b.is_number_float()) {
+    const double x = a.get<double>();
+    const double y = b.get<double>();
+    return std::abs(x - y) <= kRounding * std::max({1.0, std::abs(x), std::abs(y)});
+  }
+  if (!a.is_structured() || a.type() != b.type() || a.size() != b.size()) return a == b;
+  return std::equal(a.begin(), a.end(), b.begin(), IsSame);
 }
 
 /// Nine decimals at most: a tenth of a millimetre as an angle in degrees.
@@ -115,7 +155,7 @@ std::string NumberText(const ordered_json& number) {
 }
 
 std::string ValueText(const ordered_json& value) {
-  if (value.is_string()) return value.get<std::string>();
+  if (value.is_string()) return Printable(value.get<std::string>());
   if (value.is_boolean()) return value.get<bool>() ? "yes" : "no";
   if (!value.is_structured()) return NumberText(value);
   std::string text;
@@ -157,7 +197,8 @@ Description Describe(const DatumData& datum) {
       {"height indicator", "heightIndicator", static_cast<std::int32_t>(datum.heightIndicator)},
       {"area", "area", EdgesJson(datum.validityArea), "degrees"},
       {"translations", "translations", Scaled(parameters.first(3), 1), "m"},
-      {"rotations", "rotations", Scaled(parameters.subspan(3, 3), 1), "arc-seconds"},
+      {"rotations", "rotations", Scaled(parameters.subspan(3, 3), 1),
+       "arc-seconds, coordinate frame"},
       {"scale correction", "scaleCorrection", parameters[6], "ppm"},
   };
   if (datum.computationIndicator == kMolodenskiBadekas) {
@@ -166,56 +207,65 @@ Description Describe(const DatumData& datum) {
   }
   const auto& source = datum.sourceEllipsoid;
   const auto& target = datum.targetEllipsoid;
-  description.push_back(
-      {"source ellipsoid", "sourceEllipsoid", {{"a", source.a}, {"b", source.semiMinorAxis}}, "m"});
-  description.push_back(
-      {"target ellipsoid", "targetEllipsoid", {{"a", target.a}, {"b", target.semiMinorAxis}}, "m"});
-  // An entry without a grid has one of no extent.
-  if (datum.grid.bounds[1] == 0 && datum.grid.bounds[3] == 0) {
-    description.push_back({"grid", "gridArea", nullptr});
+  description.push_back({"source ellipsoid", "sourceEllipsoid",
+                         EllipsoidJson(source.a, source.second), "m"});
+  description.push_back({"target ellipsoid", "targetEllipsoid",
+                         EllipsoidJson(target.a, target.second), "m"});
+  AddGrid(datum.grid, EdgesJson(datum.grid.bounds), kEllipsoidalGrid, description);
+  return description;
+}
+
+Description Describe(const StoredProjection& projection) {
+  const auto code = orx::cs::velta::FirstCodeOf(projection.type);
+  const double* parameter = projection.parameters;
+  Description description = {
+      {"datum", "datum", orx::ToUtf8(projection.datumName)},
+      {"projection type", "projectionType", orx::ToUtf8(projection.type)},
+      {"projection", "projection", NameOfProjection(code)},
+      {"ellipsoid", "ellipsoid", EllipsoidJson(projection.axes[0], projection.axes[1]), "m"},
+  };
+  const auto add = [&](const char* label, const char* key, const char* unit) {
+    description.push_back({label, key, *parameter++, unit});
+  };
+  if (code == ProjectionData::OM || code == ProjectionData::ROM) {
+    add("azimuth of the line", "azimuthOfLine", "degrees");
+    add("scale", "scale", "");
+    add("longitude of centre", "longitudeOfCentre", "degrees");
+    add("latitude of centre", "latitudeOfCentre", "degrees");
+    add("easting at the centre", "eastingAtCentre", "m");
+    add("northing at the centre", "northingAtCentre", "m");
+    if (code == ProjectionData::ROM) add("rectified to skew grid", "rectifiedToSkew", "degrees");
   } else {
-    AddGrid(datum.grid, description);
+    add("longitude of origin", "longitudeOfOrigin", "degrees");
+    if (orx::cs::velta::HasScaleFactor(static_cast<std::uint32_t>(code))) add("scale", "scale", "");
+    add("latitude of origin", "latitudeOfOrigin", "degrees");
+    add("false easting", "falseEasting", "m");
+    add("false northing", "falseNorthing", "m");
   }
+  const double* const bounds = projection.grid.bounds;
+  const ordered_json area = {{"south", bounds[0]},
+                             {"north", bounds[0] + bounds[1]},
+                             {"west", bounds[2]},
+                             {"east", bounds[2] + bounds[3]}};
+  AddGrid(projection.grid, area, kPlaneGrid, description);
   return description;
 }
 
-Description Describe(const Rtcm1025& projection) {
-  const std::uint32_t type = projection.projectionType;
-  Description description = {
-      {"message", "message", 1025},
-      {"projection type", "projectionType", type},
-      {"projection", "projection", NameOfProjection(type)},
-      {"latitude of origin", "latitudeOfOrigin", Degrees(projection.laNO), "degrees"},
-      {"longitude of origin", "longitudeOfOrigin", Degrees(projection.loNO), "degrees"},
-      {"false easting", "falseEasting", Metres(projection.fe), "m"},
-      {"false northing", "falseNorthing", Metres(projection.fn), "m"},
+std::vector<std::string> DifferingLabels(const Description& a, const Description& b) {
+  std::vector<std::string> labels;
+  const auto find = [](const Description& in, std::string_view key) {
+    return std::find_if(in.begin(), in.end(), [key](const auto& own) { return own.key == key; });
   };
-  // Those without a scale factor come with a 0.
-  if (orx::cs::velta::HasScaleFactor(type)) {
-    description.push_back({"scale", "scale", Factor(projection.addSNO)});
+  for (const Property& property : a) {
+    const auto other = find(b, property.key);
+    if (other == b.end() || !IsSame(property.value, other->value)) {
+      labels.emplace_back(property.label);
+    }
   }
-  return description;
-}
-
-Description Describe(const Rtcm1027& projection) {
-  const double azimuth = Degrees(projection.azIL);
-  Description description = {
-      {"message", "message", 1027},
-      {"projection type", "projectionType", projection.projectionType},
-      {"projection", "projection", NameOfProjection(projection.projectionType)},
-      {"rectified", "rectified", projection.rectificationFlag},
-      {"latitude of centre", "latitudeOfCentre", Degrees(projection.laPC), "degrees"},
-      {"longitude of centre", "longitudeOfCentre", Degrees(projection.loPC), "degrees"},
-      {"azimuth of the line", "azimuthOfLine", azimuth, "degrees"},
-      {"easting at the centre", "eastingAtCentre", Metres(projection.epc), "m"},
-      {"northing at the centre", "northingAtCentre", Metres(projection.npc), "m"},
-      {"scale", "scale", Factor(projection.addSIL)},
-  };
-  if (projection.rectificationFlag) {
-    description.push_back({"rectified to skew grid", "rectifiedToSkew",
-                           azimuth + Degrees(projection.diffARSG), "degrees"});
+  for (const Property& property : b) {
+    if (find(a, property.key) == a.end()) labels.emplace_back(property.label);
   }
-  return description;
+  return labels;
 }
 
 std::string ToText(const Description& description) {
@@ -226,6 +276,43 @@ std::string ToText(const Description& description) {
     line += value.is_null() ? "none" : ValueText(value);
     if (*unit != '\0') line += std::string(" ") + unit;
     text += line + '\n';
+  }
+  return text;
+}
+
+std::string ToSummary(const std::vector<Description>& descriptions) {
+  constexpr std::string_view kOfEachPoint[] = {"latitudeResiduals", "longitudeResiduals",
+                                               "northingResiduals", "eastingResiduals",
+                                               "heightResiduals"};
+  const auto isOfEachPoint = [&](const Property& property) {
+    return std::find(std::begin(kOfEachPoint), std::end(kOfEachPoint), property.key) !=
+           std::end(kOfEachPoint);
+  };
+  const auto isIn = [](const Description& description, const Property& property) {
+    return std::any_of(description.begin(), description.end(), [&](const Property& other) {
+      return std::string_view(other.key) == property.key && other.value == property.value;
+    });
+  };
+  Description shared;
+  for (const Property& property : descriptions.front()) {
+    const bool isShared =
+        !isOfEachPoint(property) &&
+        std::all_of(descriptions.begin() + 1, descriptions.end(),
+                    [&](const Description& description) { return isIn(description, property); });
+    if (isShared) shared.push_back(property);
+  }
+  shared.push_back({"entries", "entries", descriptions.size()});
+  std::string text = ToText(shared) + '\n';
+  for (const Description& description : descriptions) {
+    std::string separator;
+    for (const Property& property : description) {
+      if (isOfEachPoint(property) || isIn(shared, property)) continue;
+      const bool isName = separator.empty();
+      text += std::exchange(separator, "; ");
+      if (!isName) text += std::string(property.label) + " ";
+      text += property.value.is_null() ? "none" : ValueText(property.value);
+    }
+    text += '\n';
   }
   return text;
 }

@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "velta/datum_data.h"
-#include "velta/rtcm_messages.h"
+#include "velta/table_data.h"
 
 namespace velta_tool {
 
@@ -37,12 +37,28 @@ struct Edges {
 /// correction in ppm, lengths in metres.
 Description Describe(const orx::cs::velta::DatumData& datum);
 
-/// A projection: angles in degrees, lengths in metres, the scale as a factor.
-Description Describe(const orx::cs::velta::Rtcm1025& projection);
-Description Describe(const orx::cs::velta::Rtcm1027& projection);
+/// A projection entry as it is stored.
+struct StoredProjection {
+  std::wstring type;  ///< type string
+  std::wstring datumName;
+  double axes[2] = {};         ///< of the ellipsoid, metres
+  double parameters[16] = {};  ///< degrees, metres, plain ratios
+  orx::cs::velta::TableData grid;
+};
+
+/// A projection entry: angles in degrees, lengths in metres, the scale as a factor.
+Description Describe(const StoredProjection& projection);
+
+/// The labels of what differs by more than the rounding of its computation.
+std::vector<std::string> DifferingLabels(const Description& a, const Description& b);
 
 /// A description as lines of text.
 std::string ToText(const Description& description);
+
+/// Many descriptions on a screen: what all share, their number, then a line for each with what it
+/// has of its own. The points of residual grids are left out.
+/// \param descriptions at least one, each beginning with the entry's name
+std::string ToSummary(const std::vector<Description>& descriptions);
 
 /// A description as a JSON object.
 nlohmann::ordered_json ToJson(const Description& description);

@@ -10,6 +10,7 @@
 #include <variant>
 #include <vector>
 
+#include "angle.h"
 #include "command.h"
 #include "description.h"
 #include "files.h"
@@ -17,6 +18,7 @@
 #include "rtcm3/codec.h"
 #include "rtcm3/json_lines.h"
 #include "rtcm3/message.h"
+#include "terminal.h"
 #include "velta/rtcm_generator.h"
 
 namespace velta_tool {
@@ -63,7 +65,7 @@ std::runtime_error NoAreaError(const Options& options, const RTCMGenerator& gene
     const Edges area(datums[i].validityArea);
     text += "\n  latitude " + Decimal(area.south) + " to " + Decimal(area.north) + ", longitude " +
             Decimal(area.west) + " to " + Decimal(area.east) + " degrees (" +
-            orx::ToUtf8(datums[i].targetDatumName) + ")";
+            Printable(orx::ToUtf8(datums[i].targetDatumName)) + ")";
   }
   if (datums.size() > kMostAreasNamed) {
     text += "\n  and " + std::to_string(datums.size() - kMostAreasNamed) + " more";
@@ -82,6 +84,7 @@ std::vector<Message> Generate(const Options& options) {
 
   if (!options.datum.empty()) {
     RequireFile(options.datum);
+    ReportErrorState(options.datum);
     const auto datum = generator.getRtcmDatumMessage(latitude, longitude, 0);
     if (!datum) throw NoAreaError(options, generator);
     messages.push_back(rtcm3::FromRecord(*datum));
@@ -94,6 +97,7 @@ std::vector<Message> Generate(const Options& options) {
   }
   if (!options.projection.empty()) {
     RequireFile(options.projection);
+    ReportErrorState(options.projection);
     if (options.northing && options.easting) {
       const auto grid = generator.get1024(*options.northing, *options.easting, 0);
       if (!grid) {
@@ -133,13 +137,15 @@ int Run(const Options& options) {
 
 void AddPosition(CLI::App& command, Options& options, CLI::Option* datum, CLI::Option* projection) {
   auto* latitude = command.add_option("--lat", options.latitude, "latitude, degrees")
-                       ->check(CLI::Range(-kMaxLatitude, kMaxLatitude));
+                       ->transform(AngleCheck(kLatitude, kMaxLatitude));
   auto* longitude = command.add_option("--lon", options.longitude, "longitude, degrees")
-                        ->check(CLI::Range(-kMaxLongitude, kMaxLongitude));
+                        ->transform(AngleCheck(kLongitude, kMaxLongitude));
   datum->needs(latitude)->needs(longitude);
   auto* northing =
-      command.add_option("--northing", options.northing, "northing for a 1024, metres");
-  auto* easting = command.add_option("--easting", options.easting, "easting for a 1024, metres");
+      command.add_option("--northing", options.northing, "northing for a 1024, metres")
+          ->check(kNumber);
+  auto* easting = command.add_option("--easting", options.easting, "easting for a 1024, metres")
+                      ->check(kNumber);
   northing->needs(easting)->needs(projection);
   easting->needs(northing);
 }
@@ -166,7 +172,8 @@ void AddGenerate(CLI::App& program, Action& action) {
       "Sends, as RTCM 3 frames, a 1021 or 1022 and a 1023 from the datum file, a 1024 and a 1025\n"
       "or 1027 from the projection file: one of the two files must be given. A 1024 is sent only\n"
       "for a northing and an easting. The datum message announces what is sent with it. As the\n"
-      "output \"-\" is standard output.\n"
+      "output \"-\" is standard output. A latitude or longitude may be written in degrees, minutes and\n"
+      "seconds, too: 52°00'30\"N, 52 00 30.\n"
       "\n"
       "Example:\n"
       "  velta ingest --datum-dir . --projection-dir . examples/streams/dhdn.rtcm3\n"

@@ -18,11 +18,13 @@
 #include <vector>
 
 #include "command.h"
+#include "entries.h"
 #include "files.h"
+#include "ingest/datum_conversion.h"
 #include "ingest_report.h"
 #include "interrupt.h"
+#include "orxutils/file_error.h"
 #include "orxutils/orx_string.h"
-#include "orxutils/path.h"
 #include "rtcm3/message_reader.h"
 #include "rtcm3/message_sets.h"
 #include "stream_notes.h"
@@ -33,6 +35,7 @@ namespace velta_tool {
 namespace {
 
 namespace fs = std::filesystem;
+using orx::cs::velta::CleanDatumName;
 using orx::cs::velta::MsgUtilized;
 using orx::cs::velta::ResultCode;
 using orx::cs::velta::Rtcm1026;
@@ -45,29 +48,6 @@ struct Options {
   std::string datumDir;
   std::string projectionDir;
   bool json = false;
-};
-
-/// Tells which files of a directory have got another size.
-class SizeWatch {
- public:
-  explicit SizeWatch(const fs::path& directory) {
-    std::error_code error;
-    for (fs::directory_iterator files(orx::ToSystemPath(directory), error), end;
-         !error && files != end; files.increment(error)) {
-      Changed(files->path());
-    }
-  }
-
-  bool Changed(const fs::path& file) {
-    std::error_code error;
-    const std::uintmax_t size = fs::file_size(orx::ToSystemPath(file), error);
-    if (error) return false;
-    const auto [known, isNew] = sizes_.try_emplace(file.filename(), size);
-    return isNew || std::exchange(known->second, size) != size;
-  }
-
- private:
-  std::map<fs::path, std::uintmax_t> sizes_;
 };
 
 std::unique_ptr<RTCMDataSupport> MakeSupport(const Options& options) {
@@ -106,8 +86,6 @@ class Ingestion {
   explicit Ingestion(const Options& options)
       : fresh_(MakeSupport(options)),
         support_(MakeSupport(options)),
-        datumFiles_(ToPath(orx::ToUtf8(support_->GetDatumPath()))),
-        projectionFiles_(ToPath(orx::ToUtf8(support_->GetProjectionPath()))),
         sets_([this](const rtcm3::MessageSet& set) { return Ingest(set); }),
         report_(options.json, out_) {}
 
@@ -146,6 +124,8 @@ class Ingestion {
     if (totals_.stream.shortMessages > 0) {
       Fail(std::to_string(totals_.stream.shortMessages) + " messages end before their last field");
     }
+    totals_.datumDirectory = orx::ToUtf8(support_->GetDatumPath());
+    totals_.projectionDirectory = orx::ToUtf8(support_->GetProjectionPath());
     report_.Close(totals_);
     return status_;
   }
@@ -180,40 +160,96 @@ class Ingestion {
     sets_.Put(message);
   }
 
+  /// One of the files that a set goes into, and the entry that it becomes there.
+  struct Place {
+    std::wstring file;
+    ReceivedEntry entry;
+    bool wasThere;
+  };
+
   /// \return false when the set is to be tried again
   bool Ingest(const rtcm3::MessageSet& set) {
     // Nothing of an earlier set, its residual grid for instance, may get into this one.
     *support_ = *fresh_;
     MsgUtilized records = set.Records();
-    const ResultCode result = support_->ParseRTCMMEssages(records);
+    const std::wstring datumName = CleanDatumName(BasicMessage(records).targetName);
+    const std::vector<Place> places =
+        datumName.empty() ? std::vector<Place>() : PlacesOf(records, datumName);
+    orx::ForgetFileError();
+    const ResultCode result = datumName.empty() ? orx::cs::velta::kNoDatumName
+                                                : support_->ParseRTCMMEssages(records);
+    const std::string reason = orx::KeptFileError();
 
     const std::uint32_t systemId = rtcm3::SystemIdOf(*set.FindDatum());
-    IngestedSet ingested{systemId, result, PartsOf(set), ChangedFields(set), NotAnnounced(set)};
+    IngestedSet ingested{systemId, result, PartsOf(set, places), ChangedFields(set),
+                         NotAnnounced(set)};
     for (const unsigned number : ingested.notAnnounced) NameNotAnnounced(systemId, number);
     if (set.Announces(1026)) NameUnsupported(systemId);
     Count(ingested);
-    const bool isToldFailure = TellFailure(systemId, result);
+    NameSharedFile(places, BasicMessage(records).targetName);
+    const bool isToldFailure = TellFailure(ingested, places, reason);
     if (isToldFailure || ingested.HasNews()) report_.Add(ingested);
-    return result == orx::cs::velta::kSuccess || !IsOfTheFiles(result);
+    if (ingested.IsDifferent()) NameWayToReplace();
+    return ingested.IsDone() || !IsOfTheFiles(result);
   }
 
   void Count(const IngestedSet& set) {
-    if (set.result != orx::cs::velta::kSuccess) {
+    if (!set.IsDone()) {
       const bool isAnotherTry = sets_.counts().repeats != repeatsBefore_;
       if (!isAnotherTry) ++totals_.failed;
       return;
     }
     ++totals_.ingested;
-    if (!set.HasNews()) ++totals_.alreadyThere;
+    if (set.IsDifferent()) {
+      ++totals_.different;
+    } else if (!set.HasAdded()) {
+      ++totals_.alreadyThere;
+    }
   }
 
   /// Tells a failure, but not the same one of a system again and again.
+  /// \param reason what the system said; may be empty
   /// \return true when it was told
-  bool TellFailure(std::uint32_t systemId, ResultCode result) {
-    if (std::exchange(results_[systemId], result) == result) return false;
-    if (result == orx::cs::velta::kSuccess) return false;
-    Fail("system " + std::to_string(systemId) + ": " + Describe(result));
+  bool TellFailure(const IngestedSet& set, const std::vector<Place>& places,
+                   const std::string& reason) {
+    if (std::exchange(results_[set.systemId], set.result) == set.result) return false;
+    if (set.IsDone()) return false;
+    std::string text = "system " + std::to_string(set.systemId) + ": ";
+    if (IsOfTheFiles(set.result)) {
+      for (std::size_t i = 0; i < places.size(); ++i) {
+        if (set.parts[i].isThere) continue;
+        text += orx::ToUtf8(places[i].file) + ": ";
+        break;
+      }
+    }
+    text += Describe(set.result);
+    if (IsOfTheFiles(set.result) && !reason.empty()) text += ": " + reason;
+    Fail(text);
     return true;
+  }
+
+  /// Says, once, how the received values come into a file that has others.
+  void NameWayToReplace() {
+    if (std::exchange(isWayNamed_, true)) return;
+    ReportNote("to take the received values, ingest the stream into a fresh directory and merge\n"
+               "its files into these: velta merge TARGET SOURCE");
+  }
+
+  /// Says, once for each file, that two received names have become one.
+  void NameSharedFile(const std::vector<Place>& places, const std::string& receivedName) {
+    if (places.empty()) return;
+    const std::wstring& file = places.front().file;
+    const auto [known, isNew] = receivedNames_.try_emplace(file, std::set<std::string>());
+    if (!known->second.insert(receivedName).second || isNew) return;
+    const auto quoted = [](const std::string& name) {
+      return '"' + Printable(orx::ToUtf8(orx::Widen(name))) + '"';
+    };
+    std::string names;
+    for (const std::string& name : known->second) {
+      names += (names.empty() ? "" : " and ") + quoted(name);
+    }
+    ReportNote(names + " have one name without signs and repeated characters, and one file: " +
+               orx::ToUtf8(file));
   }
 
   /// Says, once for each system, that a 1026 is not taken.
@@ -230,16 +266,40 @@ class Ingestion {
                " is not announced by the datum message, and taken");
   }
 
-  std::vector<IngestedPart> PartsOf(const rtcm3::MessageSet& set) {
-    const std::wstring name = support_->GetTargetDatumName();
-    const fs::path datum = ToPath(orx::ToUtf8(support_->GetDatumPath() + name + L".dff"));
-    std::vector<IngestedPart> parts = {
-        {Held(set, {1021, 1022, 1023}), ToName(datum.filename()), datumFiles_.Changed(datum)}};
+  std::vector<Place> PlacesOf(const MsgUtilized& records, const std::wstring& datumName) {
+    std::vector<Place> places;
+    const auto add = [&places](const std::wstring& file, ReceivedEntry entry) {
+      const bool isThere = FindEntry(file, entry.name).has_value();
+      places.push_back({file, std::move(entry), isThere});
+    };
+    add(support_->GetDatumPath() + datumName + L".dff", ReceivedDatum(records));
+    if (std::optional<ReceivedEntry> projection = ReceivedProjection(records)) {
+      add(support_->GetProjectionPath() + datumName + L".prj", *std::move(projection));
+    }
+    return places;
+  }
+
+  /// What became of a set at its places, asked of the files.
+  std::vector<IngestedPart> PartsOf(const rtcm3::MessageSet& set,
+                                    const std::vector<Place>& places) {
+    std::vector<IngestedPart> parts(1);
+    parts[0].messages = Held(set, {1021, 1022, 1023});
     if (set.Find(1025) || set.Find(1027)) {
-      const fs::path projection =
-          ToPath(orx::ToUtf8(support_->GetProjectionPath() + name + L".prj"));
-      parts.push_back({Held(set, {1024, 1025, 1027}), ToName(projection.filename()),
-                       projectionFiles_.Changed(projection)});
+      parts.emplace_back().messages = Held(set, {1024, 1025, 1027});
+    }
+    for (std::size_t i = 0; i < places.size(); ++i) {
+      IngestedPart& part = parts[i];
+      const auto& [file, received, wasThere] = places[i];
+      part.file = ToName(ToPath(orx::ToUtf8(file)).filename());
+      const std::optional<Entry> stored = FindEntry(file, received.name);
+      part.isThere = stored.has_value();
+      part.added = stored && !wasThere;
+      if (!stored) continue;
+      part.different = stored->content ? DifferingLabels(received.content, *stored->content)
+                                       : std::vector<std::string>{"incomplete"};
+      auto& told = toldDifferences_[{file, received.name}];
+      part.isDifferenceNew = !part.different.empty() && told != part.different;
+      told = part.different;
     }
     return parts;
   }
@@ -249,9 +309,7 @@ class Ingestion {
   std::vector<std::string> ChangedFields(const rtcm3::MessageSet& set) {
     const rtcm3::Message& datum = *set.FindDatum();
     const MsgUtilized records = set.Records();
-    const RtcmBasicTransformMessage& record =
-        records.msg1021 ? static_cast<const RtcmBasicTransformMessage&>(*records.msg1021)
-                        : *records.msg1022;
+    const RtcmBasicTransformMessage& record = BasicMessage(records);
     const auto [known, isNew] = datums_.try_emplace(
         {record.systemId, record.targetName, record.phiV, record.lambdaV}, datum);
     if (isNew) return {};
@@ -290,10 +348,12 @@ class Ingestion {
 
   std::unique_ptr<const RTCMDataSupport> fresh_;
   std::unique_ptr<RTCMDataSupport> support_;
-  SizeWatch datumFiles_;
-  SizeWatch projectionFiles_;
   rtcm3::MessageSets sets_;
   std::uint64_t repeatsBefore_ = 0;                     ///< in front of the message in hand
+  /// What files have otherwise than received, by file and entry.
+  std::map<std::pair<std::wstring, std::wstring>, std::vector<std::string>> toldDifferences_;
+  std::map<std::wstring, std::set<std::string>> receivedNames_;  ///< by file
+  bool isWayNamed_ = false;
   std::map<DatumArea, rtcm3::Message> datums_;          ///< as they came last
   std::map<std::uint32_t, ResultCode> results_;         ///< of each system's last set
   std::set<std::pair<std::uint32_t, unsigned>> named_;  ///< systems and messages that were named

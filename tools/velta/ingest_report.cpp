@@ -26,14 +26,17 @@ std::string Joined(const std::vector<unsigned>& numbers) {
 
 /// What is new and, of a set that failed, what did not get in.
 std::string SetText(const IngestedSet& set) {
-  const bool isDone = set.result == orx::cs::velta::kSuccess;
   std::string text = "system " + std::to_string(set.systemId);
   std::string separator = ": ";
   const auto add = [&](const std::string& what) { text += std::exchange(separator, "; ") + what; };
   for (const IngestedPart& part : set.parts) {
     const std::string messages = Joined(part.messages);
     if (part.added) add(messages + " in " + part.file + ", added");
-    if (!part.added && !isDone) add(messages + ", not added");
+    if (!part.isThere) add(messages + ", not added");
+    if (part.isDifferenceNew) {
+      add(messages + " in " + part.file + ", already there with other values (" +
+          Joined(part.different, ", ") + "), the file's are kept");
+    }
   }
   if (!set.changed.empty()) add("the datum message has changed: " + Joined(set.changed, ", "));
   return text;
@@ -42,7 +45,8 @@ std::string SetText(const IngestedSet& set) {
 ordered_json SetJson(const IngestedSet& set) {
   ordered_json parts = ordered_json::array();
   for (const IngestedPart& part : set.parts) {
-    parts.push_back({{"messages", part.messages}, {"file", part.file}, {"added", part.added}});
+    parts.push_back({{"messages", part.messages}, {"file", part.file}, {"added", part.added},
+                     {"different", part.different}});
   }
   return {{"systemId", set.systemId},
           {"result", CodeText(set.result)},
@@ -52,9 +56,15 @@ ordered_json SetJson(const IngestedSet& set) {
 }
 
 std::string TotalsText(const IngestTotals& totals) {
-  std::string text = "sets: " + std::to_string(totals.ingested) + " ingested";
-  if (totals.alreadyThere > 0)
-    text += " (" + std::to_string(totals.alreadyThere) + " already there)";
+  std::string text = "datum files in " + totals.datumDirectory + "\nprojection files in " +
+                     totals.projectionDirectory +
+                     "\nsets: " + std::to_string(totals.ingested) + " ingested";
+  std::vector<std::string> there;
+  if (totals.alreadyThere > 0) there.push_back(std::to_string(totals.alreadyThere) + " already there");
+  if (totals.different > 0) {
+    there.push_back(std::to_string(totals.different) + " already there with other values");
+  }
+  if (!there.empty()) text += " (" + Joined(there, ", ") + ")";
   return text + ", " + std::to_string(totals.failed) + " failed, " +
          std::to_string(totals.incomplete) +
          " incomplete; repeated messages: " + std::to_string(totals.repeats) + "\n" +
@@ -68,6 +78,7 @@ ordered_json TotalsJson(const IngestTotals& totals) {
   }
   return {{"ingested", totals.ingested},
           {"alreadyThere", totals.alreadyThere},
+          {"different", totals.different},
           {"failed", totals.failed},
           {"incomplete", totals.incomplete},
           {"repeats", totals.repeats},
@@ -77,14 +88,26 @@ ordered_json TotalsJson(const IngestTotals& totals) {
           {"otherMessages", totals.stream.otherMessages},
           {"shortMessages", totals.stream.shortMessages},
           {"skippedBytes", totals.stream.frames.skippedBytes},
-          {"badCrcs", totals.stream.frames.badCrcs}};
+          {"badCrcs", totals.stream.frames.badCrcs},
+          {"datumDirectory", totals.datumDirectory},
+          {"projectionDirectory", totals.projectionDirectory}};
 }
 
 }  // namespace
 
+bool IngestedSet::HasAdded() const {
+  return std::any_of(parts.begin(), parts.end(), [](const auto& part) { return part.added; });
+}
+
+bool IngestedSet::IsDifferent() const {
+  return std::any_of(parts.begin(), parts.end(),
+                     [](const auto& part) { return !part.different.empty(); });
+}
+
 bool IngestedSet::HasNews() const {
-  return !changed.empty() ||
-         std::any_of(parts.begin(), parts.end(), [](const auto& part) { return part.added; });
+  return HasAdded() || !changed.empty() ||
+         std::any_of(parts.begin(), parts.end(),
+                     [](const auto& part) { return part.isDifferenceNew; });
 }
 
 void IngestReport::Add(const IngestedSet& set) {

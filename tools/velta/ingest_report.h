@@ -17,7 +17,11 @@ namespace rtcm3 = orx::cs::velta::rtcm3;
 struct IngestedPart {
   std::vector<unsigned> messages;  ///< what goes there
   std::string file;                ///< name without its directory
-  bool added;                      ///< the file has got an entry
+  bool isThere = false;            ///< the file has the entry
+  bool added = false;              ///< it has got it now
+  /// What it has otherwise than received; the file's values stay.
+  std::vector<std::string> different;
+  bool isDifferenceNew = false;  ///< that has not been told yet
 };
 
 struct IngestedSet {
@@ -27,17 +31,25 @@ struct IngestedSet {
   std::vector<std::string> changed;    ///< fields of the datum message that were other before
   std::vector<unsigned> notAnnounced;  ///< received, but not announced by the datum message
 
-  /// True when a file has got an entry, or the datum has changed.
+  bool IsDone() const { return result == orx::cs::velta::kSuccess; }
+  /// True when a file has got an entry.
+  bool HasAdded() const;
+  /// True when a file has other values than received.
+  bool IsDifferent() const;
+  /// True when there is something to tell that has not been told.
   bool HasNews() const;
 };
 
 struct IngestTotals {
   std::size_t ingested = 0;
-  std::size_t alreadyThere = 0;  ///< of those ingested
+  std::size_t alreadyThere = 0;  ///< of those ingested, with the same values
+  std::size_t different = 0;     ///< of those ingested, there with other values
   std::size_t failed = 0;
   std::size_t incomplete = 0;
   std::uint64_t repeats = 0;  ///< messages that brought nothing new
   rtcm3::StreamCounts stream;
+  std::string datumDirectory;
+  std::string projectionDirectory;
 };
 
 /// Tells on standard output what became of each set, as text or as JSON lines.

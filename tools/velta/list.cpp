@@ -1,64 +1,91 @@
 #include <CLI/App.hpp>
 #include <CLI/Config.hpp>
 #include <CLI/Formatter.hpp>
+#include <exception>
 #include <memory>
-#include <stdexcept>
 #include <string>
-#include <variant>
+#include <vector>
 
 #include "command.h"
 #include "description.h"
+#include "entries.h"
 #include "files.h"
-#include "rtcm3/message.h"
-#include "velta/rtcm_generator.h"
+#include "terminal.h"
 
 namespace velta_tool {
-namespace rtcm3 = orx::cs::velta::rtcm3;
 namespace {
 
-using orx::cs::velta::DatumData;
-using orx::cs::velta::RTCMGenerator;
-
 struct Options {
-  std::string file;
+  std::vector<std::string> files;
+  bool full = false;
   bool json = false;
 };
 
-void Print(const Description& description, bool json, Output& out) {
-  out.pending() += json ? ToJson(description).dump() + '\n' : ToText(description);
-  out.FlushMuch();
+/// The description of an entry with its name in front.
+Description Named(const Entry& entry) {
+  Description description = {{"entry", "entry", entry.name}};
+  if (!entry.content) return description;
+  description.insert(description.end(), entry.content->begin(), entry.content->end());
+  return description;
 }
 
-int ListDatums(const Options& options) {
-  const auto datums = RTCMGenerator(0, ToWide(options.file), L"").getAllDatums();
-  if (datums.empty()) throw std::runtime_error(options.file + ": no complete datum entry in it");
-  Output out;
-  for (const DatumData& datum : datums) {
-    if (!options.json && &datum != &datums.front()) out.pending() += '\n';
-    Print(Describe(datum), options.json, out);
+/// Names those that the library cannot use.
+void ReportIncomplete(const std::string& file, const Entries& found) {
+  constexpr std::size_t kMostNamed = 10;
+  std::size_t count = 0;
+  std::string names;
+  for (const Entry& entry : found.entries) {
+    if (entry.content || count++ >= kMostNamed) continue;
+    names += (names.empty() ? "" : ", ") + Printable(entry.name);
   }
-  out.Flush();
-  return kDone;
+  if (count == 0) return;
+  if (count > kMostNamed) names += ", ...";
+  ReportNote(file + ": incomplete entries: " + std::to_string(count) + ": " + names);
 }
 
-int ListProjection(const Options& options) {
-  const auto record = RTCMGenerator(0, L"", ToWide(options.file)).getRtcmProjMessage();
-  if (!record) throw std::runtime_error(options.file + ": no usable projection in it");
-  const rtcm3::Message message = rtcm3::FromRecord(*record);
-  const auto* oblique = std::get_if<orx::cs::velta::Rtcm1027>(&message);
-  Output out;
-  Print(oblique ? Describe(*oblique) : Describe(std::get<orx::cs::velta::Rtcm1025>(message)),
-        options.json, out);
+void Print(const std::vector<Description>& entries, const Options& options, Output& out) {
+  if (!options.json && !options.full && entries.size() > 1) {
+    out.pending() += ToSummary(entries);
+    return;
+  }
+  for (const Description& entry : entries) {
+    if (!options.json && &entry != &entries.front()) out.pending() += '\n';
+    out.pending() += options.json ? ToJson(entry).dump() + '\n' : ToText(entry);
+    out.FlushMuch();
+  }
+}
+
+/// \return false when something is wrong with the file
+bool List(const std::string& file, const Options& options, Output& out) {
+  RequireFile(file);
+  const Entries found = ReadEntries(file);
+  std::vector<Description> complete;
+  for (const Entry& entry : found.entries) {
+    if (entry.content) complete.push_back(Named(entry));
+  }
+  if (!options.json && options.files.size() > 1) {
+    out.pending() += (&file == &options.files.front() ? "" : "\n") + file + ":\n";
+  }
+  Print(complete, options, out);
   out.Flush();
-  return kDone;
+  const bool isDamaged = ReportErrorState(file, found.error);
+  ReportIncomplete(file, found);
+  if (complete.empty()) ReportFailure(file + ": no complete entry in it");
+  return !isDamaged && !complete.empty();
 }
 
 int Run(const Options& options) {
-  RequireFile(options.file);
-  const bool isDamaged = ReportErrorState(options.file);
-  const int status =
-      KindOf(options.file) == FileKind::kDatum ? ListDatums(options) : ListProjection(options);
-  return isDamaged ? kFailed : status;
+  Output out;
+  int status = kDone;
+  for (const std::string& file : options.files) {
+    try {
+      if (!List(file, options, out)) status = kFailed;
+    } catch (const std::exception& error) {
+      ReportFailure(error.what());
+      status = kFailed;
+    }
+  }
+  return status;
 }
 
 }  // namespace
@@ -66,12 +93,17 @@ int Run(const Options& options) {
 void AddList(CLI::App& program, Action& action) {
   const auto options = std::make_shared<Options>();
   CLI::App* command = program.add_subcommand(
-      "list", "Lists the entries of a datum file, or the projection of a projection file.");
-  command->add_option("FILE", options->file, "the file")->required()->check(kDatumOrProjectionFile);
+      "list", "Lists the entries of a datum file or a projection file.");
+  command->add_option("FILE", options->files, "the files")
+      ->required()
+      ->check(kDatumOrProjectionFile);
+  command->add_flag("--full", options->full, "show each of several entries whole");
   command->add_flag("--json", options->json, "print JSON, one object a line");
   command->footer(
       "Angles are in degrees, rotations and residuals of angles in arc-seconds, scale corrections\n"
-      "in ppm, lengths in metres. Of a projection file the first entry is shown.\n"
+      "in ppm, lengths in metres; rotations are in the coordinate-frame sense. Of several entries\n"
+      "it shows what they share, then a line for each. Projections are shown as they are stored; the library makes its\n"
+      "message of the first.\n"
       "\n"
       "Example:\n"
       "  velta ingest --dir out examples/streams/dhdn.rtcm3\n"

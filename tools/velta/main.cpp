@@ -9,7 +9,10 @@
 
 #include "command.h"
 #include "files.h"
+#include "orxregistry/in_file_key.h"
 #include "orxutils/file_funcs.h"
+#include "orxutils/orx_string.h"
+#include "suggestion.h"
 
 namespace {
 
@@ -30,6 +33,20 @@ constexpr char kFooter[] =
 
 using namespace velta_tool;
 
+/// \throws WrongCall when the first word of the command line is no command
+void RequireCommand(const CLI::App& program, const std::string& word) {
+  if (word.empty() || word[0] == '-') return;
+  std::vector<std::string> commands = {"--help"};
+  for (const CLI::App* const command : program.get_subcommands({})) {
+    if (command->get_name() == word) return;
+    commands.push_back(command->get_name());
+  }
+  const std::string nearest = NearestWord(word, commands);
+  throw WrongCall("there is no command \"" + word + "\"" +
+                  (nearest.empty() ? "" : "; is \"velta " + nearest + "\" meant?") +
+                  "\n\"velta --help\" tells the commands");
+}
+
 int Run(std::vector<std::string> arguments) {
   CLI::App program(kHelp, "velta");
   program.allow_windows_style_options(false);  // "/" begins a file name
@@ -41,6 +58,10 @@ int Run(std::vector<std::string> arguments) {
        {AddIngest, AddList, AddGenerate, AddMerge, AddDecode, AddEncode, AddDump}) {
     add(program, action);
   }
+  if (arguments.size() > 1) RequireCommand(program, arguments[1]);
+  orx::OnAwaitedLock([](const std::wstring& file) {
+    ReportNote(orx::ToUtf8(file) + ": waits for another program that holds its lock");
+  });
   try {
     // Takes them from the last to the first, without the program's name.
     std::reverse(arguments.begin(), arguments.end());

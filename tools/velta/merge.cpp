@@ -3,11 +3,15 @@
 #include <CLI/Formatter.hpp>
 #include <memory>
 #include <nlohmann/json.hpp>
+#include <set>
 #include <stdexcept>
 #include <string>
 
 #include "command.h"
+#include "entries.h"
 #include "files.h"
+#include "orxutils/file_error.h"
+#include "terminal.h"
 #include "velta/rtcm_data_support.h"
 
 namespace velta_tool {
@@ -22,24 +26,65 @@ struct Merge {
   bool json = false;
 };
 
+/// How many of the source's entries the target has, and has not.
+struct MergeCounts {
+  std::size_t added = 0;
+  std::size_t replaced = 0;
+};
+
+MergeCounts Count(const Entries& target, const Entries& source) {
+  std::set<std::string> names;
+  for (const Entry& entry : target.entries) names.insert(entry.name);
+  MergeCounts counts;
+  for (const Entry& entry : source.entries) ++(names.count(entry.name) ? counts.replaced : counts.added);
+  return counts;
+}
+
 int Run(const Merge& merge) {
   RequireFile(merge.target);
   RequireFile(merge.source);
-  const std::wstring target = ToWide(merge.target);
-  const std::wstring source = ToWide(merge.source);
-  const ResultCode result = KindOf(merge.target) == FileKind::kDatum
-                                ? RTCMDataSupport::MergeRTCMDatumfiles(target, source)
-                                : RTCMDataSupport::MergeRTCMProjectionfiles(target, source);
-  if (merge.json) {
-    const nlohmann::ordered_json line = {
-        {"target", merge.target}, {"source", merge.source}, {"result", CodeText(result)}};
-    Output out;
-    out.pending() = line.dump() + "\n";
-    out.Flush();
+  const Entries source = ReadEntries(merge.source);
+  const Entries before = ReadEntries(merge.target);
+  for (const std::string& file : {merge.target, merge.source}) {
+    if (ReportErrorState(file)) return kFailed;
+    if (!HoldsItsKind(file)) {
+      ReportFailure(file + ": is named " + (KindOf(file) == FileKind::kDatum ? ".dff" : ".prj") +
+                    ", but has no entry of that kind, or some of the other");
+      return kFailed;
+    }
   }
-  if (result == orx::cs::velta::kSuccess) return kDone;
-  ReportFailure(merge.source + " into " + merge.target + ": " + Describe(result));
-  return kFailed;
+  const std::wstring target = ToWide(merge.target);
+  const std::wstring from = ToWide(merge.source);
+  orx::ForgetFileError();
+  const ResultCode result = KindOf(merge.target) == FileKind::kDatum
+                                ? RTCMDataSupport::MergeRTCMDatumfiles(target, from)
+                                : RTCMDataSupport::MergeRTCMProjectionfiles(target, from);
+  const std::string reason = orx::KeptFileError();
+  const bool isDone = result == orx::cs::velta::kSuccess;
+  const MergeCounts counts = isDone ? Count(before, source) : MergeCounts();
+  Output out;
+  if (merge.json) {
+    const nlohmann::ordered_json line = {{"target", merge.target},
+                                         {"source", merge.source},
+                                         {"result", CodeText(result)},
+                                         {"added", counts.added},
+                                         {"replaced", counts.replaced}};
+    out.pending() = line.dump() + "\n";
+  } else if (isDone) {
+    out.pending() = merge.target + ": " + std::to_string(counts.added) + " entries added, " +
+                    std::to_string(counts.replaced) + " replaced\n";
+  }
+  out.Flush();
+  if (!isDone) {
+    ReportFailure(merge.source + " into " + merge.target + ": " + Describe(result) +
+                  (reason.empty() ? "" : ": " + reason));
+    return kFailed;
+  }
+  if (source.name != before.name) {
+    ReportNote(merge.source + ": its entries, of " + Printable(source.name) +
+               ", are now entries of " + Printable(before.name));
+  }
+  return kDone;
 }
 
 }  // namespace

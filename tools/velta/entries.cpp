@@ -1,0 +1,165 @@
+#include "entries.h"
+
+#include <boost/thread/lock_types.hpp>
+
+#include "files.h"
+#include "ingest/datum_conversion.h"
+#include "ingest/grid_conversion.h"
+#include "ingest/projection_conversion.h"
+#include "orxutils/orx_string.h"
+#include "records/projection_types.h"
+#include "store/gff_layout.h"
+#include "store/key_values.h"
+#include "store/registry_tree.h"
+#include "store/residual_grid.h"
+#include "store/stored_entries.h"
+#include "velta/rtcm_data_support.h"
+
+namespace velta_tool {
+namespace {
+
+namespace velta = orx::cs::velta;
+namespace layout = velta::layout;
+using orx::TGenericRegistryKey;
+using velta::DatumData;
+using velta::RTCMDataSupport;
+using velta::TableData;
+
+std::optional<Description> DescribeDatum(const TGenericRegistryKey& container,
+                                         const TGenericRegistryKey& entry) {
+  DatumData datum;
+  if (!velta::ReadDatum(container, entry, datum)) return std::nullopt;
+  return Describe(datum);
+}
+
+std::optional<Description> DescribeProjection(const TGenericRegistryKey& entry) {
+  const TGenericRegistryKey standard = velta::OpenExisting(entry, layout::kStandardProjection);
+  const TGenericRegistryKey gridKey = velta::OpenExisting(entry, layout::kProjectionGrid.key);
+  StoredProjection projection;
+  velta::StoredGrid grid;
+  const bool isComplete = velta::Read(standard, layout::kProjectionType, projection.type) &&
+                          velta::Read(standard, layout::kDatumName, projection.datumName) &&
+                          velta::Read(standard, layout::kEllipsoid, projection.axes) &&
+                          velta::Read(standard, layout::kProjectionParameters,
+                                      projection.parameters) &&
+                          velta::ReadGridArea(gridKey, layout::kProjectionGrid, grid) &&
+                          velta::ReadGridValues(gridKey, grid);
+  if (!isComplete) return std::nullopt;
+  projection.grid = grid.table;
+  return Describe(projection);
+}
+
+std::optional<Description> DescribeEntry(FileKind kind, const TGenericRegistryKey& container,
+                                         const TGenericRegistryKey& entry) {
+  return kind == FileKind::kDatum ? DescribeDatum(container, entry) : DescribeProjection(entry);
+}
+
+template <class Message>
+void FillProjection(const Message& message, const velta::Rtcm1024* grid, int typeCode,
+                    StoredProjection& projection, std::wstring& name) {
+  name = velta::ProjectionEntryName(message, grid);
+  projection.type = velta::FindProjectionType(typeCode)->name;
+  int index = 0;
+  for (const double parameter : velta::ParametersOf(message)) {
+    projection.parameters[index++] = parameter;
+  }
+}
+
+}  // namespace
+
+Entries ReadEntries(const std::string& file) {
+  const FileKind kind = KindOf(file);
+  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, velta::kTreeFlags);
+  const TGenericRegistryKey container = velta::ContainerOf(tree);
+  Entries found;
+  found.name = orx::ToUtf8(container.GetName());
+  for (orx::TGenRegKeyIterator walk(container); walk;) {
+    const TGenericRegistryKey entry(walk++);
+    found.entries.push_back(
+        {orx::ToUtf8(entry.GetName()), DescribeEntry(kind, container, entry)});
+  }
+  found.error = tree.GetErrorState();  // damage inside a key shows when it is looked into
+  return found;
+}
+
+bool HoldsItsKind(const std::string& file) {
+  const bool isDatum = KindOf(file) == FileKind::kDatum;
+  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, velta::kTreeFlags);
+  const TGenericRegistryKey container = velta::ContainerOf(tree);
+  bool hasOwn = false;
+  for (orx::TGenRegKeyIterator walk(container); walk;) {
+    const TGenericRegistryKey entry(walk++);
+    const bool hasDatum = entry.HasKey(layout::kStandardDatum);
+    const bool hasProjection = entry.HasKey(layout::kStandardProjection);
+    if (isDatum ? hasProjection : hasDatum) return false;
+    hasOwn = hasOwn || (isDatum ? hasDatum : hasProjection);
+  }
+  return hasOwn;
+}
+
+const velta::RtcmBasicTransformMessage& BasicMessage(const velta::MsgUtilized& set) {
+  if (set.msg1021) return *set.msg1021;
+  return *set.msg1022;
+}
+
+ReceivedEntry ReceivedDatum(const velta::MsgUtilized& set) {
+  const velta::RtcmBasicTransformMessage& message = BasicMessage(set);
+  DatumData datum;
+  datum.targetDatumName = velta::CleanDatumName(message.targetName);
+  datum.sourceDatumName = velta::NormaliseSourceName(message.sourceName);
+  velta::ConvertEllipsoids(message, datum);
+  datum.computationIndicator = message.computationIndicator;
+  datum.heightIndicator = message.heightIndicator;
+  velta::ConvertParameters(message, datum);
+  if (set.msg1022) velta::ConvertRotationPoint(*set.msg1022, datum);
+  velta::ConvertValidityArea(message, datum);
+  if (set.msg1023) velta::ConvertEllipsoidalGrid(*set.msg1023, datum.grid);
+  return {velta::DatumEntryName(message, set.msg1023), Describe(datum)};
+}
+
+std::optional<ReceivedEntry> ReceivedProjection(const velta::MsgUtilized& set) {
+  if (!set.msg1025 && !set.msg1027) return std::nullopt;
+  const velta::RtcmBasicTransformMessage& message = BasicMessage(set);
+  DatumData datum;
+  velta::ConvertEllipsoids(message, datum);
+  StoredProjection projection;
+  projection.datumName = velta::CleanDatumName(message.targetName);
+  projection.axes[0] = datum.targetEllipsoid.a;
+  projection.axes[1] = datum.targetEllipsoid.second;
+  if (set.msg1024) velta::ConvertPlaneGrid(projection.grid, *set.msg1024);
+  auto code = static_cast<int>(set.msg1027 ? set.msg1027->projectionType
+                                           : set.msg1025->projectionType);
+  const bool isRectified = set.msg1027 && set.msg1027->rectificationFlag;
+  if (code == velta::ProjectionData::OM && isRectified) code = velta::ProjectionData::ROM;
+  if (!velta::FindProjectionType(code)) return std::nullopt;
+  std::wstring name;
+  // Of two the library takes the 1025 first, and the 1027 has the last word.
+  if (set.msg1027) {
+    FillProjection(*set.msg1027, set.msg1024, code, projection, name);
+  } else {
+    FillProjection(*set.msg1025, set.msg1024, code, projection, name);
+  }
+  return ReceivedEntry{name, Describe(projection)};
+}
+
+std::optional<Entry> FindEntry(const std::wstring& file, const std::wstring& name) {
+  const FileKind kind = KindOf(orx::ToUtf8(file));
+  const bool isDatum = kind == FileKind::kDatum;
+  const auto obtain = isDatum ? &RTCMDataSupport::GetUnlockedPtrDatumGFF
+                              : &RTCMDataSupport::GetUnlockedPtrProjectionGFF;
+  const auto giveBack =
+      isDatum ? &RTCMDataSupport::ReleasePtrDatumGFF : &RTCMDataSupport::ReleasePtrProjectionGFF;
+  orx::TCSInFileKey* tree = nullptr;
+  const velta::ResultCode result = obtain(file, &tree);
+  std::optional<Entry> found;
+  if (result == velta::kSuccess && tree) {
+    const boost::unique_lock<boost::recursive_mutex> lock(tree->GetMutex());
+    const TGenericRegistryKey container = velta::ContainerOf(*tree);
+    const TGenericRegistryKey entry = velta::OpenExisting(container, name);
+    if (!entry.IsNull()) found = {orx::ToUtf8(name), DescribeEntry(kind, container, entry)};
+  }
+  giveBack(file);
+  return found;
+}
+
+}  // namespace velta_tool
