@@ -20,8 +20,8 @@ struct Outcome {
 /// Calls the program with a directory of the test's own.
 class ProgramTest : public testing::Test {
  protected:
-  /// \param arguments as typed, without quotation marks; "@" begins the name of a file of the
-  ///     test's directory, "%" that of an example stream
+  /// \param arguments as typed, without quotation marks but for '' alone, an empty one; "@" begins
+  ///     the name of a file of the test's directory, "%" that of an example stream
   /// \param input what standard input gives
   Outcome Run(const std::string& arguments, const std::string& input = "") {
     WriteBytes(directory_ / "stdin", input);
@@ -33,7 +33,7 @@ class ProgramTest : public testing::Test {
     }
     std::vector<std::string> call = {PROGRAM};
     std::istringstream words(named);
-    for (std::string word; words >> word;) call.push_back(word);
+    for (std::string word; words >> word;) call.push_back(word == "''" ? "" : word);
     const int status =
         RunProgram(call, directory_ / "stdin", directory_ / "stdout", directory_ / "stderr");
     return {status, ReadBytes(directory_ / "stdout"), ReadBytes(directory_ / "stderr")};

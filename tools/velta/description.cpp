@@ -2,8 +2,10 @@
 
 #include <algorithm>
 #include <array>
+#include <charconv>
 #include <cmath>
 #include <cstdio>
+#include <cstdlib>
 #include <span>
 #include <string_view>
 #include <utility>
@@ -129,29 +131,49 @@ ordered_json EllipsoidJson(double a, double b) {
   return ellipsoid;
 }
 
-/// True when two numbers, or all of two lists of them, differ by no more than the rounding of their
-/// computation. The smallest step of a message is ten times as large, that of the scale factor.
-bool IsSame(const ordered_json& a, const ordered_json& b) {
+/// True when two numbers differ by no more than the rounding of their computation. The smallest
+/// step of a message is ten times as large, that of the scale factor.
+bool IsSameNumber(double a, double b) {
   constexpr double kRounding = 1e-12;
+  return std::abs(a - b) <= kRounding * std::max({1.0, std::abs(a), std::abs(b)});
+}
+
+bool IsSame(const ordered_json& a, const ordered_json& b) {
   if (a.is_number_float() && b.is_number_float()) {
-    const double x = a.get<double>();
-    const double y = b.get<double>();
-    return std::abs(x - y) <= kRounding * std::max({1.0, std::abs(x), std::abs(y)});
+    return IsSameNumber(a.get<double>(), b.get<double>());
   }
   if (!a.is_structured() || a.type() != b.type() || a.size() != b.size()) return a == b;
   return std::equal(a.begin(), a.end(), b.begin(), IsSame);
 }
 
-/// Nine decimals at most: a tenth of a millimetre as an angle in degrees.
+/// The number with the fewest digits that is the same but for rounding.
+double Shortest(double number) {
+  constexpr int kDigits = 17;
+  for (int digits = 1; digits < kDigits; ++digits) {
+    std::array<char, 32> text;
+    std::snprintf(text.data(), text.size(), "%.*g", digits, number);
+    const double shorter = std::strtod(text.data(), nullptr);
+    if (IsSameNumber(shorter, number)) return shorter == 0 ? 0 : shorter;
+  }
+  return number;
+}
+
+ordered_json WithShortNumbers(ordered_json value) {
+  if (value.is_number_float()) return Shortest(value.get<double>());
+  if (value.is_structured()) {
+    for (ordered_json& element : value) element = WithShortNumbers(std::move(element));
+  }
+  return value;
+}
+
+/// Without an exponent.
 std::string NumberText(const ordered_json& number) {
   if (!number.is_number_float()) return number.dump();
   std::array<char, 512> digits;
-  std::snprintf(digits.data(), digits.size(), "%.9f", number.get<double>());
-  std::string text = digits.data();
-  if (text.find('.') == std::string::npos) return text;  // infinite or not a number
-  text.erase(text.find_last_not_of('0') + 1);
-  if (text.back() == '.') text.pop_back();
-  return text == "-0" ? "0" : text;
+  char* const end = std::to_chars(digits.begin(), digits.end(), Shortest(number.get<double>()),
+                                  std::chars_format::fixed)
+                        .ptr;
+  return {digits.data(), end};
 }
 
 std::string ValueText(const ordered_json& value) {
@@ -319,7 +341,9 @@ std::string ToSummary(const std::vector<Description>& descriptions) {
 
 ordered_json ToJson(const Description& description) {
   ordered_json json = ordered_json::object();
-  for (const Property& property : description) json[property.key] = property.value;
+  for (const Property& property : description) {
+    json[property.key] = WithShortNumbers(property.value);
+  }
   return json;
 }
 
