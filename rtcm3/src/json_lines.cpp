@@ -132,7 +132,8 @@ class JsonReader {
 
   /// \throws FieldError when something is left
   void Finish() const {
-    if (!object_.empty()) throw FieldError(Excerpt(object_.begin().key()) + " is no field of the message");
+    if (!object_.empty())
+      throw FieldError(Excerpt(object_.begin().key()) + " is no field of the message");
   }
 
   json Take(const char* name) {
@@ -198,8 +199,7 @@ Message ParseJsonLine(std::string_view line) {
   Message message;
   const json number = reader.Take("message");
   if (!number.is_number_unsigned() || !Reset(message, number.get<std::uint64_t>())) {
-    throw FieldError("message must be an integer from 1021 to 1027, not " +
-                     Excerpt(number.dump()));
+    throw FieldError("message must be an integer from 1021 to 1027, not " + Excerpt(number.dump()));
   }
   std::visit([&reader](auto& record) { VisitFields(reader, record); }, message);
   reader.Finish();

@@ -85,13 +85,9 @@ struct GridTerms {
   const char* east;
   const char* eastKey;
 };
-constexpr GridTerms kEllipsoidalGrid{"degrees",
-                                     "arc-seconds",
-                                     kArcSecondsPerRadian,
-                                     "latitude residuals",
-                                     "latitudeResiduals",
-                                     "longitude residuals",
-                                     "longitudeResiduals"};
+constexpr GridTerms kEllipsoidalGrid{
+    "degrees",           "arc-seconds",         kArcSecondsPerRadian, "latitude residuals",
+    "latitudeResiduals", "longitude residuals", "longitudeResiduals"};
 constexpr GridTerms kPlaneGrid{"m",
                                "m",
                                1,
@@ -229,10 +225,10 @@ Description Describe(const DatumData& datum) {
   }
   const auto& source = datum.sourceEllipsoid;
   const auto& target = datum.targetEllipsoid;
-  description.push_back({"source ellipsoid", "sourceEllipsoid",
-                         EllipsoidJson(source.a, source.second), "m"});
-  description.push_back({"target ellipsoid", "targetEllipsoid",
-                         EllipsoidJson(target.a, target.second), "m"});
+  description.push_back(
+      {"source ellipsoid", "sourceEllipsoid", EllipsoidJson(source.a, source.second), "m"});
+  description.push_back(
+      {"target ellipsoid", "targetEllipsoid", EllipsoidJson(target.a, target.second), "m"});
   AddGrid(datum.grid, EdgesJson(datum.grid.bounds), kEllipsoidalGrid, description);
   return description;
 }

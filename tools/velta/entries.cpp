@@ -37,13 +37,13 @@ std::optional<Description> DescribeProjection(const TGenericRegistryKey& entry) 
   const TGenericRegistryKey gridKey = velta::OpenExisting(entry, layout::kProjectionGrid.key);
   StoredProjection projection;
   velta::StoredGrid grid;
-  const bool isComplete = velta::Read(standard, layout::kProjectionType, projection.type) &&
-                          velta::Read(standard, layout::kDatumName, projection.datumName) &&
-                          velta::Read(standard, layout::kEllipsoid, projection.axes) &&
-                          velta::Read(standard, layout::kProjectionParameters,
-                                      projection.parameters) &&
-                          velta::ReadGridArea(gridKey, layout::kProjectionGrid, grid) &&
-                          velta::ReadGridValues(gridKey, grid);
+  const bool isComplete =
+      velta::Read(standard, layout::kProjectionType, projection.type) &&
+      velta::Read(standard, layout::kDatumName, projection.datumName) &&
+      velta::Read(standard, layout::kEllipsoid, projection.axes) &&
+      velta::Read(standard, layout::kProjectionParameters, projection.parameters) &&
+      velta::ReadGridArea(gridKey, layout::kProjectionGrid, grid) &&
+      velta::ReadGridValues(gridKey, grid);
   if (!isComplete) return std::nullopt;
   projection.grid = grid.table;
   return Describe(projection);
@@ -75,8 +75,7 @@ Entries ReadEntries(const std::string& file) {
   found.name = orx::ToUtf8(container.GetName());
   for (orx::TGenRegKeyIterator walk(container); walk;) {
     const TGenericRegistryKey entry(walk++);
-    found.entries.push_back(
-        {orx::ToUtf8(entry.GetName()), DescribeEntry(kind, container, entry)});
+    found.entries.push_back({orx::ToUtf8(entry.GetName()), DescribeEntry(kind, container, entry)});
   }
   found.error = tree.GetErrorState();  // damage inside a key shows when it is looked into
   return found;
@@ -127,8 +126,8 @@ std::optional<ReceivedEntry> ReceivedProjection(const velta::MsgUtilized& set) {
   projection.axes[0] = datum.targetEllipsoid.a;
   projection.axes[1] = datum.targetEllipsoid.second;
   if (set.msg1024) velta::ConvertPlaneGrid(projection.grid, *set.msg1024);
-  auto code = static_cast<int>(set.msg1027 ? set.msg1027->projectionType
-                                           : set.msg1025->projectionType);
+  auto code =
+      static_cast<int>(set.msg1027 ? set.msg1027->projectionType : set.msg1025->projectionType);
   const bool isRectified = set.msg1027 && set.msg1027->rectificationFlag;
   if (code == velta::ProjectionData::OM && isRectified) code = velta::ProjectionData::ROM;
   if (!velta::FindProjectionType(code)) return std::nullopt;

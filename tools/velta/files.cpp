@@ -107,8 +107,8 @@ void RequireFile(const std::string& file) {
   }
 }
 
-const CLI::Validator kFileName([](std::string& name) { return name.empty() ? "the name is empty" : ""; },
-                               "");
+const CLI::Validator kFileName(
+    [](std::string& name) { return name.empty() ? "the name is empty" : ""; }, "");
 const CLI::Validator kDatumFile =
     KindCheck(".dff", [](FileKind kind) { return kind == FileKind::kDatum; });
 const CLI::Validator kProjectionFile =

@@ -176,8 +176,8 @@ class Ingestion {
     const std::vector<Place> places =
         datumName.empty() ? std::vector<Place>() : PlacesOf(records, datumName);
     orx::ForgetFileError();
-    const ResultCode result = datumName.empty() ? orx::cs::velta::kNoDatumName
-                                                : support_->ParseRTCMMEssages(records);
+    const ResultCode result =
+        datumName.empty() ? orx::cs::velta::kNoDatumName : support_->ParseRTCMMEssages(records);
     const std::string reason = orx::KeptFileError();
 
     const std::uint32_t systemId = rtcm3::SystemIdOf(*set.FindDatum());
@@ -231,8 +231,9 @@ class Ingestion {
   /// Says, once, how the received values come into a file that has others.
   void NameWayToReplace() {
     if (std::exchange(isWayNamed_, true)) return;
-    ReportNote("to take the received values, ingest the stream into a fresh directory and merge\n"
-               "its files into these: velta merge TARGET SOURCE");
+    ReportNote(
+        "to take the received values, ingest the stream into a fresh directory and merge\n"
+        "its files into these: velta merge TARGET SOURCE");
   }
 
   /// Says, once for each file, that two received names have become one.
@@ -349,7 +350,7 @@ class Ingestion {
   std::unique_ptr<const RTCMDataSupport> fresh_;
   std::unique_ptr<RTCMDataSupport> support_;
   rtcm3::MessageSets sets_;
-  std::uint64_t repeatsBefore_ = 0;                     ///< in front of the message in hand
+  std::uint64_t repeatsBefore_ = 0;  ///< in front of the message in hand
   /// What files have otherwise than received, by file and entry.
   std::map<std::pair<std::wstring, std::wstring>, std::vector<std::string>> toldDifferences_;
   std::map<std::wstring, std::set<std::string>> receivedNames_;  ///< by file

@@ -45,7 +45,9 @@ std::string SetText(const IngestedSet& set) {
 ordered_json SetJson(const IngestedSet& set) {
   ordered_json parts = ordered_json::array();
   for (const IngestedPart& part : set.parts) {
-    parts.push_back({{"messages", part.messages}, {"file", part.file}, {"added", part.added},
+    parts.push_back({{"messages", part.messages},
+                     {"file", part.file},
+                     {"added", part.added},
                      {"different", part.different}});
   }
   return {{"systemId", set.systemId},
@@ -57,10 +59,11 @@ ordered_json SetJson(const IngestedSet& set) {
 
 std::string TotalsText(const IngestTotals& totals) {
   std::string text = "datum files in " + totals.datumDirectory + "\nprojection files in " +
-                     totals.projectionDirectory +
-                     "\nsets: " + std::to_string(totals.ingested) + " ingested";
+                     totals.projectionDirectory + "\nsets: " + std::to_string(totals.ingested) +
+                     " ingested";
   std::vector<std::string> there;
-  if (totals.alreadyThere > 0) there.push_back(std::to_string(totals.alreadyThere) + " already there");
+  if (totals.alreadyThere > 0)
+    there.push_back(std::to_string(totals.alreadyThere) + " already there");
   if (totals.different > 0) {
     there.push_back(std::to_string(totals.different) + " already there with other values");
   }

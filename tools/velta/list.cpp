@@ -92,8 +92,8 @@ int Run(const Options& options) {
 
 void AddList(CLI::App& program, Action& action) {
   const auto options = std::make_shared<Options>();
-  CLI::App* command = program.add_subcommand(
-      "list", "Lists the entries of a datum file or a projection file.");
+  CLI::App* command =
+      program.add_subcommand("list", "Lists the entries of a datum file or a projection file.");
   command->add_option("FILE", options->files, "the files")
       ->required()
       ->check(kDatumOrProjectionFile);
@@ -102,8 +102,8 @@ void AddList(CLI::App& program, Action& action) {
   command->footer(
       "Angles are in degrees, rotations and residuals of angles in arc-seconds, scale corrections\n"
       "in ppm, lengths in metres; rotations are in the coordinate-frame sense. Of several entries\n"
-      "it shows what they share, then a line for each. Projections are shown as they are stored; the library makes its\n"
-      "message of the first.\n"
+      "it shows what they share, then a line for each. Projections are shown as they are stored;\n"
+      "the library makes its message of the first.\n"
       "\n"
       "Example:\n"
       "  velta ingest --dir out examples/streams/dhdn.rtcm3\n"

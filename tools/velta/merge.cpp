@@ -36,7 +36,8 @@ MergeCounts Count(const Entries& target, const Entries& source) {
   std::set<std::string> names;
   for (const Entry& entry : target.entries) names.insert(entry.name);
   MergeCounts counts;
-  for (const Entry& entry : source.entries) ++(names.count(entry.name) ? counts.replaced : counts.added);
+  for (const Entry& entry : source.entries)
+    ++(names.count(entry.name) ? counts.replaced : counts.added);
   return counts;
 }
 
