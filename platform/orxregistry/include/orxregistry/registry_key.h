@@ -17,6 +17,7 @@ class TGenericRegistryKey;
 /// A key inside a tree; only the registry looks into it. The pointer keeps the tree's memory
 /// alive.
 class TGenericRegistryKeyImp;
+/// A key that is shared by those who look at it.
 using TGenericRegistryKeyImpPtr = std::shared_ptr<TGenericRegistryKeyImp>;
 
 /// The root of a tree.
@@ -40,6 +41,7 @@ class ORXREGISTRY_EXPORT TGenericRegistryKeyPtr {
 template <class T>
 T GetRegValue(const TGenericRegistryKey& key, std::wstring_view name, const T& fallback, int index);
 
+/// Reads a text; see the general form.
 template <>
 ORXREGISTRY_EXPORT COrxStringT<wchar_t> GetRegValue(const TGenericRegistryKey& key,
                                                     std::wstring_view name,

@@ -11,6 +11,7 @@ namespace orx {
 /// Memory that one module may take and another give back.
 /// \throws std::bad_alloc
 ORXUTILS_EXPORT void* orx_operator_new(std::size_t bytes);
+/// Gives back what `orx_operator_new` returned; null is allowed.
 ORXUTILS_EXPORT void orx_operator_delete(void* memory) noexcept;
 
 /// Standard allocator over `orx_operator_new` and `orx_operator_delete`.
@@ -33,10 +34,12 @@ struct orx_dl_allocator {
   void deallocate(T* memory, std::size_t) noexcept { orx_operator_delete(memory); }
 };
 
+/// What one allocator took, every other gives back.
 template <class T, class U>
 bool operator==(const orx_dl_allocator<T>&, const orx_dl_allocator<U>&) noexcept {
   return true;
 }
+/// Never: all allocators are one.
 template <class T, class U>
 bool operator!=(const orx_dl_allocator<T>&, const orx_dl_allocator<U>&) noexcept {
   return false;
