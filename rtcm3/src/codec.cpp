@@ -66,14 +66,20 @@ class FieldWriter {
 
   template <class Member>
   void Number(const char* name, unsigned width, Member value) {
-    const auto wide =
-        static_cast<std::conditional_t<std::is_same_v<Member, bool>, int, Member>>(value);
-    CheckRange(FieldRange::Of<Member>(width), name, wide);
+    using Integer = std::conditional_t<std::is_same_v<Member, bool>, int, Member>;
+    const auto integer = static_cast<Integer>(value);
+    const FieldRange range = FieldRange::Of<Member>(width);
+    if (!Holds(range, integer)) {
+      // What was negative before it got into an unsigned member is shown as it was.
+      const auto shown = static_cast<std::make_signed_t<Integer>>(integer);
+      throw RangeError(range, name, std::to_string(shown));
+    }
     bits_.Write(static_cast<std::uint64_t>(value), width);
   }
 
   void BitSet(const char* name, unsigned width, std::uint32_t value) {
-    CheckRange(FieldRange::Of<std::uint32_t>(width), name, value);
+    const FieldRange range = FieldRange::Of<std::uint32_t>(width);
+    if (!Holds(range, value)) throw RangeError(range, name, std::to_string(value));
     const bool hasReservedAlone = value != 0 && (value & LowerHalf(width)) == 0;
     if (hasReservedAlone) {
       throw FieldError(std::string(name) + " must not be " + std::to_string(value) +

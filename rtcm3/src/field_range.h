@@ -28,12 +28,6 @@ bool Holds(const FieldRange& range, Integer value) {
   return std::cmp_greater_equal(value, range.min) && std::cmp_less_equal(value, range.max);
 }
 
-/// \throws FieldError when a field's value is outside its range
-template <class Integer>
-void CheckRange(const FieldRange& range, std::string_view field, Integer value) {
-  if (!Holds(range, value)) throw RangeError(range, field, std::to_string(value));
-}
-
 /// The error that a text is too long or has characters that do not travel.
 inline FieldError TextError(std::string_view field) {
   return FieldError(std::string(field) + " must be a text of at most " +

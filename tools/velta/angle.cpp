@@ -1,5 +1,6 @@
 #include "angle.h"
 
+#include <array>
 #include <charconv>
 #include <cmath>
 #include <cstdio>
@@ -34,13 +35,30 @@ std::optional<double> TakeUnsigned(std::string_view& text) {
 }
 
 /// +1 or -1 for the letter that the text ends with, which is taken; 0 without one.
-int TakeHemisphere(std::string_view& text, const Hemispheres& hemispheres) {
+int TakeHemisphere(std::string_view& text, const Coordinate& coordinate) {
   if (text.empty()) return 0;
-  const int sign = text.back() == hemispheres.positive   ? 1
-                   : text.back() == hemispheres.negative ? -1
-                                                         : 0;
+  const int sign = text.back() == coordinate.positive   ? 1
+                   : text.back() == coordinate.negative ? -1
+                                                        : 0;
   if (sign != 0) text.remove_suffix(1);
   return sign;
+}
+
+/// Accepts an angle, and makes it a number of degrees.
+CLI::Validator AngleCheck(const Coordinate& coordinate) {
+  const auto check = [coordinate](std::string& text) -> std::string {
+    const std::optional<double> angle = ParseAngle(text, coordinate);
+    if (!angle) return text + " is not a number of degrees, nor degrees, minutes and seconds";
+    if (std::abs(*angle) > coordinate.most) {
+      return text + " is not in range: at most " + std::to_string(std::lround(coordinate.most)) +
+             " degrees";
+    }
+    std::array<char, 32> digits;
+    std::snprintf(digits.data(), digits.size(), "%.17g", *angle);
+    text = digits.data();
+    return {};
+  };
+  return {check, ""};
 }
 
 }  // namespace
@@ -54,8 +72,8 @@ std::optional<double> ParseNumber(std::string_view text) {
   return number;
 }
 
-std::optional<double> ParseAngle(std::string_view text, const Hemispheres& hemispheres) {
-  const int hemisphere = TakeHemisphere(text, hemispheres);
+std::optional<double> ParseAngle(std::string_view text, const Coordinate& coordinate) {
+  const int hemisphere = TakeHemisphere(text, coordinate);
   if (hemisphere == 0) {
     if (const std::optional<double> number = ParseNumber(text)) return number;
   }
@@ -80,19 +98,36 @@ std::optional<double> ParseAngle(std::string_view text, const Hemispheres& hemis
   return isNegative || hemisphere < 0 ? -degrees : degrees;
 }
 
-CLI::Validator AngleCheck(const Hemispheres& hemispheres, double most) {
-  const auto check = [hemispheres, most](std::string& text) -> std::string {
-    const std::optional<double> angle = ParseAngle(text, hemispheres);
-    if (!angle) return text + " is not a number of degrees, nor degrees, minutes and seconds";
-    if (std::abs(*angle) > most) {
-      return text + " is not in range: at most " + std::to_string(std::lround(most)) + " degrees";
-    }
-    char digits[32];
-    std::snprintf(digits, sizeof digits, "%.17g", *angle);
-    text = digits;
-    return {};
-  };
-  return {check, ""};
+std::string DegreesMinutesSeconds(double degrees) {
+  constexpr int kDecimals = 7;
+  constexpr long long kUnitsPerSecond = 10'000'000;
+  long long rest = std::llround(std::abs(degrees) * kSixty * kSixty * kUnitsPerSecond);
+  const long long units = rest % kUnitsPerSecond;
+  rest /= kUnitsPerSecond;
+  const long long seconds = rest % 60;
+  const long long minutes = rest / 60 % 60;
+  const bool isNegative = degrees < 0 && (rest != 0 || units != 0);
+  std::array<char, 64> text;
+  std::snprintf(text.data(), text.size(), "%s%lld°%02lld'%02lld.%0*lld", isNegative ? "-" : "",
+                rest / 3600, minutes, seconds, kDecimals, units);
+  std::string angle = text.data();
+  angle.erase(angle.find_last_not_of('0') + 1);
+  if (angle.back() == '.') angle.pop_back();
+  return angle + '"';
+}
+
+void AddPosition(CLI::App& command, std::optional<double>& latitude,
+                 std::optional<double>& longitude) {
+  auto* north =
+      command.add_option("--lat", latitude, "latitude, degrees")->transform(AngleCheck(kLatitude));
+  auto* east = command.add_option("--lon", longitude, "longitude, degrees")
+                   ->transform(AngleCheck(kLongitude));
+  north->needs(east);
+  east->needs(north);
+}
+
+CLI::Option* AddDms(CLI::App& command, bool& dms) {
+  return command.add_flag("--dms", dms, "print angles in degrees, minutes and seconds");
 }
 
 const CLI::Validator kNumber(

@@ -5,7 +5,9 @@
 #include <streambuf>
 #include <string>
 
+#include "angle.h"
 #include "command.h"
+#include "field_units.h"
 #include "files.h"
 #include "interrupt.h"
 #include "rtcm3/codec.h"
@@ -21,6 +23,8 @@ namespace {
 struct Conversion {
   std::string from;
   std::string to = "-";
+  bool units = false;
+  bool dms = false;
 };
 
 int DecodeStream(const Conversion& files) {
@@ -37,7 +41,8 @@ int DecodeStream(const Conversion& files) {
   const auto finish = [&] {
     // Also what an interrupted reader holds back.
     while (const rtcm3::Message* message = messages.Next()) {
-      rtcm3::AppendJsonLine(*message, out.pending());
+      files.units ? AppendJsonLineInUnits(*message, files.dms, out.pending())
+                  : rtcm3::AppendJsonLine(*message, out.pending());
       out.FlushMuch();
     }
     counts.frames.frames > 0 ? out.Finish() : out.Discard();
@@ -100,44 +105,49 @@ int EncodeLines(const Conversion& files) {
   return finish();
 }
 
-CLI::App* AddConversion(CLI::App& program, Action& action, const std::string& name,
-                        const std::string& help, int (*work)(const Conversion&)) {
-  const auto files = std::make_shared<Conversion>();
-  CLI::App* command = program.add_subcommand(name, help);
-  command->add_option("FILE", files->from, "the input, \"-\" for standard input")
+std::shared_ptr<Conversion> AddConversion(CLI::App& command, Action& action,
+                                          int (*work)(const Conversion&)) {
+  auto files = std::make_shared<Conversion>();
+  command.add_option("FILE", files->from, "the input, \"-\" for standard input")
       ->required()
       ->check(kFileName);
-  command->add_option("-o,--output", files->to, "the output, \"-\" for standard output")
+  command.add_option("-o,--output", files->to, "the output, \"-\" for standard output")
       ->check(kFileName)
       ->capture_default_str();
-  command->callback([&action, files, work] { action = [files, work] { return work(*files); }; });
-  return command;
+  command.callback([&action, files, work] { action = [files, work] { return work(*files); }; });
+  return files;
 }
 
 }  // namespace
 
 void AddDecode(CLI::App& program, Action& action) {
-  AddConversion(program, action, "decode",
-                "Shows the messages 1021 to 1027 of an RTCM 3 stream as JSON, one object a line.",
-                DecodeStream)
-      ->footer(
-          "Numbers are the integers of the messages. What is no such message is passed over and\n"
-          "counted.\n"
-          "\n"
-          "Example:\n"
-          "  velta decode examples/streams/dhdn.rtcm3");
+  CLI::App* command = program.add_subcommand(
+      "decode", "Shows the messages 1021 to 1027 of an RTCM 3 stream as JSON, one object a line.");
+  const auto files = AddConversion(*command, action, DecodeStream);
+  auto* units = command->add_flag("--units", files->units,
+                                  "show degrees, metres, arc-seconds and ppm, not integers");
+  AddDms(*command, files->dms)->needs(units);
+  command->footer(
+      "Names are those of the records' members, numbers the integers of the messages, as \"velta\n"
+      "encode\" takes them. What is no such message is passed over and counted. With --units\n"
+      "numbers are in the units below; what is not named there is a code, a count or a day.\n" +
+      FieldsByUnit() +
+      "\n"
+      "Examples:\n"
+      "  velta decode examples/streams/dhdn.rtcm3\n"
+      "  velta decode --units examples/streams/dhdn.rtcm3");
 }
 
 void AddEncode(CLI::App& program, Action& action) {
-  AddConversion(program, action, "encode",
-                "Turns JSON lines, as \"velta decode\" writes them, into RTCM 3 frames.",
-                EncodeLines)
-      ->footer(
-          "Every field must be there, and nothing else. A line that cannot be encoded is reported\n"
-          "and left out.\n"
-          "\n"
-          "Example: there and back again\n"
-          "  velta encode examples/streams/dhdn.jsonl | velta decode -");
+  CLI::App* command = program.add_subcommand(
+      "encode", "Turns JSON lines, as \"velta decode\" writes them, into RTCM 3 frames.");
+  AddConversion(*command, action, EncodeLines);
+  command->footer(
+      "Every field must be there, and nothing else. A line that cannot be encoded is reported\n"
+      "and left out.\n"
+      "\n"
+      "Example: there and back again\n"
+      "  velta encode examples/streams/dhdn.jsonl | velta decode -");
 }
 
 }  // namespace velta_tool

@@ -10,6 +10,7 @@
 #include <string_view>
 #include <utility>
 
+#include "angle.h"
 #include "orxutils/orx_string.h"
 #include "records/projection_types.h"
 #include "terminal.h"
@@ -26,6 +27,7 @@ using orx::cs::velta::TableData;
 constexpr double kArcSecondsPerRadian = kDegreesPerRadian * 3600;
 constexpr std::uint32_t kMolodenskiBadekas = 3;
 
+constexpr std::string_view kDegrees = "degrees";
 constexpr std::size_t kLabelWidth = 26;
 constexpr std::size_t kValuesPerLine = 4;  // a row of a residual grid
 const std::string kNextLine = "\n" + std::string(kLabelWidth, ' ');
@@ -77,17 +79,21 @@ ordered_json Scaled(std::span<const double> values, double factor) {
 
 /// How the grid of a datum and that of a projection are told.
 struct GridTerms {
-  const char* areaUnit;
-  const char* unit;  ///< of spacing and residuals
-  double factor;     ///< from what is stored to that unit
+  std::string_view areaUnit;
+  std::string_view unit;  ///< of spacing and residuals
+  double factor;          ///< from what is stored to that unit
   const char* north;
   const char* northKey;
   const char* east;
   const char* eastKey;
 };
-constexpr GridTerms kEllipsoidalGrid{
-    "degrees",           "arc-seconds",         kArcSecondsPerRadian, "latitude residuals",
-    "latitudeResiduals", "longitude residuals", "longitudeResiduals"};
+constexpr GridTerms kEllipsoidalGrid{kDegrees,
+                                     "arc-seconds",
+                                     kArcSecondsPerRadian,
+                                     "latitude residuals",
+                                     "latitudeResiduals",
+                                     "longitude residuals",
+                                     "longitudeResiduals"};
 constexpr GridTerms kPlaneGrid{"m",
                                "m",
                                1,
@@ -162,6 +168,14 @@ ordered_json WithShortNumbers(ordered_json value) {
   return value;
 }
 
+ordered_json WithDegreesMinutesSeconds(ordered_json value) {
+  if (value.is_number()) return DegreesMinutesSeconds(value.get<double>());
+  if (value.is_structured()) {
+    for (ordered_json& element : value) element = WithDegreesMinutesSeconds(std::move(element));
+  }
+  return value;
+}
+
 /// Without an exponent.
 std::string NumberText(const ordered_json& number) {
   if (!number.is_number_float()) return number.dump();
@@ -213,7 +227,7 @@ Description Describe(const DatumData& datum) {
       {"computation indicator", "computationIndicator", datum.computationIndicator},
       {"method", "method", MethodName(datum.computationIndicator)},
       {"height indicator", "heightIndicator", static_cast<std::int32_t>(datum.heightIndicator)},
-      {"area", "area", EdgesJson(datum.validityArea), "degrees"},
+      {"area", "area", EdgesJson(datum.validityArea), kDegrees},
       {"translations", "translations", Scaled(parameters.first(3), 1), "m"},
       {"rotations", "rotations", Scaled(parameters.subspan(3, 3), 1),
        "arc-seconds, coordinate frame"},
@@ -242,21 +256,21 @@ Description Describe(const StoredProjection& projection) {
       {"projection", "projection", NameOfProjection(code)},
       {"ellipsoid", "ellipsoid", EllipsoidJson(projection.axes[0], projection.axes[1]), "m"},
   };
-  const auto add = [&](const char* label, const char* key, const char* unit) {
+  const auto add = [&](const char* label, const char* key, std::string_view unit) {
     description.push_back({label, key, *parameter++, unit});
   };
   if (code == ProjectionData::OM || code == ProjectionData::ROM) {
-    add("azimuth of the line", "azimuthOfLine", "degrees");
+    add("azimuth of the line", "azimuthOfLine", kDegrees);
     add("scale", "scale", "");
-    add("longitude of centre", "longitudeOfCentre", "degrees");
-    add("latitude of centre", "latitudeOfCentre", "degrees");
+    add("longitude of centre", "longitudeOfCentre", kDegrees);
+    add("latitude of centre", "latitudeOfCentre", kDegrees);
     add("easting at the centre", "eastingAtCentre", "m");
     add("northing at the centre", "northingAtCentre", "m");
-    if (code == ProjectionData::ROM) add("rectified to skew grid", "rectifiedToSkew", "degrees");
+    if (code == ProjectionData::ROM) add("rectified to skew grid", "rectifiedToSkew", kDegrees);
   } else {
-    add("longitude of origin", "longitudeOfOrigin", "degrees");
+    add("longitude of origin", "longitudeOfOrigin", kDegrees);
     if (orx::cs::velta::HasScaleFactor(static_cast<std::uint32_t>(code))) add("scale", "scale", "");
-    add("latitude of origin", "latitudeOfOrigin", "degrees");
+    add("latitude of origin", "latitudeOfOrigin", kDegrees);
     add("false easting", "falseEasting", "m");
     add("false northing", "falseNorthing", "m");
   }
@@ -286,13 +300,22 @@ std::vector<std::string> DifferingLabels(const Description& a, const Description
   return labels;
 }
 
+Description WithDegreesMinutesSeconds(Description description) {
+  for (Property& property : description) {
+    if (property.unit != kDegrees) continue;
+    property.value = WithDegreesMinutesSeconds(std::move(property.value));
+    property.unit = "";
+  }
+  return description;
+}
+
 std::string ToText(const Description& description) {
   std::string text;
   for (const auto& [label, key, value, unit] : description) {
     std::string line = label;
     line.resize(kLabelWidth, ' ');
     line += value.is_null() ? "none" : ValueText(value);
-    if (*unit != '\0') line += std::string(" ") + unit;
+    if (!unit.empty()) line += std::string(" ").append(unit);
     text += line + '\n';
   }
   return text;

@@ -3,6 +3,7 @@
 #include <nlohmann/json.hpp>
 #include <span>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "velta/datum_data.h"
@@ -18,7 +19,7 @@ struct Property {
   const char* label;             ///< for people
   const char* key;               ///< for JSON
   nlohmann::ordered_json value;  ///< number, text, or an array or an object of them
-  const char* unit = "";
+  std::string_view unit = "";
 };
 using Description = std::vector<Property>;
 
@@ -51,6 +52,9 @@ Description Describe(const StoredProjection& projection);
 
 /// The labels of what differs by more than the rounding of its computation.
 std::vector<std::string> DifferingLabels(const Description& a, const Description& b);
+
+/// A description with its angles in degrees, minutes and seconds.
+Description WithDegreesMinutesSeconds(Description description);
 
 /// A description as lines of text.
 std::string ToText(const Description& description);

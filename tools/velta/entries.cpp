@@ -21,6 +21,7 @@ namespace {
 namespace velta = orx::cs::velta;
 namespace layout = velta::layout;
 using orx::TGenericRegistryKey;
+using orx::cs::projmath::TRectRgn;
 using velta::DatumData;
 using velta::RTCMDataSupport;
 using velta::TableData;
@@ -49,9 +50,33 @@ std::optional<Description> DescribeProjection(const TGenericRegistryKey& entry) 
   return Describe(projection);
 }
 
-std::optional<Description> DescribeEntry(FileKind kind, const TGenericRegistryKey& container,
-                                         const TGenericRegistryKey& entry) {
-  return kind == FileKind::kDatum ? DescribeDatum(container, entry) : DescribeProjection(entry);
+std::optional<TRectRgn> AreaOf(const TGenericRegistryKey& entry) {
+  TRectRgn area;
+  if (!velta::ReadValidityArea(velta::OpenExisting(entry, layout::kStandardDatum), area)) {
+    return std::nullopt;
+  }
+  return area;
+}
+
+std::optional<TRectRgn> GridAreaOf(FileKind kind, const TGenericRegistryKey& entry) {
+  const auto& layout = kind == FileKind::kDatum ? layout::kDatumGrid : layout::kProjectionGrid;
+  velta::StoredGrid grid;
+  if (!velta::ReadGridArea(velta::OpenExisting(entry, layout.key), layout, grid)) {
+    return std::nullopt;
+  }
+  const double(&bounds)[6] = grid.table.bounds;
+  return TRectRgn{bounds[0], bounds[1], bounds[2], bounds[3]};
+}
+
+Entry ReadEntry(FileKind kind, const TGenericRegistryKey& container,
+                const TGenericRegistryKey& key) {
+  Entry entry;
+  entry.name = orx::ToUtf8(key.GetName());
+  entry.content =
+      kind == FileKind::kDatum ? DescribeDatum(container, key) : DescribeProjection(key);
+  entry.area = AreaOf(key);
+  entry.gridArea = GridAreaOf(kind, key);
+  return entry;
 }
 
 template <class Message>
@@ -75,10 +100,20 @@ Entries ReadEntries(const std::string& file) {
   found.name = orx::ToUtf8(container.GetName());
   for (orx::TGenRegKeyIterator walk(container); walk;) {
     const TGenericRegistryKey entry(walk++);
-    found.entries.push_back({orx::ToUtf8(entry.GetName()), DescribeEntry(kind, container, entry)});
+    found.entries.push_back(ReadEntry(kind, container, entry));
   }
   found.error = tree.GetErrorState();  // damage inside a key shows when it is looked into
   return found;
+}
+
+const Entry* UsedFor(unsigned message, const Entries& found, const Position& position) {
+  for (const Entry& entry : found.entries) {
+    if (message == 1025) return &entry;
+    const auto& area = message == 1021 ? entry.area : entry.gridArea;
+    if (!area) return nullptr;
+    if (area->Inside(position.north, position.east, message == 1024)) return &entry;
+  }
+  return nullptr;
 }
 
 bool HoldsItsKind(const std::string& file) {
@@ -155,7 +190,7 @@ std::optional<Entry> FindEntry(const std::wstring& file, const std::wstring& nam
     const boost::unique_lock<boost::recursive_mutex> lock(tree->GetMutex());
     const TGenericRegistryKey container = velta::ContainerOf(*tree);
     const TGenericRegistryKey entry = velta::OpenExisting(container, name);
-    if (!entry.IsNull()) found = {orx::ToUtf8(name), DescribeEntry(kind, container, entry)};
+    if (!entry.IsNull()) found = ReadEntry(kind, container, entry);
   }
   giveBack(file);
   return found;

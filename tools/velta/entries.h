@@ -8,6 +8,7 @@
 #include "description.h"
 #include "orxregistry/in_file_key.h"
 #include "orxregistry/registry_key.h"
+#include "projmath/rect_rgn.h"
 #include "velta/rtcm_messages.h"
 
 /// The entries of datum and projection files as they are stored, and as the library would store
@@ -17,7 +18,9 @@ namespace velta_tool {
 /// An entry of a file.
 struct Entry {
   std::string name;
-  std::optional<Description> content;  ///< nothing when it is incomplete
+  std::optional<Description> content;                   ///< nothing when it is incomplete
+  std::optional<orx::cs::projmath::TRectRgn> area;      ///< of validity, of a datum; radians
+  std::optional<orx::cs::projmath::TRectRgn> gridArea;  ///< radians, of a plane grid metres
 };
 
 /// What a file holds.
@@ -29,6 +32,19 @@ struct Entries {
 
 /// Reads a datum file or a projection file, by its extension.
 Entries ReadEntries(const std::string& file);
+
+/// A place on the ellipsoid, radians, or in the plane, metres.
+struct Position {
+  double north;
+  double east;
+};
+
+/// The entry of which the library makes a message: the first whose area, or whose residual grid,
+/// holds the position; of a projection's parameters the first of all.
+/// \param message number of the message, 1021 standing for a 1022, 1025 for a 1027
+/// \return null when there is none; also when an entry in front is not readable, at which the
+///     library ends its search
+const Entry* UsedFor(unsigned message, const Entries& found, const Position& position);
 
 /// True when the file has entries of the kind that its extension says, and none of the other.
 bool HoldsItsKind(const std::string& file);

@@ -12,6 +12,7 @@
 #include "command.h"
 #include "interrupt.h"
 #include "orxregistry/in_file_key.h"
+#include "orxregistry/registry_key.h"
 #include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
 #include "orxutils/path.h"
@@ -53,6 +54,12 @@ class InterruptibleBuffer : public std::streambuf {
   std::streambuf& source_;
   std::vector<char> memory_;
 };
+
+/// Reads everything that a key holds, as its tree does not before it is asked for.
+void LookInto(const orx::TGenericRegistryKey& key) {
+  key.HasValue(L"");
+  for (orx::TGenRegKeyIterator keys(key); keys;) LookInto(orx::TGenericRegistryKey(keys++));
+}
 
 bool IsInput(const std::string& input, const fs::path& path) {
   if (input == kStandardStream) return orx::FileFuncs::isSameFile(stdin, path);
@@ -216,6 +223,7 @@ bool ReportErrorState(const std::string& file, std::uint32_t error) {
 
 bool ReportErrorState(const std::string& file) {
   const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, 0);
+  LookInto(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)));
   return ReportErrorState(file, tree.GetErrorState());
 }
 

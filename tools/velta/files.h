@@ -109,7 +109,8 @@ class Output {
 /// \return false when nothing is
 bool ReportErrorState(const std::string& file, std::uint32_t error);
 
-/// As above, for a file that the library reads without telling its state.
+/// As above, for a file that the library reads without telling its state: the whole is read, also
+/// what the library does not use.
 bool ReportErrorState(const std::string& file);
 
 }  // namespace velta_tool

@@ -1,20 +1,26 @@
 #include <CLI/App.hpp>
 #include <CLI/Config.hpp>
 #include <CLI/Formatter.hpp>
+#include <algorithm>
+#include <cmath>
 #include <cstdint>
 #include <cstdio>
+#include <functional>
 #include <memory>
 #include <optional>
+#include <set>
 #include <stdexcept>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <variant>
 #include <vector>
 
 #include "angle.h"
 #include "command.h"
 #include "description.h"
+#include "entries.h"
 #include "files.h"
-#include "orxutils/orx_string.h"
 #include "rtcm3/codec.h"
 #include "rtcm3/json_lines.h"
 #include "rtcm3/message.h"
@@ -29,64 +35,128 @@ using orx::cs::velta::AnnouncementBit;
 using orx::cs::velta::RTCMGenerator;
 using rtcm3::Message;
 
-constexpr double kMaxLatitude = 90;
-constexpr double kMaxLongitude = 360;
 constexpr std::int32_t kMaxSystemId = 255;
 constexpr std::size_t kMostAreasNamed = 10;
 
 struct Options {
   std::string datum;
   std::string projection;
-  double latitude = 0;   // degrees
-  double longitude = 0;  // degrees
+  std::optional<double> latitude;   // degrees
+  std::optional<double> longitude;  // degrees
   std::optional<double> northing;
   std::optional<double> easting;
   std::int32_t systemId = 0;
   std::string output = "-";
+  bool dms = false;
   bool json = false;
 };
 
+/// A message's file and the position that it is made for.
+struct Source {
+  const std::string& file;
+  Position position;
+};
+
+/// \param number of the message
+Source SourceOf(unsigned number, const Options& options) {
+  if (number == 1021 || number == 1022 || number == 1023) {
+    return {options.datum,
+            {*options.latitude / kDegreesPerRadian, *options.longitude / kDegreesPerRadian}};
+  }
+  return {options.projection, {options.northing.value_or(0), options.easting.value_or(0)}};
+}
+
 std::string Decimal(double number) {
   char text[32];
-  std::snprintf(text, sizeof text, "%.7g", number);
+  std::snprintf(text, sizeof text, "%.9g", number);
   return text;
 }
 
-/// Says that a datum file has no entry to use for the position, and which areas there are. The
-/// library does not tell an area that is not there from an entry that it cannot use.
-std::runtime_error NoAreaError(const Options& options, const RTCMGenerator& generator) {
-  const auto datums = generator.getAllDatums();
-  std::string text = options.datum + ": no area holds latitude " + Decimal(options.latitude) +
-                     ", longitude " + Decimal(options.longitude) +
-                     " degrees, or an entry up to the one that does cannot be used";
-  if (datums.empty()) return std::runtime_error(text + "; the file has no complete entry");
-  text += "; the areas are";
-  for (std::size_t i = 0; i < datums.size() && i < kMostAreasNamed; ++i) {
-    const Edges area(datums[i].validityArea);
-    text += "\n  latitude " + Decimal(area.south) + " to " + Decimal(area.north) + ", longitude " +
-            Decimal(area.west) + " to " + Decimal(area.east) + " degrees (" +
-            Printable(orx::ToUtf8(datums[i].targetDatumName)) + ")";
+/// How far a number lies from a range; the numbers of a circle come again after `period`.
+double Outside(double number, double from, double to, double period = 0) {
+  double distance = std::max({from - number, number - to, 0.0});
+  for (const double same : {number - period, number + period}) {
+    distance = std::min(distance, std::max({from - same, same - to, 0.0}));
   }
-  if (datums.size() > kMostAreasNamed) {
-    text += "\n  and " + std::to_string(datums.size() - kMostAreasNamed) + " more";
+  return distance;
+}
+
+/// The areas of a file's entries, those nearest to a position first, each once, as lines.
+/// \param key of the area in the entries' descriptions
+/// \param period after which eastings come again
+/// \param text of a coordinate
+std::string NearestAreas(const std::string& file, std::string_view key, double north, double east,
+                         double period, const std::function<std::string(double)>& text) {
+  std::set<std::pair<double, std::string>> areas;
+  for (const Entry& entry : ReadEntries(file).entries) {
+    if (!entry.content) continue;
+    for (const Property& property : *entry.content) {
+      if (property.key != key || property.value.is_null()) continue;
+      const auto edge = [&](const char* name) { return property.value.at(name).get<double>(); };
+      const double distance = std::hypot(Outside(north, edge("south"), edge("north")),
+                                         Outside(east, edge("west"), edge("east"), period));
+      areas.insert({distance, "south " + text(edge("south")) + ", north " + text(edge("north")) +
+                                  ", west " + text(edge("west")) + ", east " + text(edge("east"))});
+    }
   }
-  return std::runtime_error(text);
+  if (areas.empty()) return "; the file has no complete entry with one";
+  std::string lines = "; the nearest are";
+  std::size_t count = 0;
+  for (const auto& [distance, area] : areas) {
+    if (count++ == kMostAreasNamed) break;
+    lines += "\n  " + area;
+  }
+  if (count > kMostAreasNamed) lines += "\nof " + std::to_string(areas.size());
+  return lines;
+}
+
+/// Says that a datum file has no entry to use for the position. The library does not tell an area
+/// that is not there from an entry that it cannot use.
+std::runtime_error NoAreaError(const Options& options) {
+  const auto text = [&](double degrees) {
+    return options.dms ? DegreesMinutesSeconds(degrees) : Decimal(degrees);
+  };
+  const double latitude = *options.latitude;
+  const double longitude = *options.longitude;
+  return std::runtime_error(options.datum + ": no area holds latitude " + text(latitude) +
+                            ", longitude " + text(longitude) + (options.dms ? "" : " degrees") +
+                            ", or an entry up to the one that does cannot be used" +
+                            NearestAreas(options.datum, "area", latitude, longitude, 360, text));
+}
+
+std::runtime_error NoPlaneGridError(const Options& options) {
+  const double northing = *options.northing;
+  const double easting = *options.easting;
+  return std::runtime_error(
+      options.projection + ": no usable residual grid covers northing " + Decimal(northing) +
+      ", easting " + Decimal(easting) + " metres" +
+      NearestAreas(options.projection, "gridArea", northing, easting, 0, Decimal));
+}
+
+/// Says of which entry a message does not hold what is stored.
+std::runtime_error MisfitError(unsigned number, const Options& options, const char* reason) {
+  const Source source = SourceOf(number, options);
+  const unsigned kind = number == 1022 ? 1021 : number == 1027 ? 1025 : number;
+  const Entries found = ReadEntries(source.file);
+  const Entry* const entry = UsedFor(kind, found, source.position);
+  return std::runtime_error(source.file + ": what is stored in " +
+                            (entry ? Printable(entry->name) : "it") + " does not fit a " +
+                            std::to_string(number) + ": " + reason);
 }
 
 /// The messages for a position, in the order in which they are sent.
 std::vector<Message> Generate(const Options& options) {
   const RTCMGenerator generator(options.systemId, ToWide(options.datum),
                                 ToWide(options.projection));
-  const double latitude = options.latitude / kDegreesPerRadian;
-  const double longitude = options.longitude / kDegreesPerRadian;
   std::vector<Message> messages;
   std::uint32_t announced = 0;
 
   if (!options.datum.empty()) {
+    const auto [latitude, longitude] = SourceOf(1021, options).position;
     RequireFile(options.datum);
     ReportErrorState(options.datum);
     const auto datum = generator.getRtcmDatumMessage(latitude, longitude, 0);
-    if (!datum) throw NoAreaError(options, generator);
+    if (!datum) throw NoAreaError(options);
     messages.push_back(rtcm3::FromRecord(*datum));
     if (const auto grid = generator.get1023(latitude, longitude, 0)) {
       messages.emplace_back(*grid);
@@ -100,11 +170,7 @@ std::vector<Message> Generate(const Options& options) {
     ReportErrorState(options.projection);
     if (options.northing && options.easting) {
       const auto grid = generator.get1024(*options.northing, *options.easting, 0);
-      if (!grid) {
-        throw std::runtime_error(options.projection + ": no usable residual grid covers northing " +
-                                 Decimal(*options.northing) + ", easting " +
-                                 Decimal(*options.easting) + " metres");
-      }
+      if (!grid) throw NoPlaneGridError(options);
       messages.emplace_back(*grid);
       announced |= AnnouncementBit(1024);
     }
@@ -128,26 +194,18 @@ int Run(const Options& options) {
   Output out(options.output, options.json ? OutputKind::kText : OutputKind::kFrames,
              {options.datum, options.projection});
   for (const Message& message : Generate(options)) {
-    options.json ? rtcm3::AppendJsonLine(message, out.pending())
-                 : rtcm3::Encode(message, out.pending());
+    if (options.json) {
+      rtcm3::AppendJsonLine(message, out.pending());
+      continue;
+    }
+    try {
+      rtcm3::Encode(message, out.pending());
+    } catch (const rtcm3::FieldError& error) {
+      throw MisfitError(rtcm3::NumberOf(message), options, error.what());
+    }
   }
   out.Finish();
   return kDone;
-}
-
-void AddPosition(CLI::App& command, Options& options, CLI::Option* datum, CLI::Option* projection) {
-  auto* latitude = command.add_option("--lat", options.latitude, "latitude, degrees")
-                       ->transform(AngleCheck(kLatitude, kMaxLatitude));
-  auto* longitude = command.add_option("--lon", options.longitude, "longitude, degrees")
-                        ->transform(AngleCheck(kLongitude, kMaxLongitude));
-  datum->needs(latitude)->needs(longitude);
-  auto* northing =
-      command.add_option("--northing", options.northing, "northing for a 1024, metres")
-          ->check(kNumber);
-  auto* easting = command.add_option("--easting", options.easting, "easting for a 1024, metres")
-                      ->check(kNumber);
-  northing->needs(easting)->needs(projection);
-  easting->needs(northing);
 }
 
 }  // namespace
@@ -159,13 +217,22 @@ void AddGenerate(CLI::App& program, Action& action) {
   auto* datum = command->add_option("--datum", options->datum, "the datum file")->check(kDatumFile);
   auto* projection = command->add_option("--projection", options->projection, "the projection file")
                          ->check(kProjectionFile);
-  AddPosition(*command, *options, datum, projection);
+  AddPosition(*command, options->latitude, options->longitude);
+  datum->needs("--lat")->needs("--lon");
+  auto* northing =
+      command->add_option("--northing", options->northing, "northing for a 1024, metres")
+          ->check(kNumber);
+  auto* easting = command->add_option("--easting", options->easting, "easting for a 1024, metres")
+                      ->check(kNumber);
+  northing->needs(easting)->needs(projection);
+  easting->needs(northing);
   command->add_option("--system-id", options->systemId, "System Identification Number")
       ->check(CLI::Range(0, kMaxSystemId))
       ->capture_default_str();
   command->add_option("-o,--output", options->output, "the output")
       ->check(kFileName)
       ->capture_default_str();
+  AddDms(*command, options->dms);
   command->add_flag("--json", options->json,
                     "print JSON lines as \"velta decode\" does, no frames");
   command->footer(

@@ -25,6 +25,7 @@
 #include "interrupt.h"
 #include "orxutils/file_error.h"
 #include "orxutils/orx_string.h"
+#include "orxutils/path.h"
 #include "rtcm3/message_reader.h"
 #include "rtcm3/message_sets.h"
 #include "stream_notes.h"
@@ -240,17 +241,32 @@ class Ingestion {
   void NameSharedFile(const std::vector<Place>& places, const std::string& receivedName) {
     if (places.empty()) return;
     const std::wstring& file = places.front().file;
-    const auto [known, isNew] = receivedNames_.try_emplace(file, std::set<std::string>());
-    if (!known->second.insert(receivedName).second || isNew) return;
+    std::set<std::string>& known = NamesReceivedFor(file);
+    if (!known.insert(receivedName).second || known.size() == 1) return;
     const auto quoted = [](const std::string& name) {
       return '"' + Printable(orx::ToUtf8(orx::Widen(name))) + '"';
     };
     std::string names;
-    for (const std::string& name : known->second) {
+    for (const std::string& name : known) {
       names += (names.empty() ? "" : " and ") + quoted(name);
     }
-    ReportNote(names + " have one name without signs and repeated characters, and one file: " +
+    ReportNote(names + " have one file, as it is named without signs and repeated characters: " +
                orx::ToUtf8(file));
+  }
+
+  /// The names of the datums that went into a file; on Windows names that differ in case are one
+  /// file.
+  std::set<std::string>& NamesReceivedFor(const std::wstring& file) {
+    const auto known = receivedNames_.find(file);
+    if (known != receivedNames_.end()) return known->second;
+    const auto path = [](const std::wstring& name) {
+      return orx::ToSystemPath(ToPath(orx::ToUtf8(name)));
+    };
+    for (auto& [other, names] : receivedNames_) {
+      std::error_code ignored;
+      if (std::filesystem::equivalent(path(other), path(file), ignored)) return names;
+    }
+    return receivedNames_[file];
   }
 
   /// Says, once for each system, that a 1026 is not taken.
@@ -406,8 +422,9 @@ void AddIngest(CLI::App& program, Action& action) {
       "what is new: an entry, a projection, other parameters of a datum. A 1026 is not supported.\n"
       "A set that is incomplete at the end is a failure if its system never gave a complete one.\n"
       "Interrupted (Ctrl-C), the program takes what it has read and ends as at the end of it.\n"
-      "Without a directory the files go to the user's geodetic directory, where the office\n"
-      "application looks for them; the environment variable ORX_USER_GEO_DIR names another.\n"
+      "Without a directory the files go where the office application looks for them: to\n"
+      "datums/rtcmdata and projections/rtcmdata in ~/.local/share/orx/geodata, on Windows\n"
+      "%LOCALAPPDATA%\\orx\\geodata; the environment variable ORX_USER_GEO_DIR names another.\n"
       "\n"
       "Example:\n"
       "  velta ingest --dir out examples/streams/dhdn.rtcm3");

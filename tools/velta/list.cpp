@@ -3,9 +3,12 @@
 #include <CLI/Formatter.hpp>
 #include <exception>
 #include <memory>
+#include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
+#include "angle.h"
 #include "command.h"
 #include "description.h"
 #include "entries.h"
@@ -17,16 +20,47 @@ namespace {
 
 struct Options {
   std::vector<std::string> files;
+  std::optional<double> latitude;   // degrees
+  std::optional<double> longitude;  // degrees
   bool full = false;
+  bool dms = false;
   bool json = false;
+
+  /// The position whose entries are shown, if one is given.
+  std::optional<Position> position() const {
+    if (!latitude || !longitude) return std::nullopt;
+    return Position{*latitude / kDegreesPerRadian, *longitude / kDegreesPerRadian};
+  }
 };
 
-/// The description of an entry with its name in front.
-Description Named(const Entry& entry) {
+/// What the library makes of an entry, for people; empty when nothing.
+std::string Uses(const std::string& file, const Entries& found, const Entry& entry,
+                 const std::optional<Position>& position) {
+  if (KindOf(file) == FileKind::kProjection) {
+    return &entry == UsedFor(1025, found, {}) ? "projection message" : "";
+  }
+  if (!position) return "";
+  const bool isOfDatum = &entry == UsedFor(1021, found, *position);
+  const bool isOfGrid = &entry == UsedFor(1023, found, *position);
+  if (isOfDatum && isOfGrid) return "datum message, residual grid";
+  if (isOfDatum) return "datum message";
+  return isOfGrid ? "residual grid" : "";
+}
+
+/// The description of a complete entry with its name in front and what it is used for.
+Description Labelled(const Entry& entry, const std::string& uses) {
   Description description = {{"entry", "entry", entry.name}};
-  if (!entry.content) return description;
+  if (!uses.empty()) description.push_back({"used for", "usedFor", uses});
   description.insert(description.end(), entry.content->begin(), entry.content->end());
   return description;
+}
+
+/// True when an entry's area or grid holds the position.
+bool Holds(const Entry& entry, const Position& position) {
+  const auto holds = [&](const auto& area) {
+    return area && area->Inside(position.north, position.east, false);
+  };
+  return holds(entry.area) || holds(entry.gridArea);
 }
 
 /// Names those that the library cannot use.
@@ -55,23 +89,37 @@ void Print(const std::vector<Description>& entries, const Options& options, Outp
   }
 }
 
-/// \return false when something is wrong with the file
+/// The complete entries that are to be shown.
+std::vector<Description> Chosen(const std::string& file, const Entries& found,
+                                const Options& options) {
+  const std::optional<Position> position = options.position();
+  std::vector<Description> chosen;
+  for (const Entry& entry : found.entries) {
+    if (!entry.content || (position && !Holds(entry, *position))) continue;
+    Description description = Labelled(entry, Uses(file, found, entry, position));
+    if (options.dms) description = WithDegreesMinutesSeconds(std::move(description));
+    chosen.push_back(std::move(description));
+  }
+  return chosen;
+}
+
+/// \return false when something is wrong with the file, or nothing of it can be shown
 bool List(const std::string& file, const Options& options, Output& out) {
   RequireFile(file);
   const Entries found = ReadEntries(file);
-  std::vector<Description> complete;
-  for (const Entry& entry : found.entries) {
-    if (entry.content) complete.push_back(Named(entry));
-  }
+  const std::vector<Description> chosen = Chosen(file, found, options);
   if (!options.json && options.files.size() > 1) {
     out.pending() += (&file == &options.files.front() ? "" : "\n") + file + ":\n";
   }
-  Print(complete, options, out);
+  Print(chosen, options, out);
   out.Flush();
   const bool isDamaged = ReportErrorState(file, found.error);
   ReportIncomplete(file, found);
-  if (complete.empty()) ReportFailure(file + ": no complete entry in it");
-  return !isDamaged && !complete.empty();
+  if (chosen.empty()) {
+    ReportFailure(file + (options.position() ? ": no complete entry for the position in it"
+                                             : ": no complete entry in it"));
+  }
+  return !isDamaged && !chosen.empty();
 }
 
 int Run(const Options& options) {
@@ -97,18 +145,28 @@ void AddList(CLI::App& program, Action& action) {
   command->add_option("FILE", options->files, "the files")
       ->required()
       ->check(kDatumOrProjectionFile);
+  AddPosition(*command, options->latitude, options->longitude);
   command->add_flag("--full", options->full, "show each of several entries whole");
+  AddDms(*command, options->dms);
   command->add_flag("--json", options->json, "print JSON, one object a line");
   command->footer(
       "Angles are in degrees, rotations and residuals of angles in arc-seconds, scale corrections\n"
       "in ppm, lengths in metres; rotations are in the coordinate-frame sense. Of several entries\n"
-      "it shows what they share, then a line for each. Projections are shown as they are stored;\n"
-      "the library makes its message of the first.\n"
+      "it shows what they share, then a line for each. Projections are shown as they are stored.\n"
+      "For a latitude and a longitude it shows the entries of datum files that hold the position,\n"
+      "and of which of them the messages are made.\n"
       "\n"
       "Example:\n"
       "  velta ingest --dir out examples/streams/dhdn.rtcm3\n"
       "  velta list out/datums/rtcmdata/AUTO_DHDN_BESEL.dff");
-  command->callback([&action, options] { action = [options] { return Run(*options); }; });
+  command->callback([&action, options] {
+    for (const std::string& file : options->files) {
+      if (options->latitude && KindOf(file) == FileKind::kProjection) {
+        throw CLI::ValidationError("--lat", "entries of " + file + " have no such position");
+      }
+    }
+    action = [options] { return Run(*options); };
+  });
 }
 
 }  // namespace velta_tool
