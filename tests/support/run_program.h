@@ -15,7 +15,8 @@
 namespace velta_test {
 
 /// Runs a program without a command interpreter, with its standard streams on files, and waits.
-/// \param arguments the program's path first; no blank and no quotation mark in any
+/// \param arguments the program's path first; none has a backslash before a quotation mark or its
+///     end
 /// \return its exit status, negative when it did not start or did not end by itself
 #ifdef _WIN32
 
@@ -23,7 +24,12 @@ inline int RunProgram(const std::vector<std::string>& arguments, const std::file
                       const std::filesystem::path& out, const std::filesystem::path& err) {
   std::wstring call;
   for (const std::string& argument : arguments) {
-    call += std::filesystem::u8path(argument).wstring() + L" ";
+    call += L'"';
+    for (const wchar_t c : std::filesystem::u8path(argument).wstring()) {
+      if (c == L'"') call += L'\\';
+      call += c;
+    }
+    call += L"\" ";
   }
   SECURITY_ATTRIBUTES inherited = {sizeof inherited, nullptr, TRUE};
   const auto open = [&inherited](const std::filesystem::path& path, DWORD access, DWORD how) {
