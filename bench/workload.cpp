@@ -3,7 +3,7 @@
 #include <cstdio>
 #include <cstdlib>
 
-#include "records/message_units.h"
+#include "velta/message_units.h"
 
 namespace velta_bench {
 namespace fs = std::filesystem;

@@ -12,7 +12,7 @@ namespace orx::cs::velta {
 /// One map projection: its type, its parameters (degrees, metres, plain ratios), the names it
 /// goes by and its plane residual grid.
 struct ProjectionData {
-  /// Projection types; the values are the RTCM type codes (DF170), plus 100.
+  /// Projection types: the type codes of RTCM 3 (DF170), and one more of our own.
   enum projList {
     NONE = 0,    ///< no or unknown type
     TM = 1,      ///< Transverse Mercator

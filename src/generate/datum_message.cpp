@@ -1,10 +1,10 @@
 // From a datum entry to the record of its 1021 or 1022.
 
+#include "conversion/datum_conversion.h"
 #include "generate/make_record.h"
-#include "records/message_units.h"
-#include "records/truncation.h"
 #include "store/gff_layout.h"
 #include "store/stored_entries.h"
+#include "velta/message_units.h"
 #include "velta/rtcm_generator.h"
 
 namespace orx::cs::velta {
@@ -12,43 +12,6 @@ namespace {
 
 constexpr std::uint32_t kMessage1021 = 21;
 constexpr std::uint32_t kMessage1022 = 22;
-
-std::uint32_t ExtentOf(double radians) {
-  const std::uint32_t extent = ToUint32(radians / kTwoArcSeconds);
-  return extent > kLargestExtent ? 0 : extent;
-}
-
-void SetArea(const projmath::TRectRgn& area, RtcmBasicTransformMessage& message) {
-  message.phiV = ToInt32((area.south + area.northExtent * 0.5) / kTwoArcSeconds);
-  message.lambdaV = ToInt32((area.west + area.eastExtent * 0.5) / kTwoArcSeconds);
-  message.dPhiV = ExtentOf(area.northExtent);
-  message.dLambdaV = ExtentOf(area.eastExtent);
-}
-
-void SetEllipsoids(const DatumData& datum, RtcmBasicTransformMessage& message) {
-  const projmath::Ellipsoid& source = datum.sourceEllipsoid;
-  const projmath::Ellipsoid& target = datum.targetEllipsoid;
-  message.addAs = ToUint32((source.a - kSemiMajorAxisBase) / kAxisResolution);
-  message.addBs = ToUint32((source.second - kSemiMinorAxisBase) / kAxisResolution);
-  message.addAt = ToUint32((target.a - kSemiMajorAxisBase) / kAxisResolution);
-  message.addBt = ToUint32((target.second - kSemiMinorAxisBase) / kAxisResolution);
-}
-
-void SetParameters(const double (&parameters)[13], RtcmBasicTransformMessage& message) {
-  message.dX = ToInt32(parameters[0] / kTranslationResolution);
-  message.dY = ToInt32(parameters[1] / kTranslationResolution);
-  message.dZ = ToInt32(parameters[2] / kTranslationResolution);
-  message.r1 = ToInt32(parameters[3] / kRotationResolution);
-  message.r2 = ToInt32(parameters[4] / kRotationResolution);
-  message.r3 = ToInt32(parameters[5] / kRotationResolution);
-  message.dS = ToInt32(parameters[6] / kScaleResolution);
-}
-
-void SetRotationPoint(const double (&parameters)[13], Rtcm1022& message) {
-  message.xp = ToInt64(parameters[7] / kTranslationResolution);
-  message.yp = ToInt64(parameters[8] / kTranslationResolution);
-  message.zp = ToInt64(parameters[9] / kTranslationResolution);
-}
 
 void SetNames(const DatumData& datum, RtcmBasicTransformMessage& message) {
   message.sourceName = Narrow(datum.sourceDatumName);
@@ -63,15 +26,15 @@ boost::shared_ptr<RtcmBasicTransformMessage> MakeMessage(const projmath::TRectRg
   if (datum.computationIndicator > kMolodenskiBadekas) return nullptr;
   Rtcm1022 message;
   message.systemId = systemId;
-  SetArea(area, message);
-  SetEllipsoids(datum, message);
-  SetParameters(datum.parameters, message);
+  ConvertValidityArea(area, message);
+  ConvertEllipsoids(datum, message);
+  ConvertParameters(datum, message);
   message.computationIndicator = datum.computationIndicator;
   message.heightIndicator = datum.heightIndicator;
   SetNames(datum, message);
   if (datum.computationIndicator == kMolodenskiBadekas) {
     message.messageType = kMessage1022;
-    SetRotationPoint(datum.parameters, message);
+    ConvertRotationPoint(datum, message);
     return MakeRecord(message);
   }
   message.messageType = kMessage1021;

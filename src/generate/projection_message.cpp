@@ -1,9 +1,7 @@
 // From a projection entry to the record of its 1025 or 1027.
 
+#include "conversion/projection_conversion.h"
 #include "generate/make_record.h"
-#include "records/message_units.h"
-#include "records/projection_types.h"
-#include "records/truncation.h"
 #include "store/gff_layout.h"
 #include "store/registry_tree.h"
 #include "store/stored_entries.h"
@@ -14,39 +12,18 @@ namespace {
 
 using Parameters = double[16];
 
-std::int64_t Angle(double degrees) { return ToInt64(degrees / kProjectionAngleResolution); }
-std::int64_t Length(double metres) { return ToInt64(metres / kProjectionLengthResolution); }
-std::uint64_t UnsignedLength(double metres) {
-  return ToUint64(metres / kProjectionLengthResolution);
-}
-double ScaleAddition(double factor) {
-  return (factor / kPpm - kProjectionScaleBase) / kProjectionScaleResolution;
-}
-
-Rtcm1025 Make1025(ProjectionData::projList type, const Parameters& p) {
+Rtcm1025 Make1025(ProjectionData::projList type, const Parameters& parameters) {
   Rtcm1025 message;
   message.projectionType = type;
-  message.loNO = Angle(p[0]);
-  const bool hasScale = HasScaleFactor(type);
-  if (hasScale) message.addSNO = ToLow32(ScaleAddition(p[1]));
-  const double* const rest = p + (hasScale ? 2 : 1);
-  message.laNO = Angle(rest[0]);
-  message.fe = UnsignedLength(rest[1]);
-  message.fn = Length(rest[2]);
+  SetParameters(parameters, message);
   return message;
 }
 
-Rtcm1027 Make1027(bool isRectified, const Parameters& p) {
+Rtcm1027 Make1027(bool isRectified, const Parameters& parameters) {
   Rtcm1027 message;
   message.projectionType = ProjectionData::OM;
   message.rectificationFlag = isRectified;
-  message.azIL = ToUint64(p[0] / kProjectionAngleResolution);
-  message.addSIL = ToUint64(ScaleAddition(p[1]));
-  message.loPC = Angle(p[2]);
-  message.laPC = Angle(p[3]);
-  message.epc = UnsignedLength(p[4]);
-  message.npc = Length(p[5]);
-  if (isRectified) message.diffARSG = ToInt32((p[6] - p[0]) / kProjectionAngleResolution);
+  SetParameters(parameters, message);
   return message;
 }
 

@@ -2,7 +2,7 @@
 
 #include <utility>
 
-#include "records/projection_types.h"
+#include "conversion/projection_types.h"
 #include "store/gff_layout.h"
 #include "store/stored_entries.h"
 

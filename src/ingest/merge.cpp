@@ -2,10 +2,10 @@
 
 #include <boost/thread/lock_types.hpp>
 
+#include "ingest/shared_file.h"
 #include "orxregistry/in_file_key.h"
 #include "orxregistry/registry_key.h"
 #include "store/registry_tree.h"
-#include "store/shared_file.h"
 #include "velta/rtcm_data_support.h"
 
 namespace orx::cs::velta {
@@ -13,7 +13,7 @@ namespace {
 
 using MergeContainers = ResultCode(TGenericRegistryKey& target, TGenericRegistryKey& source);
 
-ResultCode MergeEntries(const FileKind& kind, const TGenericRegistryKey& target,
+ResultCode MergeEntries(const SharedFiles& kind, const TGenericRegistryKey& target,
                         const TGenericRegistryKey& source) {
   if (target.IsNull() || source.IsNull()) return kind.trouble;
   for (TGenRegKeyIterator walk(source); walk;) {
@@ -25,13 +25,7 @@ ResultCode MergeEntries(const FileKind& kind, const TGenericRegistryKey& target,
   return kSuccess;
 }
 
-/// Looks into every key below a key, and at every value.
-void LookInto(const TGenericRegistryKey& key) {
-  key.HasValue(L"");
-  for (TGenRegKeyIterator walk(key); walk;) LookInto(TGenericRegistryKey(walk++));
-}
-
-ResultCode MergeFiles(const FileKind& kind, const COrxStringT<wchar_t>& targetPath,
+ResultCode MergeFiles(const SharedFiles& kind, const COrxStringT<wchar_t>& targetPath,
                       const COrxStringT<wchar_t>& sourcePath, MergeContainers* merge) {
   TCSInFileKey* target = nullptr;
   const ResultCode obtained = ObtainTree(kind, targetPath, &target);
@@ -42,7 +36,7 @@ ResultCode MergeFiles(const FileKind& kind, const COrxStringT<wchar_t>& targetPa
   TGenericRegistryKey targetContainer = ContainerOf(*target);
   if (targetContainer.IsNull()) return kind.trouble;
 
-  const TCSInFileKey source(sourcePath, kTreeDescription, nullptr, true, kTreeFlags);
+  const TCSInFileKey source(sourcePath, kTreeDescription, nullptr, true, kRegistryFlags);
   if (source.GetErrorState() != kRegistryOk) return kind.trouble;
   TGenericRegistryKey sourceContainer = ContainerOf(source);
   if (sourceContainer.IsNull()) return kind.trouble;

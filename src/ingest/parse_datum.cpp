@@ -1,9 +1,9 @@
 // From a datum message to an entry of its datum's file.
 
-#include "ingest/datum_conversion.h"
-#include "ingest/grid_conversion.h"
-#include "ingest/record_file.h"
-#include "records/message_units.h"
+#include "conversion/datum_conversion.h"
+#include "conversion/grid_conversion.h"
+#include "ingest/entry_file.h"
+#include "velta/message_units.h"
 #include "velta/rtcm_data_support.h"
 
 namespace orx::cs::velta {

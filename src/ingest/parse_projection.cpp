@@ -1,8 +1,8 @@
 // From a projection message to an entry of its datum's projection file.
 
-#include "ingest/grid_conversion.h"
-#include "ingest/projection_conversion.h"
-#include "ingest/record_file.h"
+#include "conversion/grid_conversion.h"
+#include "conversion/projection_conversion.h"
+#include "ingest/entry_file.h"
 #include "velta/rtcm_data_support.h"
 
 namespace orx::cs::velta {

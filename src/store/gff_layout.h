@@ -10,10 +10,10 @@ namespace orx::cs::velta::layout {
 using Text = ValueOf<COrxStringT<wchar_t>>;
 
 // Container key of a datum file.
-inline constexpr Text kDatumFileName{L"rtcm_datumName"};
+inline constexpr Text kContainerDatum{L"rtcm_datumName"};
 
 // Container key of a projection file.
-inline constexpr Text kProjectionFileName{L"rtcm_projectionName"};
+inline constexpr Text kContainerProjection{L"rtcm_projectionName"};
 inline constexpr ValueOf<unsigned int> kSystemId{L"system_identification_number"};
 
 // Entry.

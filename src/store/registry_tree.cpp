@@ -11,4 +11,13 @@ TGenericRegistryKey ContainerOf(const TInKey& tree) {
   return FirstSubKey(TGenericRegistryKey(TGenericRegistryKeyPtr(tree)));
 }
 
+void LookInto(const TGenericRegistryKey& key) {
+  key.HasValue(L"");
+  for (TGenRegKeyIterator walk(key); walk;) LookInto(TGenericRegistryKey(walk++));
+}
+
+void ReadIfLost(TInFileKey& file) {
+  if (file.GetErrorState() == kCannotBeOpened) file.Reload();
+}
+
 }  // namespace orx::cs::velta

@@ -6,14 +6,39 @@
 /// What is alike in the trees of all datum and projection files.
 namespace orx::cs::velta {
 
-/// What registry trees are made and opened with.
+/// What new trees are described by.
 inline constexpr const wchar_t* kTreeDescription = L"Sylbri RTCM System";
-inline constexpr unsigned kTreeFlags = 97;
 
 /// The first sub-key, null when there is none.
 TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key);
 
 /// The container key of a tree: the first under its root; null when there is none.
 TGenericRegistryKey ContainerOf(const TInKey& tree);
+
+/// Reads every key below a key, with its values: damage inside a key shows only then.
+void LookInto(const TGenericRegistryKey& key);
+
+/// A change of a shared file: either all of it is saved, or it is forgotten when this goes. What
+/// was unsaved before is the caller's and is left alone.
+class Change {
+ public:
+  explicit Change(TInFileKey& file) : file_(file), hadNothingElse_(!file.HasUnsavedChanges()) {}
+  Change(const Change&) = delete;
+  Change& operator=(const Change&) = delete;
+  ~Change() {
+    if (!isSaved_ && hadNothingElse_) file_.ForgetChanges();
+  }
+
+  bool Save() { return isSaved_ = file_.Save(false, kRegistryVersion); }
+
+ private:
+  TInFileKey& file_;
+  bool hadNothingElse_;
+  bool isSaved_ = false;
+};
+
+/// Reads a tree again that could not be read when a change of it was forgotten. To be called with
+/// the tree's lock, before anything is looked up in it.
+void ReadIfLost(TInFileKey& file);
 
 }  // namespace orx::cs::velta

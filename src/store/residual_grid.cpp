@@ -5,7 +5,7 @@
 #include <cstdint>
 #include <iterator>
 
-#include "records/message_units.h"
+#include "velta/message_units.h"
 #include "velta/rtcm_messages.h"
 
 namespace orx::cs::velta {

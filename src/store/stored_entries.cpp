@@ -4,10 +4,10 @@
 
 #include "orxregistry/in_file_key.h"
 #include "orxutils/file_funcs.h"
-#include "records/message_units.h"
 #include "store/gff_layout.h"
 #include "store/registry_tree.h"
 #include "store/residual_grid.h"
+#include "velta/message_units.h"
 
 namespace orx::cs::velta {
 namespace {
@@ -28,7 +28,7 @@ bool ReadEllipsoid(const TGenericRegistryKey& standard, const DoublesOf<2>& valu
 
 TGenericRegistryKey OpenContainer(const COrxStringT<wchar_t>& fileName) {
   if (!FileFuncs::isFileExists(fileName)) return TGenericRegistryKey(nullptr);
-  return ContainerOf(TInFileKey(fileName, nullptr, nullptr, true, kTreeFlags));
+  return ContainerOf(TInFileKey(fileName, nullptr, nullptr, true, kRegistryFlags));
 }
 
 bool ReadValidityArea(const TGenericRegistryKey& standard, projmath::TRectRgn& area) {
@@ -55,7 +55,7 @@ bool ReadTransformation(const TGenericRegistryKey& container, const TGenericRegi
   if (!Read(standard, layout::kHeightIndicator, height)) return false;
   datum.heightIndicator = static_cast<std::uint32_t>(height);
   return Read(standard, layout::kSourceDatumName, datum.sourceDatumName) &&
-         Read(container, layout::kDatumFileName, datum.targetDatumName);
+         Read(container, layout::kContainerDatum, datum.targetDatumName);
 }
 
 bool ReadDatum(const TGenericRegistryKey& container, const TGenericRegistryKey& entry,

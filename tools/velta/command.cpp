@@ -20,7 +20,7 @@ std::string CodeText(orx::cs::velta::ResultCode code) {
   return text;
 }
 
-std::string Describe(orx::cs::velta::ResultCode code) {
+std::string Meaning(orx::cs::velta::ResultCode code) {
   for (const auto& [known, meaning] : orx::cs::velta::kResultMeanings) {
     if (known == code) return CodeText(code) + " " + meaning;
   }

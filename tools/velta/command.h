@@ -37,6 +37,6 @@ void ReportNote(std::string_view what);
 std::string CodeText(orx::cs::velta::ResultCode code);
 
 /// A result code with its meaning.
-std::string Describe(orx::cs::velta::ResultCode code);
+std::string Meaning(orx::cs::velta::ResultCode code);
 
 }  // namespace velta_tool

@@ -11,8 +11,8 @@
 #include <utility>
 
 #include "angle.h"
+#include "conversion/projection_types.h"
 #include "orxutils/orx_string.h"
-#include "records/projection_types.h"
 #include "terminal.h"
 #include "velta/projection_data.h"
 

@@ -22,8 +22,6 @@ namespace {
 using nlohmann::ordered_json;
 using orx::TGenericRegistryKey;
 
-constexpr unsigned kOpenFlags = 97;
-
 /// Takes any value, without a copy.
 class AnyValue : public orx::bin_value {
  public:
@@ -115,7 +113,7 @@ void WriteKey(const TGenericRegistryKey& key, const std::string& indent, Output&
 
 int Run(const std::string& file) {
   RequireFile(file);
-  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, kOpenFlags);
+  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, orx::kRegistryFlags);
   Output out;
   WriteKey(TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)), "", out);
   out.pending() += '\n';

@@ -2,12 +2,12 @@
 
 #include <boost/thread/lock_types.hpp>
 
+#include "conversion/datum_conversion.h"
+#include "conversion/grid_conversion.h"
+#include "conversion/projection_conversion.h"
+#include "conversion/projection_types.h"
 #include "files.h"
-#include "ingest/datum_conversion.h"
-#include "ingest/grid_conversion.h"
-#include "ingest/projection_conversion.h"
 #include "orxutils/orx_string.h"
-#include "records/projection_types.h"
 #include "store/gff_layout.h"
 #include "store/key_values.h"
 #include "store/registry_tree.h"
@@ -94,7 +94,7 @@ void FillProjection(const Message& message, const velta::Rtcm1024* grid, int typ
 
 Entries ReadEntries(const std::string& file) {
   const FileKind kind = KindOf(file);
-  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, velta::kTreeFlags);
+  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, orx::kRegistryFlags);
   const TGenericRegistryKey container = velta::ContainerOf(tree);
   Entries found;
   found.name = orx::ToUtf8(container.GetName());
@@ -118,7 +118,7 @@ const Entry* UsedFor(unsigned message, const Entries& found, const Position& pos
 
 bool HoldsItsKind(const std::string& file) {
   const bool isDatum = KindOf(file) == FileKind::kDatum;
-  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, velta::kTreeFlags);
+  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, orx::kRegistryFlags);
   const TGenericRegistryKey container = velta::ContainerOf(tree);
   bool hasOwn = false;
   for (orx::TGenRegKeyIterator walk(container); walk;) {

@@ -9,10 +9,12 @@
 #include <string_view>
 #include <utility>
 #include <variant>
+#include <vector>
 
 #include "angle.h"
+#include "conversion/message_fields.h"
+#include "description.h"
 #include "orxutils/orx_string.h"
-#include "records/message_units.h"
 #include "rtcm3/fields.h"
 
 namespace velta_tool {
@@ -20,104 +22,82 @@ namespace rtcm3 = orx::cs::velta::rtcm3;
 namespace velta = orx::cs::velta;
 namespace {
 
-constexpr double kArcSecondsPerDegree = 3600;
-
-/// What a field's integer stands for: (base + integer * step) * factor.
-struct Unit {
-  std::string_view name;
-  double step;
-  const char* stepText;  ///< for people
-  double base = 0;
-  double factor = 1;
-};
+constexpr double kArcSecondsPerRadian = kDegreesPerRadian * 3600;
 constexpr std::string_view kDegrees = "degrees";
-constexpr Unit kAreaAngle{kDegrees, 2 / kArcSecondsPerDegree, "2 arc-seconds"};
-constexpr Unit kGridCentre{kDegrees, 0.5 / kArcSecondsPerDegree, "0.5 arc-seconds"};
-constexpr Unit kProjectionAngle{kDegrees, velta::kProjectionAngleResolution, "1.1e-8"};
-constexpr Unit kGridSpacing{"arc-seconds", 0.5, "0.5"};
-constexpr Unit kRotation{"arc-seconds", velta::kRotationResolution, "0.00002"};
-constexpr Unit kMeanAngle{"arc-seconds", velta::kMeanAngleResolution, "0.001"};
-constexpr Unit kResidualAngle{"arc-seconds", velta::kResidualAngleResolution, "0.00003"};
-constexpr Unit kScaleCorrection{"ppm", velta::kScaleResolution, "0.00001"};
-constexpr Unit kTranslation{"metres", velta::kTranslationResolution, "0.001"};
-constexpr Unit kSemiMajorAxis{"metres", velta::kAxisResolution, "0.001 from 6370000",
-                              velta::kSemiMajorAxisBase};
-constexpr Unit kSemiMinorAxis{"metres", velta::kAxisResolution, "0.001 from 6350000",
-                              velta::kSemiMinorAxisBase};
-constexpr Unit kPlaneGrid{"metres", velta::kPlaneGridResolution, "10"};
-constexpr Unit kMeanLength{"metres", velta::kMeanLengthResolution, "0.01"};
-constexpr Unit kResidualLength{"metres", velta::kResidualLengthResolution, "0.001"};
-constexpr Unit kProjectionLength{"metres", velta::kProjectionLengthResolution, "0.001"};
-constexpr Unit kScaleFactor{"factor", velta::kProjectionScaleResolution, "1e-11 from 0.993",
-                            velta::kProjectionScaleBase, velta::kPpm};
 
-/// The fields that are no codes, counts or days.
+/// How the numbers of a scaling are shown.
+struct Unit {
+  const velta::Scaling* scaling;
+  std::string_view name;
+  const char* step;      ///< of the field, for people
+  double perNumber = 1;  ///< from the unit of the description
+
+  double Shown(double integer) const { return scaling->toNumber(integer) * perNumber; }
+};
+constexpr Unit kUnits[] = {
+    {&velta::kAreaAngle, kDegrees, "2 arc-seconds", kDegreesPerRadian},
+    {&velta::kGridAngle, kDegrees, "0.5 arc-seconds", kDegreesPerRadian},
+    {&velta::kProjectionAngle, kDegrees, "1.1e-8"},
+    {&velta::kGridSpacing, "arc-seconds", "0.5", kArcSecondsPerRadian},
+    {&velta::kRotation, "arc-seconds", "0.00002"},
+    {&velta::kMeanAngle, "arc-seconds", "0.001", kArcSecondsPerRadian},
+    {&velta::kResidualAngle, "arc-seconds", "0.00003", kArcSecondsPerRadian},
+    {&velta::kScaleCorrection, "ppm", "0.00001"},
+    {&velta::kTranslation, "metres", "0.001"},
+    {&velta::kSemiMajorAxis, "metres", "0.001 from 6370000"},
+    {&velta::kSemiMinorAxis, "metres", "0.001 from 6350000"},
+    {&velta::kPlaneGridLength, "metres", "10"},
+    {&velta::kMeanLength, "metres", "0.01"},
+    {&velta::kResidualLength, "metres", "0.001"},
+    {&velta::kProjectionLength, "metres", "0.001"},
+    {&velta::kScaleFactor, "factor", "1e-11 from 0.993"},
+};
+
+/// A field that is no code, count or day.
 struct FieldUnit {
   std::string_view field;
-  const Unit& unit;
-};
-constexpr FieldUnit kFields[] = {
-    {"phiV", kAreaAngle},
-    {"lambdaV", kAreaAngle},
-    {"dPhiV", kAreaAngle},
-    {"dLambdaV", kAreaAngle},
-    {"phi0", kGridCentre},
-    {"lambda0", kGridCentre},
-    {"laNO", kProjectionAngle},
-    {"loNO", kProjectionAngle},
-    {"laFO", kProjectionAngle},
-    {"loFO", kProjectionAngle},
-    {"laSP1", kProjectionAngle},
-    {"laSP2", kProjectionAngle},
-    {"laPC", kProjectionAngle},
-    {"loPC", kProjectionAngle},
-    {"azIL", kProjectionAngle},
-    {"diffARSG", kProjectionAngle},
-    {"dPhi", kGridSpacing},
-    {"dLambda", kGridSpacing},
-    {"r1", kRotation},
-    {"r2", kRotation},
-    {"r3", kRotation},
-    {"meanDPhi", kMeanAngle},
-    {"meanDLambda", kMeanAngle},
-    {"residualPhi", kResidualAngle},
-    {"residualLambda", kResidualAngle},
-    {"dS", kScaleCorrection},
-    {"dX", kTranslation},
-    {"dY", kTranslation},
-    {"dZ", kTranslation},
-    {"xp", kTranslation},
-    {"yp", kTranslation},
-    {"zp", kTranslation},
-    {"addAs", kSemiMajorAxis},
-    {"addAt", kSemiMajorAxis},
-    {"addBs", kSemiMinorAxis},
-    {"addBt", kSemiMinorAxis},
-    {"north0", kPlaneGrid},
-    {"east0", kPlaneGrid},
-    {"dN", kPlaneGrid},
-    {"dE", kPlaneGrid},
-    {"meanDN", kMeanLength},
-    {"meanDE", kMeanLength},
-    {"meanDH", kMeanLength},
-    {"meanDh", kMeanLength},
-    {"residualN", kResidualLength},
-    {"residualE", kResidualLength},
-    {"residualH", kResidualLength},
-    {"fe", kProjectionLength},
-    {"fn", kProjectionLength},
-    {"efo", kProjectionLength},
-    {"nfo", kProjectionLength},
-    {"epc", kProjectionLength},
-    {"npc", kProjectionLength},
-    {"addSNO", kScaleFactor},
-    {"addSIL", kScaleFactor},
+  const Unit* unit;
 };
 
+/// Every scaled field once.
+std::vector<FieldUnit> ScaledFields() {
+  std::vector<FieldUnit> fields;
+  const auto add = [&fields](std::string_view field, auto, double, const auto& scaling) {
+    const auto isKnown = [&](const FieldUnit& known) { return known.field == field; };
+    if (std::any_of(fields.begin(), fields.end(), isKnown)) return;
+    const Unit* const unit = std::find_if(std::begin(kUnits), std::end(kUnits),
+                                          [&](const Unit& u) { return u.scaling == &scaling; });
+    if (unit != std::end(kUnits)) fields.push_back({field, unit});
+  };
+  const velta::DatumData datum;
+  const velta::Rtcm1022 datumMessage;
+  VisitValidityArea(datumMessage, datum, add);
+  VisitParameters(datumMessage, datum, add);
+  VisitRotationPoint(datumMessage, datum, add);
+  VisitEllipsoids(datumMessage, datum, add);
+  const auto addGrid = [&](const auto& message) {
+    VisitGridCentre(message, datum.grid, add);
+    VisitGridSpacing(message, datum.grid, add);
+    VisitResiduals(message, datum.grid, add);
+  };
+  addGrid(velta::Rtcm1023());
+  addGrid(velta::Rtcm1024());
+  const double parameters[orx::cs::projmath::TGeoProj::kMaxParameters] = {};
+  const velta::Rtcm1025 projection;
+  const velta::Rtcm1026 twoParallels;
+  const velta::Rtcm1027 oblique;
+  VisitProjection(projection, parameters, add);
+  VisitProjection(twoParallels, parameters, add);
+  VisitProjection(oblique, parameters, add);
+  add("diffARSG", oblique.diffARSG, 0, velta::kProjectionAngle);
+  return fields;
+}
+
 const Unit* UnitOf(std::string_view field) {
-  const auto* const found = std::find_if(std::begin(kFields), std::end(kFields),
-                                         [&](const auto& known) { return known.field == field; });
-  return found == std::end(kFields) ? nullptr : &found->unit;
+  static const std::vector<FieldUnit> fields = ScaledFields();
+  const auto found = std::find_if(fields.begin(), fields.end(),
+                                  [&](const auto& known) { return known.field == field; });
+  return found == fields.end() ? nullptr : found->unit;
 }
 
 /// The decimal number with the fewest digits that is the same to a hundredth of the step.
@@ -133,9 +113,9 @@ std::string DecimalText(double number, double step) {
 }
 
 std::string ValueText(const Unit& unit, std::int64_t integer, bool dms) {
-  const double value = (unit.base + static_cast<double>(integer) * unit.step) * unit.factor;
+  const double value = unit.Shown(static_cast<double>(integer));
   if (dms && unit.name == kDegrees) return nlohmann::json(DegreesMinutesSeconds(value)).dump();
-  return DecimalText(value, unit.step * unit.factor);
+  return DecimalText(value, unit.Shown(1) - unit.Shown(0));
 }
 
 /// Visits the fields of a message.
@@ -196,23 +176,21 @@ void AppendJsonLineInUnits(const rtcm3::Message& message, bool dms, std::string&
 
 std::string FieldsByUnit() {
   constexpr std::size_t kLine = 96;
+  const std::vector<FieldUnit> fields = ScaledFields();
   std::string text;
-  const Unit* last = nullptr;
-  std::size_t lineStart = 0;
-  for (const auto& [field, unit] : kFields) {
-    if (&unit != last) {
-      if (last) text += '\n';
-      lineStart = text.size();
-      text += "  " + std::string(unit.name) + ", steps of " + unit.stepText + ":";
-      last = &unit;
-    } else if (text.size() - lineStart + field.size() > kLine) {
-      text += "\n   ";
-      lineStart = text.size();
+  for (const Unit& unit : kUnits) {
+    std::string line = "  " + std::string(unit.name) + ", steps of " + unit.step + ":";
+    for (const FieldUnit& scaled : fields) {
+      if (scaled.unit != &unit) continue;
+      if (line.size() + scaled.field.size() > kLine) {
+        text += line + '\n';
+        line = "   ";
+      }
+      line.append(" ").append(scaled.field);
     }
-    text += ' ';
-    text += field;
+    text += line + '\n';
   }
-  return text + '\n';
+  return text;
 }
 
 }  // namespace velta_tool

@@ -12,11 +12,12 @@
 #include "command.h"
 #include "interrupt.h"
 #include "orxregistry/in_file_key.h"
-#include "orxregistry/registry_key.h"
 #include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
 #include "orxutils/path.h"
+#include "store/registry_tree.h"
 #include "terminal.h"
+#include "velta/file_names.h"
 
 namespace velta_tool {
 namespace fs = std::filesystem;
@@ -54,12 +55,6 @@ class InterruptibleBuffer : public std::streambuf {
   std::streambuf& source_;
   std::vector<char> memory_;
 };
-
-/// Reads everything that a key holds, as its tree does not before it is asked for.
-void LookInto(const orx::TGenericRegistryKey& key) {
-  key.HasValue(L"");
-  for (orx::TGenRegKeyIterator keys(key); keys;) LookInto(orx::TGenericRegistryKey(keys++));
-}
 
 bool IsInput(const std::string& input, const fs::path& path) {
   if (input == kStandardStream) return orx::FileFuncs::isSameFile(stdin, path);
@@ -103,8 +98,10 @@ FileKind KindOf(const std::string& file) {
   constexpr std::size_t kExtension = 4;
   const std::size_t length = std::min(file.size(), kExtension);
   const std::wstring extension = orx::Widen(file.substr(file.size() - length));
-  if (orx::EqualsIgnoringCase(extension, L".dff")) return FileKind::kDatum;
-  if (orx::EqualsIgnoringCase(extension, L".prj")) return FileKind::kProjection;
+  if (orx::EqualsIgnoringCase(extension, orx::cs::velta::kDatumFileExtension))
+    return FileKind::kDatum;
+  if (orx::EqualsIgnoringCase(extension, orx::cs::velta::kProjectionFileExtension))
+    return FileKind::kProjection;
   return FileKind::kOther;
 }
 
@@ -222,8 +219,8 @@ bool ReportErrorState(const std::string& file, std::uint32_t error) {
 }
 
 bool ReportErrorState(const std::string& file) {
-  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, 0);
-  LookInto(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)));
+  const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, orx::kRegistryFlags);
+  orx::cs::velta::LookInto(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)));
   return ReportErrorState(file, tree.GetErrorState());
 }
 

@@ -18,9 +18,9 @@
 #include <vector>
 
 #include "command.h"
+#include "conversion/datum_conversion.h"
 #include "entries.h"
 #include "files.h"
-#include "ingest/datum_conversion.h"
 #include "ingest_report.h"
 #include "interrupt.h"
 #include "orxutils/file_error.h"
@@ -30,6 +30,7 @@
 #include "rtcm3/message_sets.h"
 #include "stream_notes.h"
 #include "terminal.h"
+#include "velta/file_names.h"
 #include "velta/rtcm_data_support.h"
 
 namespace velta_tool {
@@ -55,8 +56,8 @@ std::unique_ptr<RTCMDataSupport> MakeSupport(const Options& options) {
   fs::path datums = ToPath(options.datumDir);
   fs::path projections = ToPath(options.projectionDir);
   if (!options.dir.empty()) {
-    datums = ToPath(options.dir) / "datums" / "rtcmdata";
-    projections = ToPath(options.dir) / "projections" / "rtcmdata";
+    datums = ToPath(options.dir) / fs::path(orx::cs::velta::kDatumFolder).relative_path();
+    projections = ToPath(options.dir) / fs::path(orx::cs::velta::kProjectionFolder).relative_path();
   }
   if (datums.empty()) return std::make_unique<RTCMDataSupport>();
   // The library wants the separator at the end.
@@ -223,7 +224,7 @@ class Ingestion {
         break;
       }
     }
-    text += Describe(set.result);
+    text += Meaning(set.result);
     if (IsOfTheFiles(set.result) && !reason.empty()) text += ": " + reason;
     Fail(text);
     return true;
@@ -273,7 +274,7 @@ class Ingestion {
   void NameUnsupported(std::uint32_t systemId) {
     if (!named_.insert({systemId, 1026}).second) return;
     Fail("system " + std::to_string(systemId) +
-         ": 1026: " + Describe(orx::cs::velta::kUnsupportedProjection));
+         ": 1026: " + Meaning(orx::cs::velta::kUnsupportedProjection));
   }
 
   /// Says, once for each system, that a message comes unannounced.
@@ -289,9 +290,11 @@ class Ingestion {
       const bool isThere = FindEntry(file, entry.name).has_value();
       places.push_back({file, std::move(entry), isThere});
     };
-    add(support_->GetDatumPath() + datumName + L".dff", ReceivedDatum(records));
+    add(support_->GetDatumPath() + datumName + orx::cs::velta::kDatumFileExtension,
+        ReceivedDatum(records));
     if (std::optional<ReceivedEntry> projection = ReceivedProjection(records)) {
-      add(support_->GetProjectionPath() + datumName + L".prj", *std::move(projection));
+      add(support_->GetProjectionPath() + datumName + orx::cs::velta::kProjectionFileExtension,
+          *std::move(projection));
     }
     return places;
   }

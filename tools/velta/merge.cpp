@@ -77,7 +77,7 @@ int Run(const Merge& merge) {
   }
   out.Flush();
   if (!isDone) {
-    ReportFailure(merge.source + " into " + merge.target + ": " + Describe(result) +
+    ReportFailure(merge.source + " into " + merge.target + ": " + Meaning(result) +
                   (reason.empty() ? "" : ": " + reason));
     return kFailed;
   }

@@ -25,6 +25,9 @@ enum RegistryError : std::uint32_t {
 /// The only registry version there is.
 inline constexpr unsigned kRegistryVersion = 512;
 
+/// What trees are made and opened with; no meaning here.
+inline constexpr unsigned kRegistryFlags = 97;
+
 /// Hears of a file whose lock another process holds, from a thread of its own.
 using AwaitedLock = std::function<void(const COrxStringT<wchar_t>& file)>;
 
@@ -61,7 +64,7 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
   /// \param description text that a new file carries; may be null
   /// \param stringLookup null
   /// \param openExisting true: load the file
-  /// \param flags 97; no meaning here
+  /// \param flags kRegistryFlags
   TInFileKey(const COrxStringT<wchar_t>& fileName, const wchar_t* description,
              const void* stringLookup, bool openExisting, unsigned flags);
   ~TInFileKey() override;

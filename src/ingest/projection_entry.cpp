@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
-#include "ingest/record_file.h"
-#include "records/comparison.h"
+#include "ingest/comparison.h"
+#include "ingest/entry_file.h"
 #include "store/gff_layout.h"
 #include "store/residual_grid.h"
 #include "velta/rtcm_data_support.h"
@@ -39,7 +39,7 @@ ResultCode RTCMDataSupport::InitProjectionGFF(ProjectionData& description) {
 ResultCode RTCMDataSupport::CreateNewPrjGFF(const COrxStringT<wchar_t>& path,
                                             ProjectionData& description) {
   const auto fillContainer = [&](TGenericRegistryKey& container) {
-    Add(container, layout::kProjectionFileName, description.rtcmProjName);
+    Add(container, layout::kContainerProjection, description.rtcmProjName);
     Add(container, layout::kSystemId, description.systemId);
     return kSuccess;
   };

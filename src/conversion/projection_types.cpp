@@ -1,4 +1,4 @@
-#include "records/projection_types.h"
+#include "conversion/projection_types.h"
 
 #include <algorithm>
 #include <iterator>

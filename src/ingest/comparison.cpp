@@ -1,4 +1,4 @@
-#include "records/comparison.h"
+#include "ingest/comparison.h"
 
 #include <cmath>
 #include <iterator>

@@ -4,8 +4,8 @@
 
 #include <vector>
 
-#include "ingest/datum_conversion.h"
-#include "ingest/grid_conversion.h"
+#include "conversion/datum_conversion.h"
+#include "conversion/grid_conversion.h"
 #include "store/residual_grid.h"
 
 namespace orx::cs::velta {

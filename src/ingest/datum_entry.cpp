@@ -1,7 +1,7 @@
 // Datum entries and the files they are kept in.
 
-#include "ingest/record_file.h"
-#include "records/comparison.h"
+#include "ingest/comparison.h"
+#include "ingest/entry_file.h"
 #include "store/gff_layout.h"
 #include "store/residual_grid.h"
 #include "velta/rtcm_data_support.h"
@@ -39,7 +39,7 @@ ResultCode RTCMDataSupport::InitDatumGFF(DatumData& description) {
 ResultCode RTCMDataSupport::CreateNewDatumGFF(const COrxStringT<wchar_t>& path,
                                               DatumData& description) {
   const auto fillContainer = [&](TGenericRegistryKey& container) {
-    Add(container, layout::kDatumFileName, description.targetDatumName);
+    Add(container, layout::kContainerDatum, description.targetDatumName);
     return kSuccess;
   };
   const auto fillEntry = [&](TGenericRegistryKey& entry) {

@@ -1,4 +1,4 @@
-#include "store/shared_file.h"
+#include "ingest/shared_file.h"
 
 namespace orx::cs::velta {
 namespace {
@@ -8,18 +8,18 @@ using GiveBackFunction = void(const wchar_t* path);
 
 }  // namespace
 
-ResultCode LoadSibling(const FileKind& kind) {
+ResultCode LoadSibling(const SharedFiles& kind) {
   if (!kind.loader) kind.loader = TDLLFuncLoader::LoadDLL(kSiblingLibrary);
   return kind.loader ? kind.loader->GetStatus() : kNoSiblingLibrary;
 }
 
-void UnloadSibling(const FileKind& kind) {
+void UnloadSibling(const SharedFiles& kind) {
   if (!kind.loader) return;
   kind.loader->ReleaseDLL();
   kind.loader.reset();
 }
 
-ResultCode Obtain(const FileKind& kind, const COrxStringT<wchar_t>& path, TCSInFileKey** file) {
+ResultCode Obtain(const SharedFiles& kind, const COrxStringT<wchar_t>& path, TCSInFileKey** file) {
   if (!kind.loader) {
     const ResultCode status = LoadSibling(kind);
     if (status != kSuccess) {
@@ -31,19 +31,16 @@ ResultCode Obtain(const FileKind& kind, const COrxStringT<wchar_t>& path, TCSInF
   return obtain ? obtain(path.c_str(), file) : kNoSiblingLibrary;
 }
 
-ResultCode ObtainTree(const FileKind& kind, const COrxStringT<wchar_t>& path, TCSInFileKey** file) {
+ResultCode ObtainTree(const SharedFiles& kind, const COrxStringT<wchar_t>& path,
+                      TCSInFileKey** file) {
   const ResultCode result = Obtain(kind, path, file);
   return result == kSuccess && !*file ? kind.trouble : result;
 }
 
-void GiveBack(const FileKind& kind, const COrxStringT<wchar_t>& path) {
+void GiveBack(const SharedFiles& kind, const COrxStringT<wchar_t>& path) {
   if (!kind.loader) return;
   auto* const giveBack = kind.loader->GetFunc<GiveBackFunction>(kind.giveBackFunction);
   if (giveBack) giveBack(path.c_str());
-}
-
-void ReadIfLost(TInFileKey& file) {
-  if (file.GetErrorState() == kCannotBeOpened) file.Reload();
 }
 
 }  // namespace orx::cs::velta

@@ -1,4 +1,4 @@
-#include "ingest/record_file.h"
+#include "ingest/entry_file.h"
 
 #include "orxutils/file_funcs.h"
 #include "store/registry_tree.h"
@@ -13,11 +13,11 @@ ResultCode EnsureFile(const COrxStringT<wchar_t>& directory, const COrxStringT<w
   return FileFuncs::isFileExists(path) ? kSuccess : create(path);
 }
 
-ResultCode CreateFileWithEntry(const FileKind& kind, const COrxStringT<wchar_t>& path,
+ResultCode CreateFileWithEntry(const SharedFiles& kind, const COrxStringT<wchar_t>& path,
                                const COrxStringT<wchar_t>& containerName,
                                const FillKey& fillContainer, const COrxStringT<wchar_t>& entryName,
                                const FillKey& fillEntry) {
-  TCSInFileKey tree(L"", kTreeDescription, nullptr, false, kTreeFlags);
+  TCSInFileKey tree(L"", kTreeDescription, nullptr, false, kRegistryFlags);
   if (tree.GetErrorState() != kRegistryOk) return kind.trouble;
   const TGenericRegistryKey root{TGenericRegistryKeyPtr(tree)};
   TGenericRegistryKey container(root, containerName, 0, true);
@@ -28,7 +28,7 @@ ResultCode CreateFileWithEntry(const FileKind& kind, const COrxStringT<wchar_t>&
   return result;
 }
 
-ResultCode OpenShared(const FileKind& kind, const COrxStringT<wchar_t>& path) {
+ResultCode OpenShared(const SharedFiles& kind, const COrxStringT<wchar_t>& path) {
   kind.current = nullptr;
   ResultCode result = ObtainTree(kind, path, &kind.current);
   if (result == kSuccess && kind.current->GetErrorState() != kRegistryOk) result = kind.trouble;
@@ -36,7 +36,8 @@ ResultCode OpenShared(const FileKind& kind, const COrxStringT<wchar_t>& path) {
   return result;
 }
 
-ResultCode AddEntry(const FileKind& kind, const COrxStringT<wchar_t>& name, const FillKey& fill) {
+ResultCode AddEntry(const SharedFiles& kind, const COrxStringT<wchar_t>& name,
+                    const FillKey& fill) {
   TCSInFileKey& file = *kind.current;
   ReadIfLost(file);
   const TGenericRegistryKey container = ContainerOf(file);

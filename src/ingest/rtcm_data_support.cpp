@@ -1,19 +1,18 @@
 #include "velta/rtcm_data_support.h"
 
-#include "store/shared_file.h"
+#include "ingest/shared_file.h"
 #include "userdirs/user_dirs.h"
+#include "velta/file_names.h"
 
 namespace orx::cs::velta {
 namespace {
 
-constexpr const wchar_t* kDatumFolder = L"/datums/rtcmdata/";
-constexpr const wchar_t* kProjectionFolder = L"/projections/rtcmdata/";
-
 constexpr const wchar_t* kRtcmGroup = L"RTCM";
 constexpr const wchar_t* kMeters = L"Meters";
 
-COrxStringT<wchar_t> GivenOr(const wchar_t* path, const wchar_t* folder) {
-  return path ? COrxStringT<wchar_t>(path) : GetUserGeoDir() + folder;
+/// \param given null for the folder of the user's geodetic directory
+COrxStringT<wchar_t> DirectoryOf(const wchar_t* given, const wchar_t* folder) {
+  return given ? COrxStringT<wchar_t>(given) : GetUserGeoDir() + folder;
 }
 
 }  // namespace
@@ -24,8 +23,8 @@ TCSInFileKey* RTCMDataSupport::GFFDatumFile = nullptr;
 TCSInFileKey* RTCMDataSupport::GFFProjectionFile = nullptr;
 
 RTCMDataSupport::RTCMDataSupport(const wchar_t* datumDirectory, const wchar_t* projectionDirectory)
-    : datumPath(GivenOr(datumDirectory, kDatumFolder)),
-      projectionPath(GivenOr(projectionDirectory, kProjectionFolder)) {
+    : datumPath(DirectoryOf(datumDirectory, kDatumFolder)),
+      projectionPath(DirectoryOf(projectionDirectory, kProjectionFolder)) {
   // Without the sibling library now, the first message tries again and reports it.
   GetDatumTransformationDLL();
   GetPrjTransformationDLL();

@@ -7,7 +7,7 @@
 #include "velta/projection_data.h"
 #include "velta/rtcm_messages.h"
 
-/// From the fields of a projection message to a projection in degrees and metres.
+/// Between the fields of a projection message and a projection in degrees and metres.
 namespace orx::cs::velta {
 
 /// Makes the projection object of a type and sets `prjType` where the type has a type string.
@@ -20,6 +20,11 @@ std::unique_ptr<projmath::TGeoProj> CreateProjection(ProjectionData& projection,
 /// The parameters by index: degrees, metres, plain ratios.
 std::vector<double> ParametersOf(const Rtcm1025& message);
 std::vector<double> ParametersOf(const Rtcm1027& message);
+
+/// Sets the fields of a message from all parameters by index, toward zero.
+/// \param message has its type, or its rectification flag
+void SetParameters(const double (&parameters)[16], Rtcm1025& message);
+void SetParameters(const double (&parameters)[16], Rtcm1027& message);
 
 /// The name of a projection's entry: one for each origin and plane grid.
 /// \param grid null when there is none
