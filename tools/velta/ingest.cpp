@@ -12,7 +12,6 @@
 #include <optional>
 #include <set>
 #include <string>
-#include <system_error>
 #include <tuple>
 #include <utility>
 #include <vector>
@@ -242,7 +241,7 @@ class Ingestion {
   void NameSharedFile(const std::vector<Place>& places, const std::string& receivedName) {
     if (places.empty()) return;
     const std::wstring& file = places.front().file;
-    std::set<std::string>& known = NamesReceivedFor(file);
+    std::set<std::string>& known = receivedNames_[file];
     if (!known.insert(receivedName).second || known.size() == 1) return;
     const auto quoted = [](const std::string& name) {
       return '"' + Printable(orx::ToUtf8(orx::Widen(name))) + '"';
@@ -253,21 +252,6 @@ class Ingestion {
     }
     ReportNote(names + " have one file, as it is named without signs and repeated characters: " +
                orx::ToUtf8(file));
-  }
-
-  /// The names of the datums that went into a file; on Windows names that differ in case are one
-  /// file.
-  std::set<std::string>& NamesReceivedFor(const std::wstring& file) {
-    const auto known = receivedNames_.find(file);
-    if (known != receivedNames_.end()) return known->second;
-    const auto path = [](const std::wstring& name) {
-      return orx::ToSystemPath(ToPath(orx::ToUtf8(name)));
-    };
-    for (auto& [other, names] : receivedNames_) {
-      std::error_code ignored;
-      if (std::filesystem::equivalent(path(other), path(file), ignored)) return names;
-    }
-    return receivedNames_[file];
   }
 
   /// Says, once for each system, that a 1026 is not taken.
@@ -372,7 +356,7 @@ class Ingestion {
   std::uint64_t repeatsBefore_ = 0;  ///< in front of the message in hand
   /// What files have otherwise than received, by file and entry.
   std::map<std::pair<std::wstring, std::wstring>, std::vector<std::string>> toldDifferences_;
-  std::map<std::wstring, std::set<std::string>> receivedNames_;  ///< by file
+  std::map<std::wstring, std::set<std::string>, orx::NameOrder> receivedNames_;  ///< by file
   bool isWayNamed_ = false;
   std::map<DatumArea, rtcm3::Message> datums_;          ///< as they came last
   std::map<std::uint32_t, ResultCode> results_;         ///< of each system's last set

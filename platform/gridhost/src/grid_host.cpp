@@ -9,15 +9,9 @@
 #include <string>
 #include <string_view>
 
+#include "export.h"
 #include "orxregistry/in_file_key.h"
 #include "orxutils/path.h"
-
-#ifdef _WIN32
-#include <windows.h>
-#define GRIDHOST_EXPORT extern "C" __declspec(dllexport)
-#else
-#define GRIDHOST_EXPORT extern "C" __attribute__((visibility("default")))
-#endif
 
 namespace {
 
@@ -28,28 +22,16 @@ constexpr std::int32_t kNoFile = static_cast<std::int32_t>(0x80070002);
 /// A shared file. It stays at its place in memory, whatever is read anew, as callers hold its lock.
 class SharedFile : public orx::TCSInFileKey {
  public:
-  explicit SharedFile(const std::wstring& name) : TCSInFileKey(name, nullptr, nullptr, true, 0) {}
+  explicit SharedFile(const std::wstring& name)
+      : TCSInFileKey(name, nullptr, nullptr, true, orx::kRegistryFlags) {}
 
   int users = 0;  ///< who obtained the file and have not given it back; guarded by the table's lock
 
   /// Reads the file again when the tree is not what the file holds.
-  /// \param inUse somebody else works on the tree: unsaved changes are theirs
+  /// \param inUse somebody works on the tree, whose unsaved changes stay
   void Refresh(bool inUse) {
     const bool unsaved = HasUnsavedChanges();
     if (unsaved ? !inUse : HasFileChanged()) Reload();
-  }
-};
-
-/// The order of file names, which are the same in either case of their letters on Windows.
-struct NameOrder {
-  using is_transparent = void;
-  bool operator()(std::wstring_view a, std::wstring_view b) const {
-#ifdef _WIN32
-    return CompareStringOrdinal(a.data(), static_cast<int>(a.size()), b.data(),
-                                static_cast<int>(b.size()), TRUE) == CSTR_LESS_THAN;
-#else
-    return a < b;
-#endif
   }
 };
 
@@ -102,9 +84,9 @@ class SharedFiles {
   }
 
   std::mutex mutex_;
-  std::map<std::wstring, std::unique_ptr<SharedFile>, NameOrder> files_;  ///< by whole names
+  std::map<std::wstring, std::unique_ptr<SharedFile>, orx::NameOrder> files_;  ///< by whole names
   /// The files in use by the names that they were asked for.
-  std::map<std::wstring, SharedFile*, NameOrder> names_;
+  std::map<std::wstring, SharedFile*, orx::NameOrder> names_;
 };
 
 SharedFiles& Files() {

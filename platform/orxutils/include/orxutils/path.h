@@ -2,6 +2,7 @@
 
 #include <filesystem>
 #include <optional>
+#include <string_view>
 
 #include "orxutils/export.h"
 #include "orxutils/orx_string.h"
@@ -23,5 +24,13 @@ ORXUTILS_EXPORT COrxStringT<wchar_t> ToWholeName(const COrxStringT<wchar_t>& nam
 
 /// A path as a wide file name. Bytes that are no UTF-8 are left out.
 ORXUTILS_EXPORT COrxStringT<wchar_t> ToName(const std::filesystem::path& path);
+
+/// The order of file names: by their characters, and on Windows ignoring case, as names that differ
+/// in case are one file there.
+struct ORXUTILS_EXPORT NameOrder {
+  using is_transparent = void;  ///< views are looked up, too
+  /// True when `a` comes first.
+  bool operator()(std::wstring_view a, std::wstring_view b) const;
+};
 
 }  // namespace orx
