@@ -56,7 +56,8 @@ class RoundTripTest : public RtcmTest {
       projection.diffARSG = 0;
     }
     const Numbers sent = numbersOfSet();
-    Numbers before, now = sent;
+    Numbers before;
+    Numbers now = sent;
     for (int tour = 0; tour < 500 && now != before; ++tour) {
       Travel(datum, projection, parts);
       before = std::exchange(now, numbersOfSet());

@@ -147,14 +147,17 @@ TEST_F(StoredValueTest, GridsOfAnyShapeAreSafe) {
 }
 
 TEST_F(StoredValueTest, EveryNumberIsTruncatedIntoItsField) {
-  const Json datum = datum_, projection = projection_;
+  const Json datum = datum_;
+  const Json projection = projection_;
   const Json tests = Json::parse(ReadBytes(STORED_NUMBERS));
   for (const Json& test : tests) {
     datum_ = datum;
     projection_ = projection;
-    DatumEntry().merge_patch(test["stored"]), ProjectionEntry().merge_patch(test["stored"]);
+    DatumEntry().merge_patch(test["stored"]);
+    ProjectionEntry().merge_patch(test["stored"]);
     const RTCMGenerator generator = Written();
-    const double first = test["at"][0], second = test["at"][1];
+    const double first = test["at"][0];
+    const double second = test["at"][1];
     const std::string query = test["query"];
     Json made = ToJson(generator.getRtcmProjMessage().get());
     if (query == "datum") made = ToJson(generator.getRtcmDatumMessage(first, second, 0).get());

@@ -61,7 +61,8 @@ TEST_F(MessageTest, FirstOfEachKindMakesAFileWithItsEntry) {
   m1023_.horInterpolationMethod = 0x1FE;
   m1023_.vertInterpolationMethod = 3;
   // The 1021 has no rotation point and keeps that of the 1022.
-  EXPECT_EQ(Ingest(kLocalSet) + Ingest(kDhdnSet), kSuccess);
+  EXPECT_EQ(Ingest(kLocalSet), kSuccess);
+  EXPECT_EQ(Ingest(kDhdnSet), kSuccess);
   const Json files = Json::parse(ReadBytes(FIRST_ENTRIES));
   for (const auto& [file, content] : files.items()) {
     EXPECT_EQ(ReadGff(directory_ / "new" / file), content) << file;
@@ -97,11 +98,13 @@ TEST_F(MessageTest, NamesAreCleanedAndKeptWhole) {
 
 TEST_F(MessageTest, WithoutAGridADatumKeepsTheObjectsAndAProjectionHasNone) {
   m1021_.utilizedMsgIndicator = 0xFE;
-  EXPECT_EQ(Ingest(k1021) + Ingest(kDhdnSet), kSuccess);
+  EXPECT_EQ(Ingest(k1021), kSuccess);
+  EXPECT_EQ(Ingest(kDhdnSet), kSuccess);
   m1021_.phiV = -5;
   m1025_.systemId = 99;
   EXPECT_EQ(Ingest(k1021 | k1025), kSuccess);
-  Json datum = ReadGff(DatumFile())[kDhdn], projection = ReadGff(ProjectionFile())[kDhdn];
+  Json datum = ReadGff(DatumFile())[kDhdn];
+  Json projection = ReadGff(ProjectionFile())[kDhdn];
   const Json none = {0.0, 0.0, 0.0};
   EXPECT_EQ(datum["S_91984_18653"]["TargetDatum"]["dMeanValue"][kContent], none);
   EXPECT_EQ(datum["S_-5_18653"]["TargetDatum"],

@@ -65,7 +65,9 @@ TEST(RegistryDamage, AtAnyPlaceIsDamageOrASaveThatNeverFinished) {
     TCSInFileKey tree = file.Load();
     EXPECT_EQ(tree.GetErrorState() != orx::kRegistryOk, isDamaged);
     const std::string seen = Describe(tree);
-    EXPECT_TRUE(seen == before || (isDamaged && seen == "(0)")) << seen;
+    if (!isDamaged || seen != "(0)") {
+      EXPECT_EQ(seen, before);
+    }
     RegistryFile::AddEntry(tree, L"S_9", "next");
     EXPECT_EQ(tree.Save(false, 512), !isDamaged);
     EXPECT_EQ(file.Bytes() == bytes, isDamaged);
@@ -103,7 +105,9 @@ TEST(RegistryRecords, ThatLieAreDamage) {
     const TCSInFileKey tree = file.Load();
     const std::string seen = Describe(tree);
     EXPECT_EQ(tree.GetErrorState(), orx::kDamaged) << what;
-    EXPECT_TRUE(seen == "(0)" || seen.starts_with("(0 a=1:1:xy")) << what << seen;
+    if (seen != "(0)") {
+      EXPECT_TRUE(seen.starts_with("(0 a=1:1:xy")) << what << seen;
+    }
   }
 }
 
@@ -160,13 +164,16 @@ TEST(RegistryKey, OutlivesItsTreeAndFindsManySubKeysInTheirOrder) {
 TEST(RegistryFile, TwoWritersLoseNothingWhileItIsWrittenAfreshNowAndThen) {
   const RegistryFile file;
   file.Create();
-  TCSInFileKey one = file.Load(), other = file.Load();
+  TCSInFileKey one = file.Load();
+  TCSInFileKey other = file.Load();
   std::string entries;
   for (const char letter : "abcdefghijklmnopqrst"sv) {
-    const std::string name(1, letter), replacing(1000, letter);
+    const std::string name(1, letter);
+    const std::string replacing(1000, letter);
     RegistryFile::AddEntry(one, orx::Widen(name), "1");
     RegistryFile::AddEntry(other, L"S_0", replacing);
-    ASSERT_TRUE(one.Save(false, 512) && other.Save(false, 512));
+    ASSERT_TRUE(one.Save(false, 512));
+    ASSERT_TRUE(other.Save(false, 512));
     entries += " " + name + "(0 value=1:1:1)";
     EXPECT_EQ(Describe(file.Load()),
               "(0 container(0 S_0(0 value=1:1:" + replacing + ")" + entries + "))");

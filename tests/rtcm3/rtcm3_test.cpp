@@ -165,7 +165,8 @@ std::string ErrorOf(const std::string& line) {
 }
 
 TEST_P(Codec, EveryFieldTravelsFromEndToEndOfItsRange) {
-  const std::regex fields(R"re("(\w+)": \[?(-?\d+))re"), ends("must be .* from (-?\\d+) to (\\d+)");
+  const std::regex fields(R"re("(\w+)": \[?(-?\d+))re");
+  const std::regex ends("must be .* from (-?\\d+) to (\\d+)");
   for (std::sregex_iterator field(json.begin(), json.end(), fields), none; field != none; ++field) {
     if (field->str(1) == "message") continue;
     const std::string before(json.begin(), (*field)[2].first);

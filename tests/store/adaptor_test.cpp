@@ -22,23 +22,30 @@ void ExpectKind(std::uint32_t type, std::uint32_t size) {
   const ValueDescriptor others[] = {{type, size + 1, 1}, {type == 2 ? 3U : 2U, size, 1}, {5, 0, 1}};
   TBinValue<T> value;
   for (const ValueDescriptor& other : others) {
-    EXPECT_TRUE(!value.GetData());
-    EXPECT_TRUE(value.GetType() + value.GetSize() + value.GetByteSize() == 0);
+    EXPECT_FALSE(value.GetData());
+    EXPECT_EQ(value.GetType(), 0U);
+    EXPECT_EQ(value.GetSize(), 0U);
+    EXPECT_EQ(value.GetByteSize(), 0U);
     EXPECT_EQ(value.SetFromDescriptor({type, size, 1}, ones.data(), false), kSuccess);
-    EXPECT_TRUE(value.GetType() == type);
-    EXPECT_TRUE(value.GetSize() == size);
-    EXPECT_TRUE(Held(value) == ones);
+    EXPECT_EQ(value.GetType(), type);
+    EXPECT_EQ(value.GetSize(), size);
+    EXPECT_EQ(Held(value), ones);
     EXPECT_EQ(value.SetFromDescriptor(other, ones.data(), true), kValueRefused);
   }
-  EXPECT_TRUE(value.SetData(type, nullptr, size, true) && Held(value) == ones);  // the old value
-  EXPECT_TRUE(value.SetData(0, nullptr, 0, true) && !value.GetData());
-  EXPECT_TRUE(value.Assign(TBinValue<T>(T())) == 0);
-  EXPECT_TRUE(Held(value) == std::string(size, '\0'));
+  EXPECT_TRUE(value.SetData(type, nullptr, size, true));
+  EXPECT_EQ(Held(value), ones) << "the old value";
+  EXPECT_TRUE(value.SetData(0, nullptr, 0, true));
+  EXPECT_FALSE(value.GetData());
+  EXPECT_EQ(value.Assign(TBinValue<T>(T())), kSuccess);
+  EXPECT_EQ(Held(value), std::string(size, '\0'));
 }
 
 TEST(TypedValue, TakesItsKindAndRefusesOthers) {
-  ExpectKind<signed char>(2, 1), ExpectKind<unsigned short>(3, 2), ExpectKind<int>(2, 4);
-  ExpectKind<unsigned int>(3, 4), ExpectKind<bool>(3, 1);
+  ExpectKind<signed char>(2, 1);
+  ExpectKind<unsigned short>(3, 2);
+  ExpectKind<int>(2, 4);
+  ExpectKind<unsigned int>(3, 4);
+  ExpectKind<bool>(3, 1);
   ExpectKind<BinaryType<unsigned int>>(1, 4);
   TBinValue<bool> flag(false);
   EXPECT_TRUE(flag.SetData(3, "\x80", 1, false));
@@ -51,14 +58,14 @@ TEST(StringValue, HoldsTextAsItIsStored) {
   const std::string odd = "?" + Held(value);
   TBinValue<std::wstring> read;
   EXPECT_TRUE(read.SetData(5, odd.data() + 1, 0, false));
-  EXPECT_TRUE(Held(read) == Held(value));
+  EXPECT_EQ(Held(read), Held(value));
   const void* const own = static_cast<const char16_t*>(read.GetData()) + 1;
   EXPECT_TRUE(read.SetData(5, own, 0, false));
   EXPECT_TRUE(read.GetTypedValue() == L"\u00e9\U0001F30D");
   EXPECT_TRUE(read.SetData(5, nullptr, 0, false));
-  EXPECT_TRUE(Held(read) == std::string(2, '\0'));
-  EXPECT_TRUE(read.Assign(value) == kSuccess);
-  EXPECT_TRUE(Held(read) == Held(value));
+  EXPECT_EQ(Held(read), std::string(2, '\0'));
+  EXPECT_EQ(read.Assign(value), kSuccess);
+  EXPECT_EQ(Held(read), Held(value));
   EXPECT_FALSE(read.SetData(5, u"A", 2, true));
   EXPECT_FALSE(read.SetData(1, u"A", 0, true));
 }
@@ -71,14 +78,16 @@ TEST(BlockValue, IsHeldWhereItsSizeAndTheCopyFlagSay) {
     TSimpleBinValue value;
     EXPECT_TRUE(value.SetData(1, kBytes, size, copy));
     EXPECT_TRUE(value.valid());
-    EXPECT_TRUE(value.storage() == storage && Held(value) == std::string(kBytes, size)) << size;
+    EXPECT_EQ(value.storage(), storage) << size;
+    EXPECT_EQ(Held(value), std::string(kBytes, size));
     EXPECT_EQ(value.GetData() == kBytes, storage == Storage::kBorrowed);
     EXPECT_TRUE(value.SetData(3, nullptr, 7, copy));
-    EXPECT_TRUE(!value.valid());
-    EXPECT_TRUE(!value.GetData());
-    EXPECT_EQ(value.GetType() * 10 + value.GetSize(), 37U);
+    EXPECT_FALSE(value.valid());
+    EXPECT_FALSE(value.GetData());
+    EXPECT_EQ(value.GetType(), 3U);
+    EXPECT_EQ(value.GetSize(), 7U);
     EXPECT_TRUE(value.SetData(5, u"abc", 0, copy));
-    EXPECT_TRUE(Held(value) == std::string("a\0b\0c\0\0", 8));
+    EXPECT_EQ(Held(value), std::string("a\0b\0c\0\0", 8));
   }
 }
 
@@ -90,7 +99,7 @@ TEST(BlockValue, SharesABlockAndCanBeSetFromItsOwnBytes) {
     EXPECT_EQ(sharer.GetData(), value.GetData());
     EXPECT_EQ(sharer.Assign(TSimpleBinValue(1, kBytes, 9)), kSuccess);
     EXPECT_TRUE(sharer.storage() == Storage::kShared);
-    EXPECT_TRUE(Held(sharer) == "012345678");
+    EXPECT_EQ(Held(sharer), "012345678");
     std::string expected = kBytes;
     for (const auto& [from, size] : {std::pair{2U, 12U}, {1U, 6U}, {2U, 3U}}) {
       value.SetData(1, static_cast<const char*>(value.GetData()) + from, size, copy);

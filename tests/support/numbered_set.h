@@ -12,22 +12,33 @@ namespace velta_test {
 /// of validity of its own.
 struct NumberedSet {
   explicit NumberedSet(std::uint32_t number, const std::string& datumName = "ROVERS") {
-    constexpr std::int32_t kCellsInARow = 1000, kHalvesInTwo = 4;
-    constexpr std::int32_t kCell = 90, kSouth = 300'000, kWest = 36'000;  // half arc-seconds
+    constexpr std::int32_t kCellsInARow = 1000;
+    constexpr std::int32_t kHalvesInTwo = 4;
+    // Half arc-seconds.
+    constexpr std::int32_t kCell = 90;
+    constexpr std::int32_t kSouth = 300'000;
+    constexpr std::int32_t kWest = 36'000;
     const auto cell = static_cast<std::int32_t>(number);
     grid.phi0 = kSouth + cell / kCellsInARow * kCell;
     grid.lambda0 = kWest + cell % kCellsInARow * kCell;
-    grid.dPhi = grid.dLambda = 30, grid.horShiftIndicator = true;
+    grid.dPhi = grid.dLambda = 30;
+    grid.horShiftIndicator = true;
     for (int i = 0; i < orx::cs::velta::kResidualGridPoints; ++i) {
       grid.residualPhi[i] = i * 3 - cell % 7;
       grid.residualLambda[i] = i * 5 - cell % 11;
       grid.residualH[i] = i - cell % 13;
     }
-    datum.messageType = 21, datum.utilizedMsgIndicator = datum.computationIndicator = 1;
-    datum.sourceName = "ETRF89_ETRF89", datum.targetName = datumName;
-    datum.phiV = grid.phi0 / kHalvesInTwo, datum.lambdaV = grid.lambda0 / kHalvesInTwo;
-    datum.dPhiV = datum.dLambdaV = 22, datum.dX = -584957;
-    datum.addAs = datum.addAt = 8137000, datum.addBs = datum.addBt = 6752314;
+    datum.messageType = 21;
+    datum.utilizedMsgIndicator = 1;
+    datum.computationIndicator = 1;
+    datum.sourceName = "ETRF89_ETRF89";
+    datum.targetName = datumName;
+    datum.phiV = grid.phi0 / kHalvesInTwo;
+    datum.lambdaV = grid.lambda0 / kHalvesInTwo;
+    datum.dPhiV = datum.dLambdaV = 22;
+    datum.dX = -584957;
+    datum.addAs = datum.addAt = 8137000;
+    datum.addBs = datum.addBt = 6752314;
   }
 
   /// Name of the entry that the set becomes.
