@@ -15,8 +15,11 @@ void Put(Json& value, const std::vector<double>& content) {
 }
 
 // Within the areas of the DHDN set.
-constexpr double kLatitude = 374415 * kHalfSecond, kLongitude = 64815 * kHalfSecond;
-constexpr const char* kAll = "LD34P";
+constexpr double kLatitude = 374415 * kHalfSecond;
+constexpr double kLongitude = 64815 * kHalfSecond;
+constexpr const char* kAll = "list datum 1023 1024 projection";
+constexpr const char* kNoGrid = "list datum projection";
+constexpr const char* kNoGridNorList = "datum projection";
 
 /// The DHDN set's files, to be changed and asked about.
 class StoredValueTest : public RtcmTest {
@@ -35,17 +38,19 @@ class StoredValueTest : public RtcmTest {
     WriteGff(ProjectionFile(), projection_);
     return Generator();
   }
-  /// A letter for each query that finds something: the list of datums, a datum message, a 1023, a
-  /// 1024, a projection message.
+  /// The queries that find something.
   std::string Found() {
     const RTCMGenerator generator = Written();
     const std::string before = ReadBytes(DatumFile()) + ReadBytes(ProjectionFile());
     std::string found;
-    if (!generator.getAllDatums().empty()) found += "L";
-    if (generator.getRtcmDatumMessage(kLatitude, kLongitude, 0)) found += "D";
-    if (generator.get1023(kLatitude, kLongitude, 0)) found += "3";
-    if (generator.get1024(-5150000, 500000, 0)) found += "4";
-    if (generator.getRtcmProjMessage()) found += "P";
+    const auto add = [&found](const char* query) {
+      found += (found.empty() ? "" : " ") + std::string(query);
+    };
+    if (!generator.getAllDatums().empty()) add("list");
+    if (generator.getRtcmDatumMessage(kLatitude, kLongitude, 0)) add("datum");
+    if (generator.get1023(kLatitude, kLongitude, 0)) add("1023");
+    if (generator.get1024(-5150000, 500000, 0)) add("1024");
+    if (generator.getRtcmProjMessage()) add("projection");
     EXPECT_EQ(ReadBytes(DatumFile()) + ReadBytes(ProjectionFile()), before);
     const std::filesystem::recursive_directory_iterator entries(directory_.path());
     EXPECT_EQ(std::distance(begin(entries), end(entries)), 5);  // two files, three directories
@@ -60,11 +65,11 @@ TEST_F(StoredValueTest, EveryValueIsCheckedAsItsQueryDoes) {
   const Json checks = Json::parse(ReadBytes(STORED_CHECKS));
   // A key and what is found when something in it is wrong. A datum without its grid is not listed.
   const std::tuple<Json&, std::string, std::string> keys[] = {
-      {DatumEntry(), "StandardDatum", "34P"},
-      {DatumEntry(), "TargetDatum", "D4P"},
-      {ProjectionEntry(), "StandardPrj", "LD34"},
-      {ProjectionEntry(), "TableProj", "LD3P"},
-      {datum_, kDhdn, "34P"}};
+      {DatumEntry(), "StandardDatum", "1023 1024 projection"},
+      {DatumEntry(), "TargetDatum", "datum 1024 projection"},
+      {ProjectionEntry(), "StandardPrj", "list datum 1023 1024"},
+      {ProjectionEntry(), "TableProj", "list datum 1023 projection"},
+      {datum_, kDhdn, "1023 1024 projection"}};
   for (const auto& [parent, key, found] : keys) {
     const Json whole = parent[key];
     for (const auto& [name, matters] : checks[key].items()) {
@@ -81,7 +86,7 @@ TEST_F(StoredValueTest, EveryValueIsCheckedAsItsQueryDoes) {
       }
     }
     parent.erase(key);
-    EXPECT_EQ(Found(), key == kDhdn ? "4P" : found) << key;
+    EXPECT_EQ(Found(), key == kDhdn ? "1024 projection" : found) << key;
     parent[key] = whole;
   }
 }
@@ -107,7 +112,7 @@ TEST_F(StoredValueTest, FirstEntryWinsAndAMalformedOneInFrontEndsTheSearchesButN
   Json& standard = DatumEntry()["StandardDatum"];
   Json &grid = DatumEntry()["TargetDatum"], &table = ProjectionEntry()["TableProj"];
   standard.erase("Ellipsoid"), grid.erase("dHData"), table.erase("dHData");
-  EXPECT_EQ(Found(), "LP");
+  EXPECT_EQ(Found(), "list projection");
   EXPECT_EQ(Generator().getAllDatums().size(), 1U);
   // Of an entry that is far away no more is looked at.
   Put(standard["BoundariesStandardDatum"], {-1.0, 0.1, -1.0, 0.1});
@@ -116,7 +121,7 @@ TEST_F(StoredValueTest, FirstEntryWinsAndAMalformedOneInFrontEndsTheSearchesButN
   EXPECT_EQ(Found(), kAll);
   standard.erase("BoundariesStandardDatum"), grid.erase("NRowsT"), table.erase("NColsT");
   ProjectionEntry().erase("StandardPrj");
-  EXPECT_EQ(Found(), "L");
+  EXPECT_EQ(Found(), "list");
   // Behind the one looked for it does no harm.
   std::swap(DatumEntry(), datum_.back()["S_1"]);
   std::swap(ProjectionEntry(), projection_.back()["S_1"]);
@@ -124,10 +129,21 @@ TEST_F(StoredValueTest, FirstEntryWinsAndAMalformedOneInFrontEndsTheSearchesButN
 }
 
 TEST_F(StoredValueTest, GridsOfAnyShapeAreSafe) {
-  const std::tuple<int, int, const char*> cases[] = {
-      {4, 4, kAll},   {2, 2, kAll},   {2, 8, kAll},         {1, 1, "LDP"},         {1, 4, "LDP"},
-      {16, 1, "LDP"}, {5, 5, "DP"},   {17, 1, "DP"},        {0, 0, "DP"},          {0, 4, "DP"},
-      {4, 0, "DP"},   {-4, -4, "DP"}, {65536, 65536, "DP"}, {INT32_MIN, -1, "DP"}, {-1, 1, "DP"}};
+  const std::tuple<int, int, const char*> cases[] = {{4, 4, kAll},
+                                                     {2, 2, kAll},
+                                                     {2, 8, kAll},
+                                                     {1, 1, kNoGrid},
+                                                     {1, 4, kNoGrid},
+                                                     {16, 1, kNoGrid},
+                                                     {5, 5, kNoGridNorList},
+                                                     {17, 1, kNoGridNorList},
+                                                     {0, 0, kNoGridNorList},
+                                                     {0, 4, kNoGridNorList},
+                                                     {4, 0, kNoGridNorList},
+                                                     {-4, -4, kNoGridNorList},
+                                                     {65536, 65536, kNoGridNorList},
+                                                     {INT32_MIN, -1, kNoGridNorList},
+                                                     {-1, 1, kNoGridNorList}};
   for (const auto& [rows, columns, found] : cases) {
     for (Json* const key : {&DatumEntry()["TargetDatum"], &ProjectionEntry()["TableProj"]}) {
       (*key)["NRowsT"][kContent] = {rows}, (*key)["NColsT"][kContent] = {columns};

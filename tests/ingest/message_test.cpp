@@ -12,7 +12,8 @@ using MessageTest = RtcmTest;
 
 TEST_F(MessageSetTest, IsCheckedAndTakenInOrder) {
   EXPECT_EQ(support_.GetUtilizedMessageInfo(m1021_).systemId, 23);
-  Rtcm1021 bad, nameless = m1021_;
+  Rtcm1021 bad;
+  Rtcm1021 nameless = m1021_;
   bad.computationIndicator = 4;
   nameless.utilizedMsgIndicator = 0;
   nameless.targetName.clear();
@@ -22,33 +23,62 @@ TEST_F(MessageSetTest, IsCheckedAndTakenInOrder) {
   // The result, the datum and projection files of the DHDN and of the other datum that are there
   // then, and what is other than in a set of a 1021, its 1023 and its 1025.
   const std::tuple<ResultCode, const char*, std::function<void(All&)>> cases[] = {
-      {kNoDatumMessage, "....", [](All& m) { m.msg1021 = nullptr; }},
-      {kMissing1023, "....", [&](All& m) { m.msg1021 = &nameless, m.msg1023 = nullptr; }},
-      {kNoDatumName, "....", [&](All& m) { m.msg1021 = &nameless; }},
-      {kSuccess, "d...", [](All& m) { m.info.use1025 = false; }},
-      {kMissingProjectionPart, "d...", [](All& m) { m.msg1025 = nullptr; }},
-      {kMissingProjectionPart, "d...", [](All& m) { m.info.use1024 = true, m.msg1024 = nullptr; }},
-      {kSuccess, "d...",
+      {kNoDatumMessage, "", [](All& m) { m.msg1021 = nullptr; }},
+      {kMissing1023, "",
+       [&](All& m) {
+         m.msg1021 = &nameless;
+         m.msg1023 = nullptr;
+       }},
+      {kNoDatumName, "", [&](All& m) { m.msg1021 = &nameless; }},
+      {kSuccess, "datum", [](All& m) { m.info.use1025 = false; }},
+      {kMissingProjectionPart, "datum", [](All& m) { m.msg1025 = nullptr; }},
+      {kMissingProjectionPart, "datum",
+       [](All& m) {
+         m.info.use1024 = true;
+         m.msg1024 = nullptr;
+       }},
+      {kSuccess, "datum",
        [](All& m) {
          m.info = {true, true};
          m.msg1024 = nullptr;
        }},
-      {kMissingProjectionPart, "d...", [](All& m) { m.info.use1027 = true, m.msg1027 = nullptr; }},
-      {kSuccess, "dp..", [&](All& m) { m.info.use1026 = true, m.msg1026 = &ignored; }},
-      {kBadComputationIndicator, "....", [&](All& m) { m.msg1021 = &bad; }},
-      {kSuccess, "..dp", [&](All& m) { m.msg1021 = &bad, m.msg1022 = &m1022_; }},
-      {kUnsupportedProjection, "d...", [&](All& m) { m.msg1025 = &unsupported; }},
-      {kSuccess, "dp..", [&](All& m) { m.msg1025 = &unsupported, m.info.use1027 = true; }},
+      {kMissingProjectionPart, "datum",
+       [](All& m) {
+         m.info.use1027 = true;
+         m.msg1027 = nullptr;
+       }},
+      {kSuccess, "datum, projection",
+       [&](All& m) {
+         m.info.use1026 = true;
+         m.msg1026 = &ignored;
+       }},
+      {kBadComputationIndicator, "", [&](All& m) { m.msg1021 = &bad; }},
+      {kSuccess, "other datum, other projection",
+       [&](All& m) {
+         m.msg1021 = &bad;
+         m.msg1022 = &m1022_;
+       }},
+      {kUnsupportedProjection, "datum", [&](All& m) { m.msg1025 = &unsupported; }},
+      {kSuccess, "datum, projection",
+       [&](All& m) {
+         m.msg1025 = &unsupported;
+         m.info.use1027 = true;
+       }},
   };
   for (const auto& [result, expected, change] : cases) {
     MsgUtilized set = Set(k1021 | k1023 | k1025);
     change(set);
     EXPECT_EQ(support_.ParseRTCMMEssages(set), result);
     std::string files;
-    for (const char* const name : {kDhdn, kLocal}) {
-      files += std::filesystem::exists(DatumFile(name)) ? "d" : ".";
-      files += std::filesystem::exists(ProjectionFile(name)) ? "p" : ".";
-    }
+    const auto add = [&files](const char* what, const std::filesystem::path& file) {
+      if (!std::filesystem::exists(file)) return;
+      files += files.empty() ? "" : ", ";
+      files += what;
+    };
+    add("datum", DatumFile(kDhdn));
+    add("projection", ProjectionFile(kDhdn));
+    add("other datum", DatumFile(kLocal));
+    add("other projection", ProjectionFile(kLocal));
     EXPECT_EQ(files, expected) << result;
     std::filesystem::remove_all(directory_ / "new");
   }

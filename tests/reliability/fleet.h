@@ -50,7 +50,8 @@ struct Fleet {
 
   /// Every query finds set 0, the first.
   bool Answers() const {
-    const double latitude = 300'000 * 2.42406840554768e-6, longitude = 36'000 * 2.42406840554768e-6;
+    const double latitude = 300'000 * 2.42406840554768e-6;
+    const double longitude = 36'000 * 2.42406840554768e-6;
     const RTCMGenerator generator(1, datums, projections);
     return !generator.getAllDatums().empty() && generator.getRtcmProjMessage() &&
            generator.getRtcmDatumMessage(latitude, longitude, 0) &&

@@ -21,7 +21,8 @@ constexpr auto *kDhdn = "AUTO_DHDN_BESEL", *kLocal = "Local_B_O_7";
 
 /// What of the messages is handed over.
 enum Parts { k1021 = 1, k1022 = 2, k1023 = 4, k1024 = 8, k1025 = 16, k1027 = 32 };
-constexpr int kDhdnSet = k1021 | k1023 | k1024 | k1025, kLocalSet = k1022 | k1023 | k1024 | k1027;
+constexpr int kDhdnSet = k1021 | k1023 | k1024 | k1025;
+constexpr int kLocalSet = k1022 | k1023 | k1024 | k1027;
 
 /// A message's fields by their names; null when there is no message.
 inline Json ToJson(const RtcmMessage* message) {
@@ -36,7 +37,10 @@ class RtcmTest : public testing::Test {
     MsgUtilized set;
     if (parts & k1021) set.msg1021 = &m1021_;
     if (parts & k1022) set.msg1022 = &m1022_;
-    set.msg1023 = &m1023_, set.msg1024 = &m1024_, set.msg1025 = &m1025_, set.msg1027 = &m1027_;
+    set.msg1023 = &m1023_;
+    set.msg1024 = &m1024_;
+    set.msg1025 = &m1025_;
+    set.msg1027 = &m1027_;
     set.info = {!!(parts & k1023), !!(parts & k1024), !!(parts & k1025), false, !!(parts & k1027)};
     return set;
   }
