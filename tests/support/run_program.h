@@ -15,8 +15,8 @@
 namespace velta_test {
 
 /// Runs a program without a command interpreter, with its standard streams on files, and waits.
-/// \param arguments the program's path first; none has a backslash before a quotation mark or its
-///     end
+/// \param arguments the program's path first; none has a blank, nor a backslash before a quotation
+///     mark
 /// \return its exit status, negative when it did not start or did not end by itself
 #ifdef _WIN32
 
@@ -24,12 +24,13 @@ inline int RunProgram(const std::vector<std::string>& arguments, const std::file
                       const std::filesystem::path& out, const std::filesystem::path& err) {
   std::wstring call;
   for (const std::string& argument : arguments) {
-    call += L'"';
-    for (const wchar_t c : std::filesystem::u8path(argument).wstring()) {
+    const std::wstring wide = std::filesystem::u8path(argument).wstring();
+    call += wide.empty() ? L"\"\"" : L"";
+    for (const wchar_t c : wide) {
       if (c == L'"') call += L'\\';
       call += c;
     }
-    call += L"\" ";
+    call += L' ';
   }
   SECURITY_ATTRIBUTES inherited = {sizeof inherited, nullptr, TRUE};
   const auto open = [&inherited](const std::filesystem::path& path, DWORD access, DWORD how) {
