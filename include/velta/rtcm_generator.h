@@ -79,9 +79,9 @@ class VELTA_EXPORT RTCMGenerator {
   void setProjFileName(const COrxStringT<wchar_t>& name);
 
  private:
-  std::int32_t systemId;
-  COrxStringT<wchar_t> datumFile;
-  COrxStringT<wchar_t> projFile;
+  std::int32_t systemId_;
+  COrxStringT<wchar_t> datumFile_;
+  COrxStringT<wchar_t> projFile_;
 };
 
 }  // namespace orx::cs::velta

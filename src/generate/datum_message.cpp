@@ -45,7 +45,7 @@ boost::shared_ptr<RtcmBasicTransformMessage> MakeMessage(const projmath::TRectRg
 
 boost::shared_ptr<RtcmBasicTransformMessage> RTCMGenerator::getRtcmDatumMessage(
     double latitude, double longitude, double /*height*/) const {
-  const TGenericRegistryKey container = OpenContainer(datumFile);
+  const TGenericRegistryKey container = OpenContainer(datumFile_);
   for (TGenRegKeyIterator walk(container); walk;) {
     const TGenericRegistryKey standard =
         OpenExisting(TGenericRegistryKey(walk++), layout::kStandardDatum);
@@ -54,7 +54,7 @@ boost::shared_ptr<RtcmBasicTransformMessage> RTCMGenerator::getRtcmDatumMessage(
     if (!area.Inside(latitude, longitude, false)) continue;
     DatumData datum;
     if (!ReadTransformation(container, standard, datum)) return nullptr;
-    return MakeMessage(area, datum, static_cast<std::uint32_t>(systemId));
+    return MakeMessage(area, datum, static_cast<std::uint32_t>(systemId_));
   }
   return nullptr;
 }

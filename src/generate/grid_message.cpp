@@ -46,12 +46,12 @@ boost::shared_ptr<Message> FindGrid(const COrxStringT<wchar_t>& fileName, const 
 
 boost::shared_ptr<Rtcm1023> RTCMGenerator::get1023(double latitude, double longitude,
                                                    double /*height*/) const {
-  return FindGrid<Rtcm1023>(datumFile, kEllipsoidal, latitude, longitude, systemId);
+  return FindGrid<Rtcm1023>(datumFile_, kEllipsoidal, latitude, longitude, systemId_);
 }
 
 boost::shared_ptr<Rtcm1024> RTCMGenerator::get1024(double northing, double easting,
                                                    double /*height*/) const {
-  return FindGrid<Rtcm1024>(projFile, kPlane, northing, easting, systemId);
+  return FindGrid<Rtcm1024>(projFile_, kPlane, northing, easting, systemId_);
 }
 
 }  // namespace orx::cs::velta

@@ -36,7 +36,7 @@ boost::shared_ptr<RtcmMessage> Finish(Message message, std::int32_t systemId) {
 }  // namespace
 
 boost::shared_ptr<RtcmMessage> RTCMGenerator::getRtcmProjMessage() const {
-  const TGenericRegistryKey entry = FirstSubKey(OpenContainer(projFile));
+  const TGenericRegistryKey entry = FirstSubKey(OpenContainer(projFile_));
   const TGenericRegistryKey standard = OpenExisting(entry, layout::kStandardProjection);
   COrxStringT<wchar_t> typeName;
   if (!Read(standard, layout::kProjectionType, typeName)) return nullptr;
@@ -45,9 +45,9 @@ boost::shared_ptr<RtcmMessage> RTCMGenerator::getRtcmProjMessage() const {
   const auto type = getRtcmPrjTypeFromString(typeName);
   if (type == ProjectionData::NONE) return nullptr;
   if (type == ProjectionData::OM || type == ProjectionData::ROM) {
-    return Finish(Make1027(type == ProjectionData::ROM, parameters), systemId);
+    return Finish(Make1027(type == ProjectionData::ROM, parameters), systemId_);
   }
-  return Finish(Make1025(type, parameters), systemId);
+  return Finish(Make1025(type, parameters), systemId_);
 }
 
 }  // namespace orx::cs::velta

@@ -23,7 +23,7 @@ std::size_t CountEntries(const TGenericRegistryKey& container) {
 
 RTCMGenerator::RTCMGenerator(std::int32_t id, const COrxStringT<wchar_t>& datumFileName,
                              const COrxStringT<wchar_t>& projFileName)
-    : systemId(id), datumFile(datumFileName), projFile(projFileName) {}
+    : systemId_(id), datumFile_(datumFileName), projFile_(projFileName) {}
 
 RTCMGenerator::RTCMGenerator(const RTCMGenerator& other) = default;
 
@@ -33,7 +33,7 @@ RTCMGenerator::~RTCMGenerator() = default;
 
 std::vector<DatumData, orx_dl_allocator<DatumData>> RTCMGenerator::getAllDatums() const {
   std::vector<DatumData, orx_dl_allocator<DatumData>> datums;
-  const TGenericRegistryKey container = OpenContainer(datumFile);
+  const TGenericRegistryKey container = OpenContainer(datumFile_);
   datums.reserve(CountEntries(container));
   for (TGenRegKeyIterator walk(container); walk;) {
     DatumData datum;
@@ -48,12 +48,12 @@ ProjectionData::projList RTCMGenerator::getRtcmPrjTypeFromString(const COrxStrin
   return FirstCodeOf(type);
 }
 
-COrxStringT<wchar_t> RTCMGenerator::datumFileName() const { return datumFile; }
+COrxStringT<wchar_t> RTCMGenerator::datumFileName() const { return datumFile_; }
 
-COrxStringT<wchar_t> RTCMGenerator::projFileName() const { return projFile; }
+COrxStringT<wchar_t> RTCMGenerator::projFileName() const { return projFile_; }
 
-void RTCMGenerator::setDatumFileName(const COrxStringT<wchar_t>& name) { datumFile = name; }
+void RTCMGenerator::setDatumFileName(const COrxStringT<wchar_t>& name) { datumFile_ = name; }
 
-void RTCMGenerator::setProjFileName(const COrxStringT<wchar_t>& name) { projFile = name; }
+void RTCMGenerator::setProjFileName(const COrxStringT<wchar_t>& name) { projFile_ = name; }
 
 }  // namespace orx::cs::velta

@@ -117,7 +117,7 @@ NamedList<KeyTree::Key*>& KeyTree::TakeKeys(Key& key) {
     while (!bytes.empty()) {
       const unsigned char* const start = bytes.data();
       const std::optional<record::Key> found = record::TakeKey(bytes);
-      if (!found || key.depth == record::kMaxDepth) {
+      if (!found || key.depth_ == record::kMaxDepth) {
         error = kDamaged;
         break;
       }
@@ -144,7 +144,7 @@ ValueRecord KeyTree::FindValue(Key& key, LookupName& name) {
 
 KeyTree::Key* KeyTree::OpenKey(Key& key, const record::Name& name, std::uint8_t dimension) {
   if (Key* const found = FindKey(key, name)) return found;
-  if (key.depth == record::kMaxDepth || name.bytes > kMaxNameBytes) return nullptr;
+  if (key.depth_ == record::kMaxDepth || name.bytes > kMaxNameBytes) return nullptr;
   auto* const made = Make<Key>(*this, &key, MakeRecord(name, dimension));
   MarkUnsaved(*made);
   TakeKeys(key).Append(made);
@@ -187,7 +187,7 @@ void KeyTree::DeepCopy(Key& to, Key& from) {
     // As a whole, and where it lies: this is how entries are copied when files are merged.
     const unsigned char* const record = from.first_.record;
     const std::size_t size = record::KeyRecordSize(record);
-    if (record::IsWhole({record, size}, record::kMaxDepth - to.depth)) {
+    if (record::IsWhole({record, size}, record::kMaxDepth - to.depth_)) {
       lenders_.insert(source.shared_from_this());
       Unsaved& unsaved = MarkUnsaved(to);
       AddLayer(to, record);

@@ -25,7 +25,7 @@ class TGenericRegistryKeyImp {
       : tree(&owner),
         parent(above),
         first_{record, nullptr},
-        depth(static_cast<std::uint8_t>(above ? above->depth + 1 : 0)) {}
+        depth_(static_cast<std::uint8_t>(above ? above->depth_ + 1 : 0)) {}
 
   record::Name name() const { return record::KeyAt(first_.record).name; }
   std::uint8_t dimension() const { return record::KeyAt(first_.record).dimension; }
@@ -52,7 +52,7 @@ class TGenericRegistryKeyImp {
   Layer* last_ = nullptr;  ///< null: the first is the last
   NamedList<ValueRecord>* values_ = nullptr;
   NamedList<TGenericRegistryKeyImp*>* keys_ = nullptr;
-  const std::uint8_t depth;
+  const std::uint8_t depth_;
   bool valuesAreWhole_ = false;  ///< every layer's values are in `values_`
   bool keysAreWhole_ = false;    ///< every layer's keys are in `keys_`
 };
