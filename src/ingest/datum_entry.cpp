@@ -28,9 +28,8 @@ void AddValidityArea(TGenericRegistryKey& key, const DatumData& datum) {
 }  // namespace
 
 ResultCode RTCMDataSupport::InitDatumGFF(DatumData& description) {
-  const COrxStringT<wchar_t> path =
-      GetDatumPath() + description.targetDatumName + kDatumFiles.extension;
-  const ResultCode result = EnsureFile(GetDatumPath(), path, [&](const auto& newFile) {
+  const COrxStringT<wchar_t> path = FileOf(kDatumFiles, datumPath, description.targetDatumName);
+  const ResultCode result = EnsureFile(datumPath, path, [&](const auto& newFile) {
     return CreateNewDatumGFF(newFile, description);
   });
   return result == kSuccess ? InitWithExistedDatumGFF(path) : result;

@@ -16,6 +16,12 @@ namespace orx::cs::velta {
 using FillKey = std::function<ResultCode(TGenericRegistryKey& key)>;
 using CreateFile = std::function<ResultCode(const COrxStringT<wchar_t>& path)>;
 
+/// The full name of the file of a datum.
+inline COrxStringT<wchar_t> FileOf(const SharedFiles& kind, const COrxStringT<wchar_t>& directory,
+                                   const COrxStringT<wchar_t>& datumName) {
+  return directory + datumName + kind.extension;
+}
+
 /// Makes sure that the directory and the file exist.
 /// \param create called for a file that does not
 /// \return 0, kNoDirectory, or what `create` returns

@@ -38,7 +38,7 @@ ResultCode RTCMDataSupport::ParseDatum(const RtcmBasicTransformMessage& message,
   datumEntryName = DatumEntryName(message, grid);
 
   // Nothing may fail between obtaining the file and giving it back.
-  const COrxStringT<wchar_t> path = GetDatumPath() + datum.targetDatumName + kDatumFiles.extension;
+  const COrxStringT<wchar_t> path = FileOf(kDatumFiles, datumPath, datum.targetDatumName);
   const ResultCode result = InitDatumGFF(datum);
   if (result != kSuccess) return result;
   return AddAndGiveBack(kDatumFiles, path, [this] { return AddDatumToGFF(datum); });

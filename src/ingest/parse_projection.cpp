@@ -45,7 +45,7 @@ ResultCode RTCMDataSupport::ParseProjection(const Message& message, std::uint32_
 
   // Nothing may fail between obtaining the file and giving it back.
   const COrxStringT<wchar_t> path =
-      GetProjectionPath() + projection.rtcmProjName + kProjectionFiles.extension;
+      FileOf(kProjectionFiles, projectionPath, projection.rtcmProjName);
   const ResultCode result = InitProjectionGFF(projection);
   if (result != kSuccess) return result;
   return AddAndGiveBack(kProjectionFiles, path, [this] { return AddProjectionToGFF(projection); });

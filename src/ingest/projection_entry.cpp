@@ -29,8 +29,8 @@ void AddParameters(TGenericRegistryKey& key, const projmath::TGeoProj& projectio
 
 ResultCode RTCMDataSupport::InitProjectionGFF(ProjectionData& description) {
   const COrxStringT<wchar_t> path =
-      GetProjectionPath() + description.rtcmProjName + kProjectionFiles.extension;
-  const ResultCode result = EnsureFile(GetProjectionPath(), path, [&](const auto& newFile) {
+      FileOf(kProjectionFiles, projectionPath, description.rtcmProjName);
+  const ResultCode result = EnsureFile(projectionPath, path, [&](const auto& newFile) {
     return CreateNewPrjGFF(newFile, description);
   });
   return result == kSuccess ? InitWithExistedPrjGFF(path) : result;

@@ -11,6 +11,7 @@
 #include <utility>
 
 #include "angle.h"
+#include "conversion/message_fields.h"
 #include "conversion/projection_types.h"
 #include "orxutils/orx_string.h"
 #include "terminal.h"
@@ -125,6 +126,46 @@ void AddGrid(const TableData& grid, const ordered_json& area, const GridTerms& t
       {"height residuals", "heightResiduals", Scaled(grid.dHData, 1), "m"},
   };
   description.insert(description.end(), properties.begin(), properties.end());
+}
+
+/// How the parameters of projections are told, by the fields of their messages.
+struct ParameterTerms {
+  std::string_view field;
+  const char* label;
+  const char* key;
+  std::string_view unit;
+};
+constexpr ParameterTerms kParameters[] = {
+    {"loNO", "longitude of origin", "longitudeOfOrigin", kDegrees},
+    {"addSNO", "scale", "scale", ""},
+    {"laNO", "latitude of origin", "latitudeOfOrigin", kDegrees},
+    {"fe", "false easting", "falseEasting", "m"},
+    {"fn", "false northing", "falseNorthing", "m"},
+    {"azIL", "azimuth of the line", "azimuthOfLine", kDegrees},
+    {"addSIL", "scale", "scale", ""},
+    {"loPC", "longitude of centre", "longitudeOfCentre", kDegrees},
+    {"laPC", "latitude of centre", "latitudeOfCentre", kDegrees},
+    {"epc", "easting at the centre", "eastingAtCentre", "m"},
+    {"npc", "northing at the centre", "northingAtCentre", "m"},
+};
+
+void AddParameters(int code, const double (&parameters)[16], Description& description) {
+  const auto add = [&](std::string_view field, auto, double value, const auto&) {
+    for (const auto& [known, label, key, unit] : kParameters) {
+      if (known == field) description.push_back({label, key, value, unit});
+    }
+  };
+  if (code != ProjectionData::OM && code != ProjectionData::ROM) {
+    orx::cs::velta::Rtcm1025 message;
+    message.projectionType = static_cast<std::uint32_t>(code);
+    VisitProjection(message, parameters, add);
+    return;
+  }
+  const orx::cs::velta::Rtcm1027 message;
+  const double* const end = VisitProjection(message, parameters, add);
+  if (code == ProjectionData::ROM) {
+    description.push_back({"rectified to skew grid", "rectifiedToSkew", *end, kDegrees});
+  }
 }
 
 ordered_json EllipsoidJson(double a, double b) {
@@ -249,31 +290,13 @@ Description Describe(const DatumData& datum) {
 
 Description Describe(const StoredProjection& projection) {
   const auto code = orx::cs::velta::FirstCodeOf(projection.type);
-  const double* parameter = projection.parameters;
   Description description = {
       {"datum", "datum", orx::ToUtf8(projection.datumName)},
       {"projection type", "projectionType", orx::ToUtf8(projection.type)},
       {"projection", "projection", NameOfProjection(code)},
       {"ellipsoid", "ellipsoid", EllipsoidJson(projection.axes[0], projection.axes[1]), "m"},
   };
-  const auto add = [&](const char* label, const char* key, std::string_view unit) {
-    description.push_back({label, key, *parameter++, unit});
-  };
-  if (code == ProjectionData::OM || code == ProjectionData::ROM) {
-    add("azimuth of the line", "azimuthOfLine", kDegrees);
-    add("scale", "scale", "");
-    add("longitude of centre", "longitudeOfCentre", kDegrees);
-    add("latitude of centre", "latitudeOfCentre", kDegrees);
-    add("easting at the centre", "eastingAtCentre", "m");
-    add("northing at the centre", "northingAtCentre", "m");
-    if (code == ProjectionData::ROM) add("rectified to skew grid", "rectifiedToSkew", kDegrees);
-  } else {
-    add("longitude of origin", "longitudeOfOrigin", kDegrees);
-    if (orx::cs::velta::HasScaleFactor(static_cast<std::uint32_t>(code))) add("scale", "scale", "");
-    add("latitude of origin", "latitudeOfOrigin", kDegrees);
-    add("false easting", "falseEasting", "m");
-    add("false northing", "falseNorthing", "m");
-  }
+  AddParameters(code, projection.parameters, description);
   const double* const bounds = projection.grid.bounds;
   const ordered_json area = {{"south", bounds[0]},
                              {"north", bounds[0] + bounds[1]},
