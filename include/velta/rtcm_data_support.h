@@ -155,9 +155,9 @@ class RTCMDataSupport {
   /// Copies every entry of the datum file `source` into the shared datum file `target` and saves
   /// it. An entry that both hold gets the source's values; nothing is deleted. Holds the target's
   /// mutex meanwhile, and gives the target back whatever the outcome. While an object is there,
-  /// other threads may ingest and merge meanwhile, but neither make nor end one. \return 0,
-  /// kDatumFileTrouble, kNoSiblingLibrary, the loader's status, or the sibling
-  ///     library's code
+  /// other threads may ingest and merge meanwhile, but neither make nor end one.
+  /// \return 0, kDatumFileTrouble, kNoSiblingLibrary, the loader's status, or the sibling library's
+  ///     code
   VELTA_EXPORT static ResultCode MergeRTCMDatumfiles(const COrxStringT<wchar_t>& target,
                                                      const COrxStringT<wchar_t>& source);
   /// As MergeRTCMDatumfiles, for projection files, with kProjectionFileTrouble.

@@ -4,6 +4,7 @@
 #include <boost/crc.hpp>
 #include <boost/endian/conversion.hpp>
 #include <cstring>
+#include <stdexcept>
 
 namespace orx::cs::velta::rtcm3 {
 namespace {
@@ -24,6 +25,7 @@ std::uint32_t Crc(const void* data, std::size_t size) {
 }  // namespace
 
 void AppendFrame(std::string_view payload, std::string& out) {
+  if (payload.size() > kMaxPayload) throw std::length_error("a payload has at most 1023 bytes");
   const std::size_t start = out.size();
   out.push_back(static_cast<char>(kPreamble));
   out.push_back(static_cast<char>(payload.size() >> 8));
@@ -71,8 +73,6 @@ std::optional<std::string_view> FrameReader::Next() {
 void FrameReader::Remark(const std::string& what) { RemarkAt(frameAt_, what); }
 
 void FrameReader::RemarkAt(std::uint64_t place, const std::string& what) {
-  if (remarksLeft_ == 0) return;
-  --remarksLeft_;
   counts_.remarks.push_back("byte " + std::to_string(place) + ": " + what);
 }
 
@@ -82,7 +82,7 @@ void FrameReader::EndSkipping() {
   std::string what = std::to_string(skipped_) + " bytes that are no frame";
   if (skippedCrcs_ > 0) what += ", " + std::to_string(skippedCrcs_) + " wrong checksums among them";
   if (endsInFrame_) what += "; the stream ends inside a frame";
-  RemarkAt(skippedAt_, what);
+  if (skipRemarks_++ < kMostRemarks) RemarkAt(skippedAt_, what);
   skipped_ = skippedCrcs_ = 0;
   endsInFrame_ = false;
 }

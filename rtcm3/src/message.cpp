@@ -76,6 +76,16 @@ class FieldBytes {
   std::vector<Field> fields_;
 };
 
+/// \throws std::invalid_argument when the record is not what its type says
+template <class Record>
+const Record& As(const RtcmMessage& record) {
+  const auto* const found = dynamic_cast<const Record*>(&record);
+  if (!found)
+    throw std::invalid_argument("a record is not of its type " +
+                                std::to_string(record.messageType));
+  return *found;
+}
+
 }  // namespace
 
 bool Reset(Message& message, std::uint64_t number) {
@@ -89,20 +99,19 @@ Message FromRecord(const RtcmMessage& record) {
   switch (record.messageType + kTypeBase) {
     case 1021: {
       Rtcm1021 message;
-      static_cast<RtcmBasicTransformMessage&>(message) =
-          static_cast<const RtcmBasicTransformMessage&>(record);
+      static_cast<RtcmBasicTransformMessage&>(message) = As<RtcmBasicTransformMessage>(record);
       return message;
     }
     case 1022:
-      return static_cast<const Rtcm1022&>(record);
+      return As<Rtcm1022>(record);
     case 1023:
-      return static_cast<const Rtcm1023&>(record);
+      return As<Rtcm1023>(record);
     case 1024:
-      return static_cast<const Rtcm1024&>(record);
+      return As<Rtcm1024>(record);
     case 1025:
-      return static_cast<const Rtcm1025&>(record);
+      return As<Rtcm1025>(record);
     case 1027:
-      return static_cast<const Rtcm1027&>(record);
+      return As<Rtcm1027>(record);
     default:
       throw std::invalid_argument("no message of type " + std::to_string(record.messageType));
   }

@@ -22,7 +22,9 @@ const Message* MessageReader::Next() {
         continue;
       case Decoded::kTooShort:
         ++counts_.shortMessages;
-        frames_.Remark(std::to_string(NumberOf(message_)) + " ends before its last field");
+        if (shortRemarks_++ < kMostRemarks) {
+          frames_.Remark(std::to_string(NumberOf(message_)) + " ends before its last field");
+        }
         continue;
       case Decoded::kCutMessage:
         ++counts_.cutMessages;

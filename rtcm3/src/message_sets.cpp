@@ -23,6 +23,7 @@ std::uint32_t IndicatorOf(const Message* datum) {
 }  // namespace
 
 const Message* MessageSet::Find(unsigned number) const {
+  if (number < kFirstMessage || number - kFirstMessage >= messages_.size()) return nullptr;
   const auto& message = messages_[number - kFirstMessage];
   return message ? &*message : nullptr;
 }

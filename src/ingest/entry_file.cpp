@@ -46,6 +46,7 @@ ResultCode AddEntry(const SharedFiles& kind, const COrxStringT<wchar_t>& name,
   if (container.IsNull() || file.GetErrorState() != kRegistryOk) return kind.trouble;
   if (isPresent) return kSuccess;
   Change change(file);
+  if (!change.IsAlone()) return kEntryNotWritten;
   TGenericRegistryKey entry(container, name, container.GetKeyDim(), true);
   const ResultCode result = fill(entry);
   if (result != kSuccess) return result;

@@ -45,6 +45,7 @@ ResultCode MergeFiles(const SharedFiles& kind, const COrxStringT<wchar_t>& targe
   LookInto(sourceContainer);
   if (source.GetErrorState() != kRegistryOk) return kind.trouble;
   Change change(*target);
+  if (!change.IsAlone()) return kind.trouble;
   if (merge(targetContainer, sourceContainer) != kSuccess) return kind.trouble;
   return change.Save() ? kSuccess : kind.trouble;
 }

@@ -19,21 +19,25 @@ TGenericRegistryKey ContainerOf(const TInKey& tree);
 void LookInto(const TGenericRegistryKey& key);
 
 /// A change of a shared file: either all of it is saved, or it is forgotten when this goes. What
-/// was unsaved before is the caller's and is left alone.
+/// others have left unsaved in the tree is saved first, so that it is not forgotten with it.
 class Change {
  public:
-  explicit Change(TInFileKey& file) : file_(file), hadNothingElse_(!file.HasUnsavedChanges()) {}
+  explicit Change(TInFileKey& file)
+      : file_(file), isAlone_(!file.HasUnsavedChanges() || file.Save(false, kRegistryVersion)) {}
   Change(const Change&) = delete;
   Change& operator=(const Change&) = delete;
   ~Change() {
-    if (!isSaved_ && hadNothingElse_) file_.ForgetChanges();
+    if (isAlone_ && !isSaved_) file_.ForgetChanges();
   }
+
+  /// False when what others have left unsaved cannot be saved; the tree must not be changed then.
+  bool IsAlone() const { return isAlone_; }
 
   bool Save() { return isSaved_ = file_.Save(false, kRegistryVersion); }
 
  private:
   TInFileKey& file_;
-  bool hadNothingElse_;
+  bool isAlone_;
   bool isSaved_ = false;
 };
 

@@ -243,6 +243,23 @@ TEST_F(Retry, SavesTheDatumThatTheDiskDidNotTake) {
   EXPECT_TRUE(HoldsDatum(LoadTree(fleet.datums), 1));
 }
 
+TEST_F(Retry, SavesTheDatumBesideWhatACallerHasNotSaved) {
+  orx::TCSInFileKey* shared = nullptr;
+  ASSERT_EQ(fleet.support.GetUnlockedPtrDatumGFF(fleet.datums, &shared), kSuccess);
+  const orx::TGenericRegistryKey root{orx::TGenericRegistryKeyPtr(*shared)};
+  const orx::TGenericRegistryKey unsaved(root, L"somebody's", 0, true);
+  {
+    const FileFaults full(Fault::kFull, 0);
+    EXPECT_FALSE(fleet.Ingest(1));
+    DatumData datum = CurrentDatum();
+    EXPECT_EQ(fleet.support.AddDatumToGFF(datum), kEntryNotWritten);
+  }
+  EXPECT_TRUE(fleet.Ingest(1));
+  EXPECT_TRUE(HoldsDatum(LoadTree(fleet.datums), 1));
+  EXPECT_NE(Describe(LoadTree(fleet.datums)).find("somebody's"), std::string::npos);
+  fleet.support.ReleasePtrDatumGFF(fleet.datums);
+}
+
 TEST_F(Retry, SavesTheDatumThatADiskGoneForAWhileDidNotTake) {
   {
     const FileFaults gone(Fault::kBroken, 4);

@@ -18,6 +18,8 @@ bool IsSiblingLoaded() {
 #endif
 }
 
+static_assert(std::is_convertible_v<const wchar_t*, RTCMDataSupport>, "a path may stand for it");
+
 using LifecycleTest = RtcmTest;
 
 TEST_F(LifecycleTest, DirectoriesAreTakenAsGivenOrTheUsers) {
@@ -34,7 +36,8 @@ TEST_F(LifecycleTest, SummariesFollowTheLastSetAndAnAssignment) {
   EXPECT_FALSE(support_.GetCustomProjectionData(p));
   EXPECT_EQ(d.datumGroup + d.transformationDll, L"RTCMRTCMGridHost.dll");
   EXPECT_EQ(p.projectionGroup + p.transformationDll + p.unitName, L"RTCMRTCMGridHost.dllMeters");
-  support_.SetDatumEllipsoidName(L"Bessel"), m1021_.targetName = "D";
+  support_.SetDatumEllipsoidName(L"Bessel");
+  m1021_.targetName = "D";
   ASSERT_EQ(Ingest(kDhdnSet), kSuccess);
   EXPECT_TRUE(support_.GetCustomDatumData(d));
   EXPECT_TRUE(support_.GetCustomProjectionData(p));

@@ -14,7 +14,7 @@ constexpr std::size_t kParts = 3;  // degrees, minutes, seconds
 
 /// The signs behind degrees, minutes and seconds; between parts a blank does, too.
 const std::vector<std::string_view> kSigns[kParts] = {
-    {"°", "d"}, {"'", "′", "’"}, {"\"", "″", "”", "''"}};
+    {"°", "º", "d"}, {"'", "′", "’"}, {"\"", "″", "”", "''"}};
 
 void SkipBlanks(std::string_view& text) {
   text.remove_prefix(std::min(text.find_first_not_of(' '), text.size()));
@@ -79,6 +79,7 @@ std::optional<double> ParseAngle(std::string_view text, const Coordinate& coordi
   }
   SkipBlanks(text);
   const bool isNegative = Take(text, "-");
+  if (!isNegative) Take(text, "+");
   if (isNegative && hemisphere != 0) return std::nullopt;
   double degrees = 0;
   double unit = 1;
@@ -101,6 +102,7 @@ std::optional<double> ParseAngle(std::string_view text, const Coordinate& coordi
 std::string DegreesMinutesSeconds(double degrees) {
   constexpr int kDecimals = 7;
   constexpr long long kUnitsPerSecond = 10'000'000;
+  if (!std::isfinite(degrees)) return std::to_string(degrees);
   long long rest = std::llround(std::abs(degrees) * kSixty * kSixty * kUnitsPerSecond);
   const long long units = rest % kUnitsPerSecond;
   rest /= kUnitsPerSecond;

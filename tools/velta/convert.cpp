@@ -64,18 +64,28 @@ int DecodeStream(const Conversion& files) {
   return finish();
 }
 
-/// Reads a line without its end. Of one that is too long to be a message's, it keeps just so much
-/// that it is refused.
+/// Reads a line without its end, but no more of it than a message's line can have and one byte.
 /// \return false at the end of the input
 bool ReadLine(std::streambuf& in, std::string& line) {
   using Traits = std::streambuf::traits_type;
   line.clear();
-  for (;;) {
+  while (line.size() <= rtcm3::kMaxJsonLine) {
     const Traits::int_type next = in.sbumpc();
     if (Traits::eq_int_type(next, Traits::eof())) return !line.empty();
     const char c = Traits::to_char_type(next);
     if (c == '\n') return true;
-    if (line.size() <= rtcm3::kMaxJsonLine) line += c;
+    line += c;
+  }
+  return true;
+}
+
+/// Passes over what is left of a line.
+void SkipLine(std::streambuf& in) {
+  using Traits = std::streambuf::traits_type;
+  const auto isEnd = [](Traits::int_type next) {
+    return Traits::eq_int_type(next, Traits::eof()) || Traits::to_char_type(next) == '\n';
+  };
+  while (!isEnd(in.sbumpc())) {
   }
 }
 
@@ -99,6 +109,7 @@ int EncodeLines(const Conversion& files) {
       ReportFailure(files.from + ":" + std::to_string(number) + ": " + error.what());
       status = kFailed;
     }
+    if (line.size() > rtcm3::kMaxJsonLine) SkipLine(in.buffer());
     const bool mayWait = in.buffer().in_avail() <= 0;
     mayWait ? out.Flush() : out.FlushMuch();
   }

@@ -6,6 +6,8 @@
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
+#include <iterator>
+#include <map>
 #include <span>
 #include <string_view>
 #include <utility>
@@ -27,6 +29,9 @@ using orx::cs::velta::TableData;
 
 constexpr double kArcSecondsPerRadian = kDegreesPerRadian * 3600;
 constexpr std::uint32_t kMolodenskiBadekas = 3;
+// Steps of the fields of areas and grids, degrees; an edge may lie between two.
+constexpr double kAreaStep = 2 / 3600.0;
+constexpr double kGridStep = 0.5 / 3600;
 
 constexpr std::string_view kDegrees = "degrees";
 constexpr std::size_t kLabelWidth = 26;
@@ -48,7 +53,7 @@ constexpr ProjectionName kProjections[] = {
     {ProjectionData::LCCW, "Lambert conic conformal, west orientated"},
     {ProjectionData::CS, "Cassini-Soldner"},
     {ProjectionData::OM, "Oblique Mercator"},
-    {ProjectionData::OS, "Oblique stereographic"},
+    {ProjectionData::OS, "Stereographic"},
     {ProjectionData::MC, "Mercator"},
     {ProjectionData::PS, "Polar stereographic"},
     {ProjectionData::DS, "Double stereographic"},
@@ -81,6 +86,7 @@ ordered_json Scaled(std::span<const double> values, double factor) {
 /// How the grid of a datum and that of a projection are told.
 struct GridTerms {
   std::string_view areaUnit;
+  double areaStep;        ///< of the fields that it is made of
   std::string_view unit;  ///< of spacing and residuals
   double factor;          ///< from what is stored to that unit
   const char* north;
@@ -89,6 +95,7 @@ struct GridTerms {
   const char* eastKey;
 };
 constexpr GridTerms kEllipsoidalGrid{kDegrees,
+                                     kGridStep,
                                      "arc-seconds",
                                      kArcSecondsPerRadian,
                                      "latitude residuals",
@@ -96,6 +103,7 @@ constexpr GridTerms kEllipsoidalGrid{kDegrees,
                                      "longitude residuals",
                                      "longitudeResiduals"};
 constexpr GridTerms kPlaneGrid{"m",
+                               0,
                                "m",
                                1,
                                "northing residuals",
@@ -112,7 +120,7 @@ void AddGrid(const TableData& grid, const ordered_json& area, const GridTerms& t
   }
   const std::span<const double> mean(grid.meanValue);
   const Description properties = {
-      {"grid area", "gridArea", area, terms.areaUnit},
+      {"grid area", "gridArea", area, terms.areaUnit, terms.areaStep},
       {"grid spacing", "gridSpacing", Scaled(std::span(grid.bounds).subspan(4), terms.factor),
        terms.unit},
       {"horizontal shifts", "horShift", grid.horShift},
@@ -190,21 +198,25 @@ bool IsSame(const ordered_json& a, const ordered_json& b) {
 }
 
 /// The number with the fewest digits that is the same but for rounding.
-double Shortest(double number) {
+/// \param step of the field that it is from, 0 when it is not known
+double Shortest(double number, double step) {
   constexpr int kDigits = 17;
+  constexpr double kShare = 0.01;
   for (int digits = 1; digits < kDigits; ++digits) {
     std::array<char, 32> text;
     std::snprintf(text.data(), text.size(), "%.*g", digits, number);
     const double shorter = std::strtod(text.data(), nullptr);
-    if (IsSameNumber(shorter, number)) return shorter == 0 ? 0 : shorter;
+    const bool isSame =
+        IsSameNumber(shorter, number) || std::abs(shorter - number) <= kShare * step;
+    if (isSame) return shorter == 0 ? 0 : shorter;
   }
   return number;
 }
 
-ordered_json WithShortNumbers(ordered_json value) {
-  if (value.is_number_float()) return Shortest(value.get<double>());
+ordered_json WithShortNumbers(ordered_json value, double step) {
+  if (value.is_number_float()) return Shortest(value.get<double>(), step);
   if (value.is_structured()) {
-    for (ordered_json& element : value) element = WithShortNumbers(std::move(element));
+    for (ordered_json& element : value) element = WithShortNumbers(std::move(element), step);
   }
   return value;
 }
@@ -217,30 +229,64 @@ ordered_json WithDegreesMinutesSeconds(ordered_json value) {
   return value;
 }
 
-/// Without an exponent.
-std::string NumberText(const ordered_json& number) {
+/// Without an exponent, but for what no message can hold.
+std::string NumberText(const ordered_json& number, double step) {
+  constexpr double kLarge = 1e15;
   if (!number.is_number_float()) return number.dump();
-  std::array<char, 512> digits;
-  char* const end = std::to_chars(digits.begin(), digits.end(), Shortest(number.get<double>()),
-                                  std::chars_format::fixed)
-                        .ptr;
+  const double value = number.get<double>();
+  std::array<char, 64> digits;
+  const auto format =
+      std::abs(value) < kLarge ? std::chars_format::fixed : std::chars_format::general;
+  char* const end = std::to_chars(digits.begin(), digits.end(), Shortest(value, step), format).ptr;
   return {digits.data(), end};
 }
 
-std::string ValueText(const ordered_json& value) {
+std::string ValueText(const ordered_json& value, double step) {
   if (value.is_string()) return Printable(value.get<std::string>());
   if (value.is_boolean()) return value.get<bool>() ? "yes" : "no";
-  if (!value.is_structured()) return NumberText(value);
+  if (!value.is_structured()) return NumberText(value, step);
   std::string text;
   std::size_t count = 0;
   for (const auto& [key, element] : value.items()) {
     const bool fullLine = count > 0 && count % kValuesPerLine == 0;
     if (count > 0) text += value.is_object() ? ", " : fullLine ? kNextLine : " ";
     if (value.is_object()) text += key + " ";
-    text += ValueText(element);
+    text += ValueText(element, step);
     ++count;
   }
   return text;
+}
+
+std::string ValueText(const Property& property) {
+  if (property.value.is_null()) return "none";
+  const std::string text = ValueText(property.value, property.step);
+  return property.unit.empty() ? text : text + " " + std::string(property.unit);
+}
+
+bool IsOfEachPoint(const Property& property) {
+  constexpr std::string_view kKeys[] = {"latitudeResiduals", "longitudeResiduals",
+                                        "northingResiduals", "eastingResiduals", "heightResiduals"};
+  return std::find(std::begin(kKeys), std::end(kKeys), property.key) != std::end(kKeys);
+}
+
+bool IsIn(const Description& description, const Property& property) {
+  return std::any_of(description.begin(), description.end(), [&](const Property& other) {
+    return std::string_view(other.key) == property.key && other.value == property.value;
+  });
+}
+
+/// Those that more than half of the descriptions have, in the order in which they come up.
+Description CommonProperties(const std::vector<Description>& descriptions) {
+  std::map<std::pair<std::string_view, std::string>, std::size_t> counts;
+  Description common;
+  for (const Description& description : descriptions) {
+    for (const Property& property : description) {
+      if (IsOfEachPoint(property)) continue;
+      const std::size_t count = ++counts[{property.key, property.value.dump()}];
+      if (count == descriptions.size() / 2 + 1) common.push_back(property);
+    }
+  }
+  return common;
 }
 
 }  // namespace
@@ -268,7 +314,7 @@ Description Describe(const DatumData& datum) {
       {"computation indicator", "computationIndicator", datum.computationIndicator},
       {"method", "method", MethodName(datum.computationIndicator)},
       {"height indicator", "heightIndicator", static_cast<std::int32_t>(datum.heightIndicator)},
-      {"area", "area", EdgesJson(datum.validityArea), kDegrees},
+      {"area", "area", EdgesJson(datum.validityArea), kDegrees, kAreaStep},
       {"translations", "translations", Scaled(parameters.first(3), 1), "m"},
       {"rotations", "rotations", Scaled(parameters.subspan(3, 3), 1),
        "arc-seconds, coordinate frame"},
@@ -334,47 +380,26 @@ Description WithDegreesMinutesSeconds(Description description) {
 
 std::string ToText(const Description& description) {
   std::string text;
-  for (const auto& [label, key, value, unit] : description) {
-    std::string line = label;
+  for (const Property& property : description) {
+    std::string line = property.label;
     line.resize(kLabelWidth, ' ');
-    line += value.is_null() ? "none" : ValueText(value);
-    if (!unit.empty()) line += std::string(" ").append(unit);
-    text += line + '\n';
+    text += line + ValueText(property) + '\n';
   }
   return text;
 }
 
 std::string ToSummary(const std::vector<Description>& descriptions) {
-  constexpr std::string_view kOfEachPoint[] = {"latitudeResiduals", "longitudeResiduals",
-                                               "northingResiduals", "eastingResiduals",
-                                               "heightResiduals"};
-  const auto isOfEachPoint = [&](const Property& property) {
-    return std::find(std::begin(kOfEachPoint), std::end(kOfEachPoint), property.key) !=
-           std::end(kOfEachPoint);
-  };
-  const auto isIn = [](const Description& description, const Property& property) {
-    return std::any_of(description.begin(), description.end(), [&](const Property& other) {
-      return std::string_view(other.key) == property.key && other.value == property.value;
-    });
-  };
-  Description shared;
-  for (const Property& property : descriptions.front()) {
-    const bool isShared =
-        !isOfEachPoint(property) &&
-        std::all_of(descriptions.begin() + 1, descriptions.end(),
-                    [&](const Description& description) { return isIn(description, property); });
-    if (isShared) shared.push_back(property);
-  }
-  shared.push_back({"entries", "entries", descriptions.size()});
-  std::string text = ToText(shared) + '\n';
+  Description common = CommonProperties(descriptions);
+  common.push_back({"entries", "entries", descriptions.size()});
+  std::string text = ToText(common) + '\n';
   for (const Description& description : descriptions) {
     std::string separator;
     for (const Property& property : description) {
-      if (isOfEachPoint(property) || isIn(shared, property)) continue;
+      if (IsOfEachPoint(property) || IsIn(common, property)) continue;
       const bool isName = separator.empty();
       text += std::exchange(separator, "; ");
       if (!isName) text += std::string(property.label) + " ";
-      text += property.value.is_null() ? "none" : ValueText(property.value);
+      text += ValueText(property);
     }
     text += '\n';
   }
@@ -384,7 +409,7 @@ std::string ToSummary(const std::vector<Description>& descriptions) {
 ordered_json ToJson(const Description& description) {
   ordered_json json = ordered_json::object();
   for (const Property& property : description) {
-    json[property.key] = WithShortNumbers(property.value);
+    json[property.key] = WithShortNumbers(property.value, property.step);
   }
   return json;
 }

@@ -20,6 +20,7 @@ struct Property {
   const char* key;               ///< for JSON
   nlohmann::ordered_json value;  ///< number, text, or an array or an object of them
   std::string_view unit = "";
+  double step = 0;  ///< of the message's field; what is much smaller is rounding
 };
 using Description = std::vector<Property>;
 
@@ -59,9 +60,9 @@ Description WithDegreesMinutesSeconds(Description description);
 /// A description as lines of text.
 std::string ToText(const Description& description);
 
-/// Many descriptions on a screen: what all share, their number, then a line for each with what it
-/// has of its own. The points of residual grids are left out.
-/// \param descriptions at least one, each beginning with the entry's name
+/// Many descriptions on a screen: what most share, their number, then a line for each with what it
+/// has of its own or otherwise. The points of residual grids are left out.
+/// \param descriptions at least two, each beginning with the entry's name
 std::string ToSummary(const std::vector<Description>& descriptions);
 
 /// A description as a JSON object.

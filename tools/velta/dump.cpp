@@ -14,6 +14,7 @@
 #include "orxregistry/bin_value.h"
 #include "orxregistry/in_file_key.h"
 #include "orxregistry/registry_key.h"
+#include "orxutils/file_error.h"
 #include "orxutils/orx_string.h"
 
 namespace velta_tool {
@@ -113,12 +114,16 @@ void WriteKey(const TGenericRegistryKey& key, const std::string& indent, Output&
 
 int Run(const std::string& file) {
   RequireFile(file);
+  orx::ForgetFileError();
   const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, orx::kRegistryFlags);
-  Output out;
+  Output out({file});
   WriteKey(TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)), "", out);
   out.pending() += '\n';
   out.Flush();
-  return ReportErrorState(file, tree.GetErrorState()) ? kFailed : kDone;
+  const std::string error = ErrorStateText(tree.GetErrorState(), orx::KeptFileError());
+  if (error.empty()) return kDone;
+  ReportFailure(file + ": " + error + "; shown is what could be read");
+  return kFailed;
 }
 
 }  // namespace

@@ -1,5 +1,6 @@
 #include "entries.h"
 
+#include <algorithm>
 #include <boost/thread/lock_types.hpp>
 
 #include "conversion/datum_conversion.h"
@@ -7,6 +8,7 @@
 #include "conversion/projection_conversion.h"
 #include "conversion/projection_types.h"
 #include "files.h"
+#include "orxutils/file_error.h"
 #include "orxutils/orx_string.h"
 #include "store/gff_layout.h"
 #include "store/key_values.h"
@@ -79,21 +81,24 @@ Entry ReadEntry(FileKind kind, const TGenericRegistryKey& container,
   return entry;
 }
 
+/// \param projection has what does not depend on the message
 template <class Message>
-void FillProjection(const Message& message, const velta::Rtcm1024* grid, int typeCode,
-                    StoredProjection& projection, std::wstring& name) {
-  name = velta::ProjectionEntryName(message, grid);
-  projection.type = velta::FindProjectionType(typeCode)->name;
-  int index = 0;
-  for (const double parameter : velta::ParametersOf(message)) {
-    projection.parameters[index++] = parameter;
-  }
+void AddProjection(const Message& message, const velta::Rtcm1024* grid, std::uint32_t typeCode,
+                   StoredProjection projection, std::vector<ReceivedEntry>& entries) {
+  const velta::ProjectionType* const type = velta::FindProjectionType(static_cast<int>(typeCode));
+  if (!type) return;
+  projection.type = type->name;
+  const std::vector<double> parameters = velta::ParametersOf(message);
+  std::copy(parameters.begin(), parameters.end(), projection.parameters);
+  entries.push_back({message.messageType + 1000, velta::ProjectionEntryName(message, grid),
+                     Describe(projection)});
 }
 
 }  // namespace
 
 Entries ReadEntries(const std::string& file) {
   const FileKind kind = KindOf(file);
+  orx::ForgetFileError();
   const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, orx::kRegistryFlags);
   const TGenericRegistryKey container = velta::ContainerOf(tree);
   Entries found;
@@ -102,7 +107,8 @@ Entries ReadEntries(const std::string& file) {
     const TGenericRegistryKey entry(walk++);
     found.entries.push_back(ReadEntry(kind, container, entry));
   }
-  found.error = tree.GetErrorState();  // damage inside a key shows when it is looked into
+  // Damage inside a key shows when it is looked into.
+  found.error = ErrorStateText(tree.GetErrorState(), orx::KeptFileError());
   return found;
 }
 
@@ -116,19 +122,15 @@ const Entry* UsedFor(unsigned message, const Entries& found, const Position& pos
   return nullptr;
 }
 
-bool HoldsItsKind(const std::string& file) {
+bool HoldsOtherKind(const std::string& file) {
   const bool isDatum = KindOf(file) == FileKind::kDatum;
   const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, orx::kRegistryFlags);
   const TGenericRegistryKey container = velta::ContainerOf(tree);
-  bool hasOwn = false;
   for (orx::TGenRegKeyIterator walk(container); walk;) {
     const TGenericRegistryKey entry(walk++);
-    const bool hasDatum = entry.HasKey(layout::kStandardDatum);
-    const bool hasProjection = entry.HasKey(layout::kStandardProjection);
-    if (isDatum ? hasProjection : hasDatum) return false;
-    hasOwn = hasOwn || (isDatum ? hasDatum : hasProjection);
+    if (entry.HasKey(isDatum ? layout::kStandardProjection : layout::kStandardDatum)) return true;
   }
-  return hasOwn;
+  return false;
 }
 
 const velta::RtcmBasicTransformMessage& BasicMessage(const velta::MsgUtilized& set) {
@@ -148,11 +150,10 @@ ReceivedEntry ReceivedDatum(const velta::MsgUtilized& set) {
   if (set.msg1022) velta::ConvertRotationPoint(*set.msg1022, datum);
   velta::ConvertValidityArea(message, datum);
   if (set.msg1023) velta::ConvertEllipsoidalGrid(*set.msg1023, datum.grid);
-  return {velta::DatumEntryName(message, set.msg1023), Describe(datum)};
+  return {message.messageType + 1000, velta::DatumEntryName(message, set.msg1023), Describe(datum)};
 }
 
-std::optional<ReceivedEntry> ReceivedProjection(const velta::MsgUtilized& set) {
-  if (!set.msg1025 && !set.msg1027) return std::nullopt;
+std::vector<ReceivedEntry> ReceivedProjections(const velta::MsgUtilized& set) {
   const velta::RtcmBasicTransformMessage& message = BasicMessage(set);
   DatumData datum;
   velta::ConvertEllipsoids(message, datum);
@@ -161,19 +162,17 @@ std::optional<ReceivedEntry> ReceivedProjection(const velta::MsgUtilized& set) {
   projection.axes[0] = datum.targetEllipsoid.a;
   projection.axes[1] = datum.targetEllipsoid.second;
   if (set.msg1024) velta::ConvertPlaneGrid(projection.grid, *set.msg1024);
-  auto code =
-      static_cast<int>(set.msg1027 ? set.msg1027->projectionType : set.msg1025->projectionType);
-  const bool isRectified = set.msg1027 && set.msg1027->rectificationFlag;
-  if (code == velta::ProjectionData::OM && isRectified) code = velta::ProjectionData::ROM;
-  if (!velta::FindProjectionType(code)) return std::nullopt;
-  std::wstring name;
-  // Of two the library takes the 1025 first, and the 1027 has the last word.
-  if (set.msg1027) {
-    FillProjection(*set.msg1027, set.msg1024, code, projection, name);
-  } else {
-    FillProjection(*set.msg1025, set.msg1024, code, projection, name);
+  std::vector<ReceivedEntry> entries;
+  if (set.msg1025) {
+    AddProjection(*set.msg1025, set.msg1024, set.msg1025->projectionType, projection, entries);
   }
-  return ReceivedEntry{name, Describe(projection)};
+  if (set.msg1027) {
+    std::uint32_t code = set.msg1027->projectionType;
+    const bool isRectified = set.msg1027->rectificationFlag && code == velta::ProjectionData::OM;
+    if (isRectified) code = velta::ProjectionData::ROM;
+    AddProjection(*set.msg1027, set.msg1024, code, projection, entries);
+  }
+  return entries;
 }
 
 std::optional<Entry> FindEntry(const std::wstring& file, const std::wstring& name) {

@@ -25,8 +25,8 @@ struct Entry {
 
 /// What a file holds.
 struct Entries {
-  std::uint32_t error = 0;  ///< the file's error state
-  std::string name;         ///< of the container key: the datum's
+  std::string error;  ///< what is wrong with the file; empty when nothing is
+  std::string name;   ///< of the container key: the datum's
   std::vector<Entry> entries;
 };
 
@@ -46,21 +46,22 @@ struct Position {
 ///     library ends its search
 const Entry* UsedFor(unsigned message, const Entries& found, const Position& position);
 
-/// True when the file has entries of the kind that its extension says, and none of the other.
-bool HoldsItsKind(const std::string& file);
+/// True when a file has an entry of the other kind than its extension says.
+bool HoldsOtherKind(const std::string& file);
 
 /// The datum message of a set that has one.
 const orx::cs::velta::RtcmBasicTransformMessage& BasicMessage(
     const orx::cs::velta::MsgUtilized& set);
 
-/// Where a message set goes: the entries' names, and what would be stored.
+/// What a message set becomes: an entry's name, and what would be stored.
 struct ReceivedEntry {
+  unsigned message;  ///< number of the one that makes the entry
   std::wstring name;
   Description content;
 };
 ReceivedEntry ReceivedDatum(const orx::cs::velta::MsgUtilized& set);
-/// \return nothing when the set has no projection that the library takes
-std::optional<ReceivedEntry> ReceivedProjection(const orx::cs::velta::MsgUtilized& set);
+/// \return those that the library takes, in the order in which it does: of a 1025, of a 1027
+std::vector<ReceivedEntry> ReceivedProjections(const orx::cs::velta::MsgUtilized& set);
 
 /// Asks the tree of a file that the library shares for an entry.
 /// \param file whole name, by whose extension the kind is known

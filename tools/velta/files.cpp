@@ -12,6 +12,7 @@
 #include "command.h"
 #include "interrupt.h"
 #include "orxregistry/in_file_key.h"
+#include "orxutils/file_error.h"
 #include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
 #include "orxutils/path.h"
@@ -62,12 +63,28 @@ bool IsInput(const std::string& input, const fs::path& path) {
   return fs::equivalent(orx::ToSystemPath(ToPath(input)), path, ignored);
 }
 
+/// True when standard output goes into a file that is read.
+bool IsWrittenTo(const std::string& input) {
+  if (input == kStandardStream) return false;  // a terminal is both
+  std::error_code ignored;
+  const fs::path path = orx::ToSystemPath(ToPath(input));
+  return fs::is_regular_file(path, ignored) && orx::FileFuncs::isSameFile(stdout, path);
+}
+
+bool IsTerminal(const fs::path& path) {
+  std::error_code ignored;
+  if (!fs::is_character_file(path, ignored)) return false;
+  const std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(
+      std::fopen(path.string().c_str(), "ab"), &std::fclose);
+  return file && orx::FileFuncs::isTerminal(file.get());
+}
+
 /// True for a file that is one, whatever its name, and for the name of one.
 bool IsRegistryFile(const std::string& name) {
   if (KindOf(name) != FileKind::kOther) return true;
   if (!orx::FileFuncs::isFileExists(ToWide(name))) return false;
   const std::uint32_t error =
-      orx::TInFileKey(ToWide(name), nullptr, nullptr, true, 0).GetErrorState();
+      orx::TInFileKey(ToWide(name), nullptr, nullptr, true, orx::kRegistryFlags).GetErrorState();
   return error == orx::kRegistryOk || error == orx::kDamaged;
 }
 
@@ -98,17 +115,21 @@ FileKind KindOf(const std::string& file) {
   constexpr std::size_t kExtension = 4;
   const std::size_t length = std::min(file.size(), kExtension);
   const std::wstring extension = orx::Widen(file.substr(file.size() - length));
-  if (orx::EqualsIgnoringCase(extension, orx::cs::velta::kDatumFileExtension))
-    return FileKind::kDatum;
-  if (orx::EqualsIgnoringCase(extension, orx::cs::velta::kProjectionFileExtension))
-    return FileKind::kProjection;
+  const auto is = [&](const wchar_t* known) { return orx::EqualsIgnoringCase(extension, known); };
+  if (is(orx::cs::velta::kDatumFileExtension)) return FileKind::kDatum;
+  if (is(orx::cs::velta::kProjectionFileExtension)) return FileKind::kProjection;
   return FileKind::kOther;
 }
 
 void RequireFile(const std::string& file) {
-  if (!orx::FileFuncs::isFileExists(ToWide(file))) {
+  std::error_code error;
+  const fs::file_status status = fs::status(orx::ToSystemPath(ToPath(file)), error);
+  if (status.type() == fs::file_type::not_found) {
     throw std::runtime_error(file + ": there is no such file");
   }
+  if (error) throw std::runtime_error(file + ": cannot be read: " + error.message());
+  if (fs::is_directory(status)) throw std::runtime_error(file + ": is a directory");
+  if (!fs::is_regular_file(status)) throw std::runtime_error(file + ": is no regular file");
 }
 
 const CLI::Validator kFileName(
@@ -126,7 +147,8 @@ Input::Input(const std::string& name) : memory_(kInputBuffer) {
     return;
   }
   const fs::path path = ToPath(name);
-  if (fs::is_directory(path)) throw std::runtime_error(name + ": is a directory");
+  std::error_code ignored;  // opening it tells
+  if (fs::is_directory(path, ignored)) throw std::runtime_error(name + ": is a directory");
   file_.pubsetbuf(memory_.data(), static_cast<std::streamsize>(memory_.size()));
   const WaitingForInput waiting;  // for whoever writes into a pipe of that name
   if (!file_.open(orx::ToSystemPath(path), std::ios::in | std::ios::binary)) {
@@ -137,20 +159,28 @@ Input::Input(const std::string& name) : memory_(kInputBuffer) {
 
 Output::Output(const std::string& name, OutputKind kind, const std::vector<std::string>& inputs)
     : name_(name), kind_(kind), buffer_(std::cout.rdbuf()) {
-  if (name == kStandardStream) {
-    const bool isTerminal = orx::FileFuncs::isTerminal(stdout);
-    if (isTerminal && kind == OutputKind::kFrames) {
-      throw WrongCall("frames are not written to a terminal: name a file with -o, or use a pipe");
-    }
-    return;
+  const bool isStandard = name == kStandardStream;
+  const fs::path path = isStandard ? fs::path() : orx::ToSystemPath(ToPath(name));
+  RefuseInputs(inputs, path);
+  const bool isTerminal = isStandard ? orx::FileFuncs::isTerminal(stdout) : IsTerminal(path);
+  if (isTerminal && kind == OutputKind::kFrames) {
+    throw WrongCall("frames are not written to a terminal: name a file with -o, or use a pipe");
   }
-  const fs::path path = orx::ToSystemPath(ToPath(name));
-  for (const std::string& input : inputs) {
-    if (IsInput(input, path)) throw WrongCall(name + ": is the input, too");
-  }
+  if (isStandard) return;
   if (IsRegistryFile(name)) throw WrongCall(name + ": a datum or projection file is not replaced");
   Open(path);
   buffer_ = &file_;
+}
+
+/// \param path empty for standard output
+void Output::RefuseInputs(const std::vector<std::string>& inputs, const fs::path& path) {
+  for (const std::string& input : inputs) {
+    if (input.empty()) continue;
+    const bool isWritten = path.empty() ? IsWrittenTo(input) : IsInput(input, path);
+    if (!isWritten) continue;
+    throw WrongCall((path.empty() ? input + ": is standard output" : name_ + ": is the input") +
+                    ", too");
+  }
 }
 
 void Output::Open(const fs::path& path) {
@@ -160,8 +190,8 @@ void Output::Open(const fs::path& path) {
   if (!fs::exists(status) || fs::is_regular_file(status)) {
     place_ = fs::exists(status) ? fs::canonical(path) : path;
     do {
-      beside_ = place_;
-      beside_ += "." + std::to_string(std::random_device()()) + ".part";
+      beside_ =
+          place_.parent_path() / ("velta." + std::to_string(std::random_device()()) + ".part");
     } while (fs::exists(beside_, error));
     opened = beside_;
   }
@@ -209,19 +239,26 @@ void Output::Fail() {
   throw FileError(name_ == kStandardStream ? "standard output" : name_, "cannot be written");
 }
 
-bool ReportErrorState(const std::string& file, std::uint32_t error) {
-  if (error == orx::kRegistryOk) return false;
-  const char* text = "damaged; shown is what could be read";
-  if (error == orx::kCannotBeOpened) text = "cannot be opened";
-  if (error == orx::kNotARegistryFile) text = "not a registry file";
-  ReportFailure(file + ": error state " + std::to_string(error) + ": " + text);
-  return true;
+std::string ErrorStateText(std::uint32_t error, const std::string& reason) {
+  const std::string state = "error state " + std::to_string(error) + ": ";
+  switch (error) {
+    case orx::kRegistryOk:
+      return "";
+    case orx::kCannotBeOpened:
+      return state + "cannot be opened" + (reason.empty() ? "" : ": " + reason);
+    case orx::kNotARegistryFile:
+      return state + "not a registry file";
+    default:
+      return state + "damaged";
+  }
 }
 
-bool ReportErrorState(const std::string& file) {
+FileState StateOf(const std::string& file) {
+  orx::ForgetFileError();
   const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, orx::kRegistryFlags);
   orx::cs::velta::LookInto(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)));
-  return ReportErrorState(file, tree.GetErrorState());
+  const std::uint32_t error = tree.GetErrorState();
+  return {error, ErrorStateText(error, orx::KeptFileError())};
 }
 
 }  // namespace velta_tool

@@ -26,7 +26,7 @@ std::string ToName(const std::filesystem::path& path);
 enum class FileKind { kDatum, kProjection, kOther };
 FileKind KindOf(const std::string& file);
 
-/// \throws std::runtime_error when there is no such file
+/// \throws std::runtime_error that says why the file is none that can be read
 void RequireFile(const std::string& file);
 
 /// What nobody should have asked for: it is refused before anything is done.
@@ -66,10 +66,12 @@ enum class OutputKind { kText, kFrames };
 class Output {
  public:
   /// Standard output, for text.
-  Output() : Output("-", OutputKind::kText, {}) {}
-
   /// \param inputs the names of the files that are read meanwhile
-  /// \throws WrongCall for frames to a terminal, for an input's or a registry file's name
+  explicit Output(const std::vector<std::string>& inputs)
+      : Output("-", OutputKind::kText, inputs) {}
+
+  /// \param inputs as above
+  /// \throws WrongCall for frames to a terminal, for an input, and for a registry file's name
   /// \throws std::runtime_error when the file cannot be made
   Output(const std::string& name, OutputKind kind, const std::vector<std::string>& inputs);
   Output(const Output&) = delete;
@@ -92,6 +94,7 @@ class Output {
   void Discard();
 
  private:
+  void RefuseInputs(const std::vector<std::string>& inputs, const std::filesystem::path& path);
   void Open(const std::filesystem::path& path);
   [[noreturn]] void Fail();
 
@@ -104,13 +107,20 @@ class Output {
   std::string pending_;
 };
 
-/// Says on standard error what is wrong with a registry file.
+/// What is wrong with a registry file, for people.
 /// \param error its error state
-/// \return false when nothing is
-bool ReportErrorState(const std::string& file, std::uint32_t error);
+/// \param reason what the system said; may be empty
+/// \return empty when nothing is
+std::string ErrorStateText(std::uint32_t error, const std::string& reason);
 
-/// As above, for a file that the library reads without telling its state: the whole is read, also
-/// what the library does not use.
-bool ReportErrorState(const std::string& file);
+/// The state of a registry file.
+struct FileState {
+  std::uint32_t error = 0;
+  std::string text;  ///< empty when nothing is wrong
+};
+
+/// The state of a file that the library reads without telling it: the whole is read, also what the
+/// library does not use.
+FileState StateOf(const std::string& file);
 
 }  // namespace velta_tool

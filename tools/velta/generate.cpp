@@ -21,6 +21,7 @@
 #include "description.h"
 #include "entries.h"
 #include "files.h"
+#include "orxregistry/in_file_key.h"
 #include "rtcm3/codec.h"
 #include "rtcm3/json_lines.h"
 #include "rtcm3/message.h"
@@ -93,8 +94,10 @@ std::string NearestAreas(const std::string& file, std::string_view key, double n
     for (const Property& property : *entry.content) {
       if (property.key != key || property.value.is_null()) continue;
       const auto edge = [&](const char* name) { return property.value.at(name).get<double>(); };
-      const double distance = std::hypot(Outside(north, edge("south"), edge("north")),
-                                         Outside(east, edge("west"), edge("east"), period));
+      const double shrinking = period > 0 ? std::cos(north / kDegreesPerRadian) : 1;
+      const double distance =
+          std::hypot(Outside(north, edge("south"), edge("north")),
+                     Outside(east, edge("west"), edge("east"), period) * shrinking);
       areas.insert({distance, "south " + text(edge("south")) + ", north " + text(edge("north")) +
                                   ", west " + text(edge("west")) + ", east " + text(edge("east"))});
     }
@@ -110,31 +113,41 @@ std::string NearestAreas(const std::string& file, std::string_view key, double n
   return lines;
 }
 
+/// What is wrong with a file, in front of what follows from it.
+std::string Before(const std::string& damage) { return damage.empty() ? "" : damage + "; "; }
+
 /// Says that a datum file has no entry to use for the position. The library does not tell an area
 /// that is not there from an entry that it cannot use.
-std::runtime_error NoAreaError(const Options& options) {
+std::runtime_error NoAreaError(const Options& options, const std::string& damage) {
   const auto text = [&](double degrees) {
     return options.dms ? DegreesMinutesSeconds(degrees) : Decimal(degrees);
   };
   const double latitude = *options.latitude;
   const double longitude = *options.longitude;
-  return std::runtime_error(options.datum + ": no area holds latitude " + text(latitude) +
-                            ", longitude " + text(longitude) + (options.dms ? "" : " degrees") +
+  return std::runtime_error(options.datum + ": " + Before(damage) + "no area holds latitude " +
+                            text(latitude) + ", longitude " + text(longitude) +
+                            (options.dms ? "" : " degrees") +
                             ", or an entry up to the one that does cannot be used" +
                             NearestAreas(options.datum, "area", latitude, longitude, 360, text));
 }
 
-std::runtime_error NoPlaneGridError(const Options& options) {
+std::runtime_error NoPlaneGridError(const Options& options, const std::string& damage) {
   const double northing = *options.northing;
   const double easting = *options.easting;
   return std::runtime_error(
-      options.projection + ": no usable residual grid covers northing " + Decimal(northing) +
-      ", easting " + Decimal(easting) + " metres" +
+      options.projection + ": " + Before(damage) + "no usable residual grid covers northing " +
+      Decimal(northing) + ", easting " + Decimal(easting) + " metres" +
       NearestAreas(options.projection, "gridArea", northing, easting, 0, Decimal));
 }
 
 /// Says of which entry a message does not hold what is stored.
-std::runtime_error MisfitError(unsigned number, const Options& options, const char* reason) {
+std::runtime_error MisfitError(unsigned number, const Options& options, std::string reason) {
+  // What a double becomes that no integer can hold.
+  for (const char* const beyond : {", not -2147483648", ", not -9223372036854775808"}) {
+    if (reason.ends_with(beyond)) {
+      reason.replace(reason.rfind(','), reason.npos, ", and what is stored is beyond any");
+    }
+  }
   const Source source = SourceOf(number, options);
   const unsigned kind = number == 1022 ? 1021 : number == 1027 ? 1025 : number;
   const Entries found = ReadEntries(source.file);
@@ -142,6 +155,20 @@ std::runtime_error MisfitError(unsigned number, const Options& options, const ch
   return std::runtime_error(source.file + ": what is stored in " +
                             (entry ? Printable(entry->name) : "it") + " does not fit a " +
                             std::to_string(number) + ": " + reason);
+}
+
+/// What is wrong with a file of which a part can be read; empty when nothing is.
+/// \throws std::runtime_error when nothing of it can be read
+std::string DamageIn(const std::string& file) {
+  RequireFile(file);
+  const FileState state = StateOf(file);
+  const bool isReadable = state.error == orx::kRegistryOk || state.error == orx::kDamaged;
+  if (!isReadable) throw std::runtime_error(file + ": " + state.text);
+  return state.text;
+}
+
+void NoteDamage(const std::string& file, const std::string& damage) {
+  if (!damage.empty()) ReportNote(file + ": " + damage + ", behind what was used");
 }
 
 /// The messages for a position, in the order in which they are sent.
@@ -153,10 +180,9 @@ std::vector<Message> Generate(const Options& options) {
 
   if (!options.datum.empty()) {
     const auto [latitude, longitude] = SourceOf(1021, options).position;
-    RequireFile(options.datum);
-    ReportErrorState(options.datum);
+    const std::string damage = DamageIn(options.datum);
     const auto datum = generator.getRtcmDatumMessage(latitude, longitude, 0);
-    if (!datum) throw NoAreaError(options);
+    if (!datum) throw NoAreaError(options, damage);
     messages.push_back(rtcm3::FromRecord(*datum));
     if (const auto grid = generator.get1023(latitude, longitude, 0)) {
       messages.emplace_back(*grid);
@@ -164,20 +190,24 @@ std::vector<Message> Generate(const Options& options) {
     } else {
       ReportNote(options.datum + ": no usable residual grid covers the position, no 1023 sent");
     }
+    NoteDamage(options.datum, damage);
   }
   if (!options.projection.empty()) {
-    RequireFile(options.projection);
-    ReportErrorState(options.projection);
+    const std::string damage = DamageIn(options.projection);
     if (options.northing && options.easting) {
       const auto grid = generator.get1024(*options.northing, *options.easting, 0);
-      if (!grid) throw NoPlaneGridError(options);
+      if (!grid) throw NoPlaneGridError(options, damage);
       messages.emplace_back(*grid);
       announced |= AnnouncementBit(1024);
     }
     const auto projection = generator.getRtcmProjMessage();
-    if (!projection) throw std::runtime_error(options.projection + ": no usable projection in it");
+    if (!projection) {
+      throw std::runtime_error(options.projection + ": " + Before(damage) +
+                               "no usable projection in it");
+    }
     messages.push_back(rtcm3::FromRecord(*projection));
     announced |= AnnouncementBit(rtcm3::NumberOf(messages.back()));
+    NoteDamage(options.projection, damage);
   }
 
   std::visit(
@@ -194,15 +224,14 @@ int Run(const Options& options) {
   Output out(options.output, options.json ? OutputKind::kText : OutputKind::kFrames,
              {options.datum, options.projection});
   for (const Message& message : Generate(options)) {
-    if (options.json) {
-      rtcm3::AppendJsonLine(message, out.pending());
-      continue;
-    }
+    std::string frame;
     try {
-      rtcm3::Encode(message, out.pending());
+      rtcm3::Encode(message, frame);
     } catch (const rtcm3::FieldError& error) {
       throw MisfitError(rtcm3::NumberOf(message), options, error.what());
     }
+    options.json ? rtcm3::AppendJsonLine(message, out.pending())
+                 : static_cast<void>(out.pending() += frame);
   }
   out.Finish();
   return kDone;

@@ -23,6 +23,7 @@
 #include "ingest_report.h"
 #include "interrupt.h"
 #include "orxutils/file_error.h"
+#include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
 #include "orxutils/path.h"
 #include "rtcm3/message_reader.h"
@@ -64,6 +65,10 @@ std::unique_ptr<RTCMDataSupport> MakeSupport(const Options& options) {
                                            ToWide(ToName(projections / "")).c_str());
 }
 
+bool Contains(const std::vector<unsigned>& numbers, unsigned number) {
+  return std::find(numbers.begin(), numbers.end(), number) != numbers.end();
+}
+
 /// Those of the numbers that a set has.
 std::vector<unsigned> Held(const rtcm3::MessageSet& set, std::initializer_list<unsigned> numbers) {
   std::vector<unsigned> held;
@@ -88,6 +93,7 @@ class Ingestion {
       : fresh_(MakeSupport(options)),
         support_(MakeSupport(options)),
         sets_([this](const rtcm3::MessageSet& set) { return Ingest(set); }),
+        out_(options.files),
         report_(options.json, out_) {}
 
   void Read(const std::string& file) {
@@ -119,8 +125,9 @@ class Ingestion {
                  std::to_string(counts.givenUp));
     }
     if (counts.dropped > 0) {
-      Fail("messages dropped, as the rest of their set did not come: " +
-           std::to_string(counts.dropped));
+      const std::string text = "messages dropped, as the rest of their set did not come: " +
+                               std::to_string(counts.dropped);
+      totals_.ingested > 0 ? ReportNote(text) : Fail(text);
     }
     if (totals_.stream.shortMessages > 0) {
       Fail(std::to_string(totals_.stream.shortMessages) + " messages end before their last field");
@@ -176,10 +183,15 @@ class Ingestion {
     const std::wstring datumName = CleanDatumName(BasicMessage(records).targetName);
     const std::vector<Place> places =
         datumName.empty() ? std::vector<Place>() : PlacesOf(records, datumName);
-    orx::ForgetFileError();
-    const ResultCode result =
-        datumName.empty() ? orx::cs::velta::kNoDatumName : support_->ParseRTCMMEssages(records);
-    const std::string reason = orx::KeptFileError();
+    std::string reason = OtherKindAt(places);
+    ResultCode result = orx::cs::velta::kDatumFileTrouble;
+    if (datumName.empty()) {
+      result = orx::cs::velta::kNoDatumName;
+    } else if (reason.empty()) {
+      orx::ForgetFileError();
+      result = support_->ParseRTCMMEssages(records);
+      reason = orx::KeptFileError();
+    }
 
     const std::uint32_t systemId = rtcm3::SystemIdOf(*set.FindDatum());
     IngestedSet ingested{systemId, result, PartsOf(set, places), ChangedFields(set),
@@ -216,17 +228,30 @@ class Ingestion {
     if (std::exchange(results_[set.systemId], set.result) == set.result) return false;
     if (set.IsDone()) return false;
     std::string text = "system " + std::to_string(set.systemId) + ": ";
-    if (IsOfTheFiles(set.result)) {
-      for (std::size_t i = 0; i < places.size(); ++i) {
-        if (set.parts[i].isThere) continue;
-        text += orx::ToUtf8(places[i].file) + ": ";
-        break;
-      }
+    std::string state;
+    for (std::size_t i = 0; IsOfTheFiles(set.result) && i < places.size(); ++i) {
+      if (FindEntry(places[i].file, places[i].entry.name)) continue;
+      const std::string file = orx::ToUtf8(places[i].file);
+      text += file + ": ";
+      if (orx::FileFuncs::isFileExists(places[i].file)) state = StateOf(file).text;
+      break;
     }
     text += Meaning(set.result);
     if (IsOfTheFiles(set.result) && !reason.empty()) text += ": " + reason;
+    if (!state.empty()) text += ": " + state;
     Fail(text);
     return true;
+  }
+
+  /// What is wrong with the files of a set when one of them holds entries of the other kind; looked
+  /// up once for each.
+  std::string OtherKindAt(const std::vector<Place>& places) {
+    for (const Place& place : places) {
+      const auto [known, isNew] = holdsOtherKind_.try_emplace(place.file, false);
+      if (isNew) known->second = HoldsOtherKind(orx::ToUtf8(place.file));
+      if (known->second) return orx::ToUtf8(place.file) + " holds entries of the other kind";
+    }
+    return "";
   }
 
   /// Says, once, how the received values come into a file that has others.
@@ -271,14 +296,18 @@ class Ingestion {
   std::vector<Place> PlacesOf(const MsgUtilized& records, const std::wstring& datumName) {
     std::vector<Place> places;
     const auto add = [&places](const std::wstring& file, ReceivedEntry entry) {
-      const bool isThere = FindEntry(file, entry.name).has_value();
+      // Of two messages with one entry the first makes it.
+      const bool isThere = FindEntry(file, entry.name).has_value() ||
+                           std::any_of(places.begin(), places.end(), [&](const Place& place) {
+                             return place.file == file && place.entry.name == entry.name;
+                           });
       places.push_back({file, std::move(entry), isThere});
     };
     add(support_->GetDatumPath() + datumName + orx::cs::velta::kDatumFileExtension,
         ReceivedDatum(records));
-    if (std::optional<ReceivedEntry> projection = ReceivedProjection(records)) {
+    for (ReceivedEntry& projection : ReceivedProjections(records)) {
       add(support_->GetProjectionPath() + datumName + orx::cs::velta::kProjectionFileExtension,
-          *std::move(projection));
+          std::move(projection));
     }
     return places;
   }
@@ -286,14 +315,15 @@ class Ingestion {
   /// What became of a set at its places, asked of the files.
   std::vector<IngestedPart> PartsOf(const rtcm3::MessageSet& set,
                                     const std::vector<Place>& places) {
-    std::vector<IngestedPart> parts(1);
-    parts[0].messages = Held(set, {1021, 1022, 1023});
-    if (set.Find(1025) || set.Find(1027)) {
-      parts.emplace_back().messages = Held(set, {1024, 1025, 1027});
+    std::vector<IngestedPart> parts;
+    parts.emplace_back().messages = Held(set, {1021, 1022, 1023});
+    for (const unsigned projection : {1025U, 1027U}) {
+      if (set.Find(projection)) parts.emplace_back().messages = Held(set, {1024, projection});
     }
-    for (std::size_t i = 0; i < places.size(); ++i) {
-      IngestedPart& part = parts[i];
-      const auto& [file, received, wasThere] = places[i];
+    for (const auto& [file, received, wasThere] : places) {
+      IngestedPart& part = *std::find_if(parts.begin(), parts.end(), [&](const auto& candidate) {
+        return Contains(candidate.messages, received.message);
+      });
       part.file = ToName(ToPath(orx::ToUtf8(file)).filename());
       const std::optional<Entry> stored = FindEntry(file, received.name);
       part.isThere = stored.has_value();
@@ -357,6 +387,7 @@ class Ingestion {
   /// What files have otherwise than received, by file and entry.
   std::map<std::pair<std::wstring, std::wstring>, std::vector<std::string>> toldDifferences_;
   std::map<std::wstring, std::set<std::string>, orx::NameOrder> receivedNames_;  ///< by file
+  std::map<std::wstring, bool> holdsOtherKind_;                                  ///< by file
   bool isWayNamed_ = false;
   std::map<DatumArea, rtcm3::Message> datums_;          ///< as they came last
   std::map<std::uint32_t, ResultCode> results_;         ///< of each system's last set

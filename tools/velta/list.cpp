@@ -77,14 +77,20 @@ void ReportIncomplete(const std::string& file, const Entries& found) {
   ReportNote(file + ": incomplete entries: " + std::to_string(count) + ": " + names);
 }
 
-void Print(const std::vector<Description>& entries, const Options& options, Output& out) {
+void Print(const std::string& file, const std::vector<Description>& entries, const Options& options,
+           Output& out) {
   if (!options.json && !options.full && entries.size() > 1) {
     out.pending() += ToSummary(entries);
     return;
   }
   for (const Description& entry : entries) {
-    if (!options.json && &entry != &entries.front()) out.pending() += '\n';
-    out.pending() += options.json ? ToJson(entry).dump() + '\n' : ToText(entry);
+    if (options.json) {
+      nlohmann::ordered_json json = {{"file", file}};
+      json.update(ToJson(entry));
+      out.pending() += json.dump() + '\n';
+    } else {
+      out.pending() += (&entry == &entries.front() ? "" : "\n") + ToText(entry);
+    }
     out.FlushMuch();
   }
 }
@@ -111,19 +117,21 @@ bool List(const std::string& file, const Options& options, Output& out) {
   if (!options.json && options.files.size() > 1) {
     out.pending() += (&file == &options.files.front() ? "" : "\n") + file + ":\n";
   }
-  Print(chosen, options, out);
+  Print(file, chosen, options, out);
   out.Flush();
-  const bool isDamaged = ReportErrorState(file, found.error);
+  if (!found.error.empty()) {
+    ReportFailure(file + ": " + found.error + "; shown is what could be read");
+  }
   ReportIncomplete(file, found);
   if (chosen.empty()) {
     ReportFailure(file + (options.position() ? ": no complete entry for the position in it"
                                              : ": no complete entry in it"));
   }
-  return !isDamaged && !chosen.empty();
+  return found.error.empty() && !chosen.empty();
 }
 
 int Run(const Options& options) {
-  Output out;
+  Output out(options.files);
   int status = kDone;
   for (const std::string& file : options.files) {
     try {
@@ -152,9 +160,10 @@ void AddList(CLI::App& program, Action& action) {
   command->footer(
       "Angles are in degrees, rotations and residuals of angles in arc-seconds, scale corrections\n"
       "in ppm, lengths in metres; rotations are in the coordinate-frame sense. Of several entries\n"
-      "it shows what they share, then a line for each. Projections are shown as they are stored.\n"
+      "it shows what most share, then a line for each. Projections are shown as they are stored.\n"
       "For a latitude and a longitude it shows the entries of datum files that hold the position,\n"
-      "and of which of them the messages are made.\n"
+      "and of which of them the messages are made; both may be written in degrees, minutes and\n"
+      "seconds, too: 52°00'30\"N, 52 00 30.\n"
       "\n"
       "Example:\n"
       "  velta ingest --dir out examples/streams/dhdn.rtcm3\n"

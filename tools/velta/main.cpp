@@ -3,6 +3,7 @@
 #include <cstdio>
 #include <exception>
 #include <iostream>
+#include <sstream>
 #include <string>
 #include <utility>
 #include <vector>
@@ -13,6 +14,7 @@
 #include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
 #include "suggestion.h"
+#include "terminal.h"
 
 namespace {
 
@@ -35,8 +37,8 @@ using namespace velta_tool;
 
 /// \throws WrongCall when the first word of the command line is no command
 void RequireCommand(const CLI::App& program, const std::string& word) {
-  if (word.empty() || word[0] == '-') return;
-  std::vector<std::string> commands = {"--help"};
+  std::vector<std::string> commands = {"--help", "--version"};
+  if (word == "-h" || word == commands[0] || word == commands[1]) return;
   for (const CLI::App* const command : program.get_subcommands({})) {
     if (command->get_name() == word) return;
     commands.push_back(command->get_name());
@@ -68,7 +70,12 @@ int Run(std::vector<std::string> arguments) {
     if (!arguments.empty()) arguments.pop_back();
     program.parse(std::move(arguments));
   } catch (const CLI::ParseError& error) {
-    return program.exit(error) == 0 ? kDone : kWrongCall;
+    std::ostringstream out;
+    std::ostringstream err;
+    const int status = program.exit(error, out, err);
+    std::cout << out.str();
+    std::cerr << WithoutControls(err.str());  // names of files among it
+    return status == 0 ? kDone : kWrongCall;
   }
   return action();
 }

@@ -41,19 +41,35 @@ MergeCounts Count(const Entries& target, const Entries& source) {
   return counts;
 }
 
+/// \throws std::runtime_error when a file is damaged, or not of the kind that it is named for
+void RequireUsable(const std::string& file, const Entries& found) {
+  if (!found.error.empty()) throw std::runtime_error(file + ": " + found.error);
+  if (found.entries.empty() || HoldsOtherKind(file)) {
+    throw std::runtime_error(file + ": is named " +
+                             (KindOf(file) == FileKind::kDatum ? ".dff" : ".prj") +
+                             ", but has no entry of that kind, or some of the other");
+  }
+}
+
+/// Queries end at an incomplete entry, also for those behind it.
+/// \throws std::runtime_error that names one
+void RequireComplete(const std::string& file, const Entries& found) {
+  for (const Entry& entry : found.entries) {
+    if (entry.content) continue;
+    throw std::runtime_error(file + ": its entry " + Printable(entry.name) +
+                             " is incomplete, and would end the queries of the target");
+  }
+}
+
 int Run(const Merge& merge) {
+  Output out({merge.target, merge.source});
   RequireFile(merge.target);
   RequireFile(merge.source);
   const Entries source = ReadEntries(merge.source);
   const Entries before = ReadEntries(merge.target);
-  for (const std::string& file : {merge.target, merge.source}) {
-    if (ReportErrorState(file)) return kFailed;
-    if (!HoldsItsKind(file)) {
-      ReportFailure(file + ": is named " + (KindOf(file) == FileKind::kDatum ? ".dff" : ".prj") +
-                    ", but has no entry of that kind, or some of the other");
-      return kFailed;
-    }
-  }
+  RequireUsable(merge.target, before);
+  RequireUsable(merge.source, source);
+  RequireComplete(merge.source, source);
   const std::wstring target = ToWide(merge.target);
   const std::wstring from = ToWide(merge.source);
   orx::ForgetFileError();
@@ -63,7 +79,6 @@ int Run(const Merge& merge) {
   const std::string reason = orx::KeptFileError();
   const bool isDone = result == orx::cs::velta::kSuccess;
   const MergeCounts counts = isDone ? Count(before, source) : MergeCounts();
-  Output out;
   if (merge.json) {
     const nlohmann::ordered_json line = {{"target", merge.target},
                                          {"source", merge.source},
@@ -81,7 +96,8 @@ int Run(const Merge& merge) {
                   (reason.empty() ? "" : ": " + reason));
     return kFailed;
   }
-  if (source.name != before.name) {
+  const bool isDatum = KindOf(merge.target) == FileKind::kDatum;
+  if (isDatum && source.name != before.name) {
     ReportNote(merge.source + ": its entries, of " + Printable(source.name) +
                ", are now entries of " + Printable(before.name));
   }

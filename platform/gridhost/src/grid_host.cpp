@@ -38,15 +38,16 @@ class SharedFile : public orx::TCSInFileKey {
 /// The table of shared files. A name that no file has leaves nothing in it.
 class SharedFiles {
  public:
-  /// Counts a user, but not when there is no such file or an exception passes.
+  /// Counts a user, also of a file that has gone or cannot be read any more, as it is given back in
+  /// any case; not when there is no such file or an exception passes.
   std::int32_t Get(const wchar_t* name, orx::TCSInFileKey** file) {
     *file = nullptr;
     SharedFile* const shared = Find(name);
     if (!shared) return kNoFile;
     const boost::unique_lock<boost::recursive_mutex> lock(shared->GetMutex());
     shared->Refresh(IsInUse(*shared));
-    if (shared->GetErrorState() == orx::kCannotBeOpened) return kNoFile;
     AddUser(name, *shared);
+    if (shared->GetErrorState() == orx::kCannotBeOpened) return kNoFile;
     *file = shared;
     return kSuccess;
   }

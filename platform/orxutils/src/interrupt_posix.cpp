@@ -9,7 +9,7 @@ namespace orx {
 void OnInterrupt(std::function<void()> work) {
   sigset_t awaited;
   sigemptyset(&awaited);
-  for (const int signal : {SIGINT, SIGTERM}) {
+  for (const int signal : {SIGINT, SIGTERM, SIGHUP}) {
     struct sigaction action = {};
     sigaction(signal, nullptr, &action);
     if (action.sa_handler != SIG_IGN) sigaddset(&awaited, signal);

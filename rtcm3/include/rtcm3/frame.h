@@ -17,6 +17,7 @@ namespace orx::cs::velta::rtcm3 {
 inline constexpr std::size_t kMaxPayload = 1023;
 
 /// Appends a frame around a payload of at most kMaxPayload bytes.
+/// \throws std::length_error for a longer one
 VELTA_RTCM3_EXPORT void AppendFrame(std::string_view payload, std::string& out);
 
 /// What a stream held so far.
@@ -25,12 +26,13 @@ struct FrameCounts {
   std::uint64_t frames = 0;        ///< whole, with the right checksum
   std::uint64_t skippedBytes = 0;  ///< outside those frames
   std::uint64_t badCrcs = 0;       ///< places that looked like a frame but for the checksum
-  /// What is worth telling of, with its place, up to the first kMostRemarks of a stream: where
-  /// bytes were passed over and why, and what messages lack.
+  /// What is worth telling of, with its place: where bytes were passed over and why, which of the
+  /// messages are too short, each up to the first kMostRemarks of a stream; and what is unusual
+  /// about the messages of a system.
   std::vector<std::string> remarks;
 };
 
-inline constexpr std::size_t kMostRemarks = 10;  ///< of a stream
+inline constexpr std::size_t kMostRemarks = 10;  ///< of one kind, of a stream
 
 /// Finds the frames in a stream of bytes. After a place that fails, the search goes on one byte
 /// behind its first.
@@ -68,9 +70,9 @@ class FrameReader {
   std::vector<std::uint8_t> buffer_;
   std::size_t begin_ = 0;
   std::size_t end_ = 0;
-  std::uint64_t bytesBefore_;  ///< counted before this stream
-  std::uint64_t frameAt_ = 0;  ///< place of the last frame in the stream
-  std::size_t remarksLeft_ = kMostRemarks;
+  std::uint64_t bytesBefore_;    ///< counted before this stream
+  std::uint64_t frameAt_ = 0;    ///< place of the last frame in the stream
+  std::size_t skipRemarks_ = 0;  ///< on what was passed over
   std::uint64_t skippedAt_ = 0;  ///< place, bytes and bad checksums of the run being skipped
   std::uint64_t skipped_ = 0;
   std::uint64_t skippedCrcs_ = 0;

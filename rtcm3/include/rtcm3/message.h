@@ -31,7 +31,8 @@ VELTA_RTCM3_EXPORT bool Reset(Message& message, std::uint64_t number);
 
 /// The message that a record stands for, told by its `messageType`; a 1021 may be a plain
 /// RtcmBasicTransformMessage. What RTCMGenerator answers becomes a message so.
-/// \throws std::invalid_argument for a type that is none of 21 to 25 and 27
+/// \throws std::invalid_argument for a type that is none of 21 to 25 and 27, and for a record that
+///     is not of the class that its type says
 VELTA_RTCM3_EXPORT Message FromRecord(const RtcmMessage& record);
 
 /// The names of the fields in which two messages differ, in the order in which they travel;

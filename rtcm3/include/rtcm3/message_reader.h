@@ -43,6 +43,8 @@ class MessageReader {
 
   void RemarkOnce(Said& said, const char* what);
 
+  std::size_t shortRemarks_ = 0;  ///< on messages that are too short
+
   FrameReader frames_;
   StreamCounts& counts_;
   Message message_;

@@ -18,8 +18,7 @@ namespace orx::cs::velta::rtcm3 {
 /// A datum message and the messages that belong to it, all of one System Identification Number.
 class MessageSet {
  public:
-  /// \return the message of a number, 1021 to 1027, which lives as long as the set; null when it is
-  ///     not there
+  /// \return the message of a number, which lives as long as the set; null when it is not there
   VELTA_RTCM3_EXPORT const Message* Find(unsigned number) const;
 
   /// \return the 1021 or 1022; null when neither is there
