@@ -15,8 +15,8 @@
 namespace velta_test {
 
 /// Runs a program without a command interpreter, with its standard streams on files, and waits.
-/// \param arguments the program's path first; none has a blank, nor a backslash before a quotation
-///     mark
+/// \param arguments the program's path first; none has a backslash before a quotation mark, nor, if
+///     there is a blank in it, at its end
 /// \return its exit status, negative when it did not start or did not end by itself
 #ifdef _WIN32
 
@@ -25,12 +25,13 @@ inline int RunProgram(const std::vector<std::string>& arguments, const std::file
   std::wstring call;
   for (const std::string& argument : arguments) {
     const std::wstring wide = std::filesystem::u8path(argument).wstring();
-    call += wide.empty() ? L"\"\"" : L"";
+    const bool isQuoted = wide.empty() || wide.find(L' ') != wide.npos;
+    call += isQuoted ? L"\"" : L"";
     for (const wchar_t c : wide) {
       if (c == L'"') call += L'\\';
       call += c;
     }
-    call += L' ';
+    call += isQuoted ? L"\" " : L" ";
   }
   SECURITY_ATTRIBUTES inherited = {sizeof inherited, nullptr, TRUE};
   const auto open = [&inherited](const std::filesystem::path& path, DWORD access, DWORD how) {
