@@ -7,6 +7,8 @@
 namespace orx {
 namespace {
 
+using record::ValueRecord;
+
 constexpr std::size_t kMaxNameBytes = std::numeric_limits<std::uint16_t>::max() * sizeof(char16_t);
 
 bool IsSame(const record::Value& a, const record::Value& b) {
@@ -14,26 +16,21 @@ bool IsSame(const record::Value& a, const record::Value& b) {
          a.dataSize == b.dataSize && std::memcmp(a.data, b.data, a.dataSize) == 0;
 }
 
-void AppendRecord(record::Buffer& to, ValueRecord value) {
-  record::AppendBytes(to, {value, record::ValueRecordSize(record::ValueAt(value))});
-}
-
 }  // namespace
 
 record::Name NameOf(const TGenericRegistryKeyImp* key) { return key->name(); }
 
-bool VisitedValues::Visit(const TGenericRegistryKeyImp& key, const unsigned char* record) {
+bool VisitedValues::Visit(const TGenericRegistryKeyImp& key, record::KeyRecord record) {
   key_ = nullptr;
   count_ = 0;
   last_ = 0;
-  record::Bytes bytes = record::KeyAt(record).values;
+  record::Bytes bytes = record.values();
   while (!bytes.empty()) {
-    const ValueRecord start = bytes.data();
-    const std::optional<record::Value> value = record::TakeValue(bytes);
+    const ValueRecord value = record::TakeValue(bytes);
     if (!value || count_ == kMost) return false;
     const auto place = std::find_if(
-        values_, values_ + count_, [&](ValueRecord other) { return NameOf(other) == value->name; });
-    *place = start;  // of several of one name the last counts
+        values_, values_ + count_, [&](ValueRecord other) { return other.name() == value.name(); });
+    *place = value;  // of several of one name the last counts
     if (place == values_ + count_) ++count_;
   }
   key_ = &key;
@@ -42,10 +39,10 @@ bool VisitedValues::Visit(const TGenericRegistryKeyImp& key, const unsigned char
 
 ValueRecord VisitedValues::Find(LookupName& name) {
   for (std::size_t i = 0; i < count_; ++i) {
-    if (name == NameOf(values_[last_])) return values_[last_];
+    if (name == values_[last_].name()) return values_[last_];
     last_ = last_ + 1 == count_ ? 0 : last_ + 1;
   }
-  return nullptr;
+  return {};
 }
 
 KeyTree::KeyTree(std::u16string text)
@@ -59,29 +56,25 @@ KeyTree::KeyTree(FileContent content)
       file_(std::move(content.memory)),
       root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {
   for (record::Bytes segment : content.segments) {
-    const unsigned char* const start = segment.data();
-    if (!record::TakeKey(segment) || !segment.empty()) {
+    const record::KeyRecord root = record::TakeKey(segment);
+    if (!root || !segment.empty()) {
       error = kDamaged;
       return;
     }
-    AddLayer(*root_, start);
+    AddLayer(*root_, root);
   }
 }
 
-/// A copy in the tree's memory.
-const unsigned char* KeyTree::Keep(record::Bytes bytes) {
-  auto* const kept = static_cast<unsigned char*>(memory_.allocate(bytes.size(), 1));
-  std::copy(bytes.begin(), bytes.end(), kept);
-  return kept;
+/// For a record, in the tree's memory.
+unsigned char* KeyTree::Room(std::size_t bytes) {
+  return static_cast<unsigned char*>(memory_.allocate(bytes, 1));
 }
 
-const unsigned char* KeyTree::MakeRecord(const record::Name& name, std::uint8_t dimension) {
-  record::Buffer bytes;
-  record::KeyWriter(bytes, dimension, name).Close();
-  return Keep({bytes.data(), bytes.size()});
+record::KeyRecord KeyTree::MakeRecord(const record::Name& name, std::uint8_t dimension) {
+  return record::WriteEmptyKey(Room(record::EmptyKeySize(name)), dimension, name);
 }
 
-void KeyTree::AddLayer(Key& key, const unsigned char* record) {
+void KeyTree::AddLayer(Key& key, record::KeyRecord record) {
   auto* const layer = Make<Key::Layer>(Key::Layer{record, nullptr});
   (key.last_ ? key.last_ : &key.first_)->next = layer;
   key.last_ = layer;
@@ -94,15 +87,14 @@ NamedList<ValueRecord>& KeyTree::TakeValues(Key& key) {
   if (!key.values_) key.values_ = Make<NamedList<ValueRecord>>(&memory_);
   if (key.valuesAreWhole_) return *key.values_;
   for (const Key::Layer* layer = &key.first_; layer; layer = layer->next) {
-    record::Bytes bytes = record::KeyAt(layer->record).values;
+    record::Bytes bytes = layer->record.values();
     while (!bytes.empty()) {
-      const ValueRecord start = bytes.data();
-      const std::optional<record::Value> value = record::TakeValue(bytes);
+      const ValueRecord value = record::TakeValue(bytes);
       if (!value) {
         error = kDamaged;
         break;
       }
-      key.values_->Put(value->name, start);
+      key.values_->Put(value.name(), value);
     }
   }
   key.valuesAreWhole_ = true;
@@ -113,19 +105,19 @@ NamedList<KeyTree::Key*>& KeyTree::TakeKeys(Key& key) {
   if (!key.keys_) key.keys_ = Make<NamedList<Key*>>(&memory_);
   if (key.keysAreWhole_) return *key.keys_;
   for (const Key::Layer* layer = &key.first_; layer; layer = layer->next) {
-    record::Bytes bytes = record::KeyAt(layer->record).keys;
+    record::Bytes bytes = layer->record.keys();
     while (!bytes.empty()) {
-      const unsigned char* const start = bytes.data();
-      const std::optional<record::Key> found = record::TakeKey(bytes);
+      const record::KeyRecord found = record::TakeKey(bytes);
       if (!found || key.depth_ == record::kMaxDepth) {
         error = kDamaged;
         break;
       }
-      const std::size_t place = key.keys_->Find(found->name);
+      const record::Name name = found.name();
+      const std::size_t place = key.keys_->Find(name);
       if (place < key.keys_->items().size()) {
-        AddLayer(*key.keys_->items()[place], start);
+        AddLayer(*key.keys_->items()[place], found);
       } else {
-        key.keys_->Append(Make<Key>(*this, &key, start));
+        key.keys_->Append(Make<Key>(*this, &key, found));
       }
     }
   }
@@ -139,7 +131,7 @@ ValueRecord KeyTree::FindValue(Key& key, LookupName& name) {
   if (readWhereTheyLie) return visited_.Find(name);
   const auto& values = TakeValues(key);
   const std::size_t place = values.Find(name);
-  return place == values.items().size() ? nullptr : values.items()[place];
+  return place == values.items().size() ? ValueRecord() : values.items()[place];
 }
 
 KeyTree::Key* KeyTree::OpenKey(Key& key, const record::Name& name, std::uint8_t dimension) {
@@ -156,27 +148,21 @@ bool KeyTree::SetValue(Key& key, const record::Value& value) {
   NamedList<ValueRecord>& values = TakeValues(key);
   const std::size_t place = values.Find(value.name);
   const bool replaces = place < values.items().size();
-  const ValueRecord replaced = replaces ? values.items()[place] : nullptr;
-  if (replaces && IsSame(record::ValueAt(replaced), value)) return true;
+  const ValueRecord replaced = replaces ? values.items()[place] : ValueRecord();
+  if (replaces && IsSame(replaced.value(), value)) return true;
 
-  Unsaved& unsaved = MarkUnsaved(key);
-  record::Buffer bytes;
-  record::AppendValue(bytes, value);
-  const ValueRecord made = Keep({bytes.data(), bytes.size()});
-  unsavedBytes_ += bytes.size();
-  if (!replaces) {
-    unsaved.values.push_back(made);
-    values.Append(made);
-    return true;
-  }
-  const auto pending = std::find(unsaved.values.begin(), unsaved.values.end(), replaced);
-  if (pending != unsaved.values.end()) {
-    *pending = made;
+  PendingChanges::OfKey& pending = MarkUnsaved(key);
+  const std::size_t size = record::ValueRecordSize(value);
+  const ValueRecord made = record::WriteValue(Room(size), value);
+  if (replaces) {
+    if (pending.Add(place)) pending_.CountSuperseded(replaced.bytes().size());
+    values.Replace(place, made);
   } else {
-    unsaved.values.push_back(made);
-    superseded_ += record::ValueRecordSize(record::ValueAt(replaced));
+    pending.Reserve(place);
+    values.Append(made);
+    pending.Add(place);
   }
-  values.Replace(place, made);
+  pending_.CountBytes(size);
   return true;
 }
 
@@ -185,18 +171,17 @@ void KeyTree::DeepCopy(Key& to, Key& from) {
   KeyTree& source = *from.tree;
   if (&source != this && source.isAsLoaded_ && from.HasOneLayer() && to.IsBlank()) {
     // As a whole, and where it lies: this is how entries are copied when files are merged.
-    const unsigned char* const record = from.first_.record;
-    const std::size_t size = record::KeyRecordSize(record);
-    if (record::IsWhole({record, size}, record::kMaxDepth - to.depth_)) {
+    const record::KeyRecord record = from.first_.record;
+    if (record::IsWhole(record.bytes(), record::kMaxDepth - to.depth_)) {
       lenders_.insert(source.shared_from_this());
-      Unsaved& unsaved = MarkUnsaved(to);
+      PendingChanges::OfKey& pending = MarkUnsaved(to);
       AddLayer(to, record);
-      unsaved.copied = record;
-      unsavedBytes_ += size;
+      pending.copied = record;
+      pending_.CountBytes(record.bytes().size());
       return;
     }
   }
-  for (const ValueRecord value : source.Values(from)) SetValue(to, record::ValueAt(value));
+  for (const ValueRecord value : source.Values(from)) SetValue(to, value.value());
   // By their places, as a target inside the source adds keys to it meanwhile.
   for (std::size_t i = 0; i < source.Keys(from).size(); ++i) {
     Key* const key = source.Keys(from)[i];
@@ -204,52 +189,37 @@ void KeyTree::DeepCopy(Key& to, Key& from) {
   }
 }
 
-KeyTree::Unsaved& KeyTree::MarkUnsaved(Key& key) {
-  changed_ = true;
+PendingChanges::OfKey& KeyTree::MarkUnsaved(const Key& key) {
   isAsLoaded_ = false;
-  const auto [entry, isNew] = unsaved_.try_emplace(&key);
-  Unsaved& unsaved = entry->second;
-  if (isNew && key.parent) {
-    try {
-      MarkUnsaved(*key.parent).keys.push_back(&key);
-    } catch (...) {
-      unsaved_.erase(&key);  // nobody would come to it
-      throw;
-    }
-  }
-  return unsaved;
+  return pending_.Of(key);
 }
 
 void KeyTree::WriteUnsaved(record::Buffer& to) {
-  to.reserve(to.size() + unsavedBytes_);
+  to.reserve(to.size() + pending_.bytes());
   WriteUnsaved(to, *root_);
 }
 
 void KeyTree::WriteUnsaved(record::Buffer& to, const Key& key) {
   record::KeyWriter writer(to, key.dimension(), key.name());
-  const Unsaved& unsaved = unsaved_[&key];
-  const record::Key copied = unsaved.copied ? record::KeyAt(unsaved.copied) : record::Key();
-  record::AppendBytes(to, copied.values);
-  for (const ValueRecord value : unsaved.values) AppendRecord(to, value);
+  static const PendingChanges::OfKey kNothing;
+  const PendingChanges::OfKey* const found = pending_.Find(key);
+  const PendingChanges::OfKey& pending = found ? *found : kNothing;
+  if (pending.copied) record::AppendBytes(to, pending.copied.values());
+  for (const std::size_t place : pending.values) {
+    record::AppendBytes(to, key.values_->items()[place].bytes());
+  }
   writer.EndValues();
-  record::AppendBytes(to, copied.keys);
-  for (const Key* const sub : unsaved.keys) WriteUnsaved(to, *sub);
+  if (pending.copied) record::AppendBytes(to, pending.copied.keys());
+  for (const Key* const sub : pending.keys) WriteUnsaved(to, *sub);
   writer.Close();
 }
 
 void KeyTree::WriteAll(record::Buffer& to, Key& key) {
   record::KeyWriter writer(to, key.dimension(), key.name());
-  for (const ValueRecord value : Values(key)) AppendRecord(to, value);
+  for (const ValueRecord value : Values(key)) record::AppendBytes(to, value.bytes());
   writer.EndValues();
   for (Key* const sub : Keys(key)) WriteAll(to, *sub);
   writer.Close();
-}
-
-void KeyTree::MarkSaved() {
-  changed_ = false;
-  superseded_ = 0;
-  unsavedBytes_ = 0;
-  unsaved_.clear();
 }
 
 }  // namespace orx

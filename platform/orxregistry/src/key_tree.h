@@ -5,13 +5,13 @@
 #include <memory_resource>
 #include <set>
 #include <string>
-#include <unordered_map>
 #include <utility>
 #include <vector>
 
 #include "named_list.h"
 #include "orxregistry/in_file_key.h"
 #include "orxregistry/registry_key.h"
+#include "pending_changes.h"
 #include "record_format.h"
 #include "segment_file.h"
 
@@ -21,14 +21,14 @@ namespace orx {
 /// values are each taken apart when they are first needed.
 class TGenericRegistryKeyImp {
  public:
-  TGenericRegistryKeyImp(KeyTree& owner, TGenericRegistryKeyImp* above, const unsigned char* record)
+  TGenericRegistryKeyImp(KeyTree& owner, TGenericRegistryKeyImp* above, record::KeyRecord record)
       : tree(&owner),
         parent(above),
         first_{record, nullptr},
         depth_(static_cast<std::uint8_t>(above ? above->depth_ + 1 : 0)) {}
 
-  record::Name name() const { return record::KeyAt(first_.record).name; }
-  std::uint8_t dimension() const { return record::KeyAt(first_.record).dimension; }
+  record::Name name() const { return first_.record.name(); }
+  std::uint8_t dimension() const { return first_.record.dimension(); }
 
   KeyTree* const tree;
   TGenericRegistryKeyImp* const parent;  ///< null for the root
@@ -37,20 +37,20 @@ class TGenericRegistryKeyImp {
   friend class KeyTree;
 
   struct Layer {
-    const unsigned char* record;
+    record::KeyRecord record;
     Layer* next;
   };
 
   bool HasOneLayer() const { return !first_.next; }
   /// True when nobody has put anything into it or looked for anything in it.
   bool IsBlank() const {
-    const record::Key content = record::KeyAt(first_.record);
-    return HasOneLayer() && !values_ && !keys_ && content.values.empty() && content.keys.empty();
+    return HasOneLayer() && !values_ && !keys_ && first_.record.values().empty() &&
+           first_.record.keys().empty();
   }
 
   Layer first_;
   Layer* last_ = nullptr;  ///< null: the first is the last
-  NamedList<ValueRecord>* values_ = nullptr;
+  NamedList<record::ValueRecord>* values_ = nullptr;
   NamedList<TGenericRegistryKeyImp*>* keys_ = nullptr;
   const std::uint8_t depth_;
   bool valuesAreWhole_ = false;  ///< every layer's values are in `values_`
@@ -62,11 +62,11 @@ class TGenericRegistryKeyImp {
 class VisitedValues {
  public:
   /// \return false when the key has too many values, or damaged ones
-  bool Visit(const TGenericRegistryKeyImp& key, const unsigned char* record);
+  bool Visit(const TGenericRegistryKeyImp& key, record::KeyRecord record);
   bool IsAt(const TGenericRegistryKeyImp& key) const { return key_ == &key; }
   /// Looks at the value found last and those behind it first.
-  /// \return null when there is none of that name
-  ValueRecord Find(LookupName& name);
+  /// \return none when there is none of that name
+  record::ValueRecord Find(LookupName& name);
 
  private:
   static constexpr std::size_t kMost = 16;
@@ -74,11 +74,18 @@ class VisitedValues {
   const TGenericRegistryKeyImp* key_ = nullptr;
   std::size_t count_ = 0;
   std::size_t last_ = 0;
-  ValueRecord values_[kMost];
+  record::ValueRecord values_[kMost];
 };
 
 /// A tree of keys in memory, together with the bytes of the file that it came from. What changed
 /// since it was last saved is kept apart, so that saving costs what changed.
+///
+/// What always holds: A key is what its layers make when they are laid over one another in their
+/// order, and nothing is ever taken out of it. Records lie in the file's bytes, in `memory_`, or in
+/// the trees of `lenders_`, and stay there as long as the tree does. A list of values or of
+/// sub-keys is either not there, or growing while its layers are taken apart, or whole; only a
+/// whole one gets what is new, and the places in it do not move. Whatever is not in the file is
+/// pending, with all keys above it. A tree with an error is only read.
 class KeyTree : public std::enable_shared_from_this<KeyTree> {
  public:
   using Key = TGenericRegistryKeyImp;
@@ -91,7 +98,7 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   Key& root() { return *root_; }
   /// The sub-keys of a key, in their order.
   const std::pmr::vector<Key*>& Keys(Key& key) { return TakeKeys(key).items(); }
-  const std::pmr::vector<ValueRecord>& Values(Key& key) { return TakeValues(key).items(); }
+  const std::pmr::vector<record::ValueRecord>& Values(Key& key) { return TakeValues(key).items(); }
 
   /// \return null when there is none of that name
   template <class AnyName>
@@ -100,7 +107,7 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
     const std::size_t place = keys.Find(name);
     return place == keys.items().size() ? nullptr : keys.items()[place];
   }
-  ValueRecord FindValue(Key& key, LookupName& name);
+  record::ValueRecord FindValue(Key& key, LookupName& name);
 
   /// \return the sub-key of that name, made when missing; null when it would be too deep or its
   ///     name is too long
@@ -112,14 +119,14 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   void DeepCopy(Key& to, Key& from);
 
   /// True from the first change until MarkSaved().
-  bool has_unsaved() const { return changed_; }
+  bool has_unsaved() const { return pending_.any(); }
   /// Bytes of saved values that unsaved ones replace.
-  std::uint64_t superseded() const { return superseded_; }
+  std::uint64_t superseded() const { return pending_.superseded(); }
   /// Appends the record of the root with what is not saved.
   void WriteUnsaved(record::Buffer& to);
   /// Appends the record of the root with everything.
   void WriteAll(record::Buffer& to) { WriteAll(to, *root_); }
-  void MarkSaved();
+  void MarkSaved() { pending_.Clear(); }
   /// True when some of the tree lies in the memory of trees that it was copied from.
   bool HasBorrowed() const { return !lenders_.empty(); }
 
@@ -128,36 +135,27 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   FilePosition position;  ///< where the tree's file was last seen to end
 
  private:
-  struct Unsaved {
-    const unsigned char* copied = nullptr;  ///< a record that all of the key's content came from
-    std::vector<ValueRecord> values;
-    std::vector<Key*> keys;
-  };
-
   template <class T, class... Arguments>
   T* Make(Arguments&&... arguments) {
     return std::pmr::polymorphic_allocator<>(&memory_).new_object<T>(
         std::forward<Arguments>(arguments)...);
   }
-  const unsigned char* Keep(record::Bytes bytes);
-  const unsigned char* MakeRecord(const record::Name& name, std::uint8_t dimension);
-  void AddLayer(Key& key, const unsigned char* record);
-  NamedList<ValueRecord>& TakeValues(Key& key);
+  unsigned char* Room(std::size_t bytes);
+  record::KeyRecord MakeRecord(const record::Name& name, std::uint8_t dimension);
+  void AddLayer(Key& key, record::KeyRecord record);
+  NamedList<record::ValueRecord>& TakeValues(Key& key);
   NamedList<Key*>& TakeKeys(Key& key);
-  Unsaved& MarkUnsaved(Key& key);
+  PendingChanges::OfKey& MarkUnsaved(const Key& key);
   void WriteUnsaved(record::Buffer& to, const Key& key);
   void WriteAll(record::Buffer& to, Key& key);
 
   os::Memory file_;
-  std::set<std::shared_ptr<KeyTree>> lenders_;  ///< the trees in whose memory copied records lie
+  std::set<std::shared_ptr<KeyTree>> lenders_;  ///< trees in whose memory copied records lie
   std::pmr::monotonic_buffer_resource memory_;
   Key* root_;
   VisitedValues visited_;
   bool isAsLoaded_ = true;  ///< the layers of the keys are all there is
-  bool changed_ = false;
-  std::size_t unsavedBytes_ = 0;  ///< what WriteUnsaved() will write at least
-  std::uint64_t superseded_ = 0;
-  std::unordered_map<const Key*, Unsaved> unsaved_;
+  PendingChanges pending_;
 };
 
 }  // namespace orx

@@ -56,10 +56,7 @@ class LookupName {
 inline record::Name UnitsOf(const record::Name& name) { return name; }
 inline record::Name UnitsOf(LookupName& name) { return name.Units(); }
 
-/// A value in memory: its record, in the file's bytes or in the tree's memory.
-using ValueRecord = const unsigned char*;
-
-inline record::Name NameOf(ValueRecord value) { return record::ValueNameAt(value); }
+inline record::Name NameOf(record::ValueRecord value) { return value.name(); }
 record::Name NameOf(const TGenericRegistryKeyImp* key);
 
 /// Things with names, in the order in which they were added. Finding one does not get slower with

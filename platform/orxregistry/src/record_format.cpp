@@ -1,48 +1,56 @@
 #include "record_format.h"
 
+#include <algorithm>
 #include <random>
 
 #define XXH_INLINE_ALL
 #include <xxhash.h>
 
 namespace orx::record {
+
 std::size_t HashOf(const Name& name) {
   static const std::uint64_t seed = std::random_device()();
   return XXH3_64bits_withSeed(name.units, name.bytes, seed);
 }
 
+ValueRecord WriteValue(unsigned char* to, const Value& value) {
+  Store(to + kDataSizeAt, value.dataSize);
+  Store(to + kElementSizeAt, value.elementSize);
+  Store(to + kValueNameUnitsAt, static_cast<std::uint16_t>(value.name.bytes / kUnit));
+  to[kTypeAt] = static_cast<unsigned char>(value.type);
+  to[kValueDimensionAt] = value.dimension;
+  unsigned char* const data = std::copy_n(value.name.units, value.name.bytes, to + kValueHeader);
+  std::copy_n(value.data, value.dataSize, data);
+  return ValueRecord(to);
+}
+
+KeyRecord WriteEmptyKey(unsigned char* to, std::uint8_t dimension, const Name& name) {
+  Store(to + kValuesSizeAt, std::uint64_t{0});
+  Store(to + kKeysSizeAt, std::uint64_t{0});
+  Store(to + kKeyNameUnitsAt, static_cast<std::uint16_t>(name.bytes / kUnit));
+  to[kKeyDimensionAt] = dimension;
+  to[kKeyReservedAt] = 0;
+  std::copy_n(name.units, name.bytes, to + kKeyHeader);
+  return KeyRecord(to);
+}
+
 bool IsWhole(Bytes bytes, int depth) {
-  const std::optional<Key> key = TakeKey(bytes);
+  const KeyRecord key = TakeKey(bytes);
   if (!key || !bytes.empty() || depth < 0) return false;
-  for (Bytes values = key->values; !values.empty();) {
+  for (Bytes values = key.values(); !values.empty();) {
     if (!TakeValue(values)) return false;
   }
-  for (Bytes keys = key->keys; !keys.empty();) {
-    const Bytes all = keys;
-    if (!TakeKey(keys)) return false;
-    if (!IsWhole(all.substr(0, all.size() - keys.size()), depth - 1)) return false;
+  for (Bytes keys = key.keys(); !keys.empty();) {
+    const KeyRecord sub = TakeKey(keys);
+    if (!sub || !IsWhole(sub.bytes(), depth - 1)) return false;
   }
   return true;
 }
 
-void AppendValue(Buffer& to, const Value& value) {
-  Append(to, value.dataSize);
-  Append(to, value.elementSize);
-  Append(to, static_cast<std::uint16_t>(value.name.bytes / kUnit));
-  Append(to, static_cast<std::uint8_t>(value.type));
-  Append(to, value.dimension);
-  AppendBytes(to, {value.name.units, value.name.bytes});
-  AppendBytes(to, {value.data, value.dataSize});
-}
-
 KeyWriter::KeyWriter(Buffer& to, std::uint8_t dimension, const Name& name)
     : to_(to), start_(to.size()) {
-  Append(to, std::uint64_t{0});
-  Append(to, std::uint64_t{0});
-  Append(to, static_cast<std::uint16_t>(name.bytes / kUnit));
-  Append(to, dimension);
-  Append(to, std::uint8_t{0});
-  AppendBytes(to, {name.units, name.bytes});
+  to.resize(start_ + EmptyKeySize(name));
+  WriteEmptyKey(to.data() + start_, dimension, name);
   valuesStart_ = to.size();
   keysStart_ = to.size();
 }

@@ -66,14 +66,6 @@ struct Value {
   std::uint32_t dataSize = 0;
 };
 
-/// A key: its dimension, its name, its values and its sub-keys, still in bytes.
-struct Key {
-  std::uint8_t dimension = 0;
-  Name name;
-  Bytes values;
-  Bytes keys;
-};
-
 // Where the fields of a value's header are, and its size.
 inline constexpr std::size_t kDataSizeAt = 0;
 inline constexpr std::size_t kElementSizeAt = 4;
@@ -106,21 +98,50 @@ inline bool IsConsistent(const Value& value) {
   return value.dataSize == value.elementSize;
 }
 
-/// The name of a value whose record TakeValue has accepted.
-inline Name ValueNameAt(const unsigned char* record) {
-  return {record + kValueHeader, kUnit * Load<std::uint16_t>(record + kValueNameUnitsAt)};
-}
+/// The record of a whole value whose description and data agree; made only by those who have
+/// checked it or written it. It lies in a file's bytes or in a tree's memory.
+class ValueRecord {
+ public:
+  /// None.
+  ValueRecord() = default;
 
-/// The value whose record TakeValue has accepted.
-inline Value ValueAt(const unsigned char* record) {
+  explicit operator bool() const { return at_ != nullptr; }
+  Name name() const {
+    return {at_ + kValueHeader, kUnit * Load<std::uint16_t>(at_ + kValueNameUnitsAt)};
+  }
+  Value value() const;
+  Bytes bytes() const {
+    return {at_, kValueHeader + name().bytes + Load<std::uint32_t>(at_ + kDataSizeAt)};
+  }
+
+ private:
+  friend ValueRecord TakeValue(Bytes& bytes);
+  friend ValueRecord WriteValue(unsigned char* to, const Value& value);
+  explicit ValueRecord(const unsigned char* at) : at_(at) {}
+
+  const unsigned char* at_ = nullptr;
+};
+
+inline Value ValueRecord::value() const {
   Value value;
-  value.dataSize = Load<std::uint32_t>(record + kDataSizeAt);
-  value.elementSize = Load<std::uint32_t>(record + kElementSizeAt);
-  value.type = record[kTypeAt];
-  value.dimension = record[kValueDimensionAt];
-  value.name = ValueNameAt(record);
+  value.dataSize = Load<std::uint32_t>(at_ + kDataSizeAt);
+  value.elementSize = Load<std::uint32_t>(at_ + kElementSizeAt);
+  value.type = at_[kTypeAt];
+  value.dimension = at_[kValueDimensionAt];
+  value.name = name();
   value.data = value.name.units + value.name.bytes;
   return value;
+}
+
+/// Takes the value at the front of `bytes` off them; none when it is not a whole value.
+inline ValueRecord TakeValue(Bytes& bytes) {
+  if (bytes.size() < kValueHeader) return {};
+  const ValueRecord record(bytes.data());
+  const Value value = record.value();  // where it claims to be
+  const std::size_t size = kValueHeader + value.name.bytes + value.dataSize;
+  if (size > bytes.size() || !IsConsistent(value)) return {};
+  bytes.remove_prefix(size);
+  return record;
 }
 
 /// Bytes of the record of a value.
@@ -128,47 +149,57 @@ inline std::size_t ValueRecordSize(const Value& value) {
   return kValueHeader + value.name.bytes + value.dataSize;
 }
 
-/// Takes the value at the front of `bytes` off them; nothing when it is not a whole value.
-inline std::optional<Value> TakeValue(Bytes& bytes) {
-  if (bytes.size() < kValueHeader) return std::nullopt;
-  const Value value = ValueAt(bytes.data());
-  const std::size_t size = ValueRecordSize(value);
-  if (size > bytes.size() || !IsConsistent(value)) return std::nullopt;
-  bytes.remove_prefix(size);
-  return value;
-}
+/// \param to room for ValueRecordSize() bytes
+/// \param value one that IsConsistent()
+ValueRecord WriteValue(unsigned char* to, const Value& value);
 
-/// The key whose record TakeKey has accepted.
-inline Key KeyAt(const unsigned char* record) {
-  Key key;
-  key.dimension = record[kKeyDimensionAt];
-  key.name.units = record + kKeyHeader;
-  key.name.bytes = kUnit * Load<std::uint16_t>(record + kKeyNameUnitsAt);
-  const unsigned char* const values = key.name.units + key.name.bytes;
-  key.values = Bytes(values, Load<std::uint64_t>(record + kValuesSizeAt));
-  key.keys = Bytes(values + key.values.size(), Load<std::uint64_t>(record + kKeysSizeAt));
-  return key;
-}
+/// The record of a key whose values and sub-keys lie within it; made only by those who have checked
+/// that or written it. What the values and sub-keys are is not known yet.
+class KeyRecord {
+ public:
+  /// None.
+  KeyRecord() = default;
 
-/// Takes the key at the front of `bytes` off them; nothing when it is not a whole key.
-inline std::optional<Key> TakeKey(Bytes& bytes) {
-  if (bytes.size() < kKeyHeader) return std::nullopt;
-  const unsigned char* const record = bytes.data();
-  const std::size_t name = kUnit * Load<std::uint16_t>(record + kKeyNameUnitsAt);
-  if (record[kKeyReservedAt] != 0 || bytes.size() - kKeyHeader < name) return std::nullopt;
+  explicit operator bool() const { return at_ != nullptr; }
+  Name name() const {
+    return {at_ + kKeyHeader, kUnit * Load<std::uint16_t>(at_ + kKeyNameUnitsAt)};
+  }
+  std::uint8_t dimension() const { return at_[kKeyDimensionAt]; }
+  Bytes values() const {
+    return {at_ + kKeyHeader + name().bytes, Load<std::uint64_t>(at_ + kValuesSizeAt)};
+  }
+  Bytes keys() const {
+    return {values().data() + values().size(), Load<std::uint64_t>(at_ + kKeysSizeAt)};
+  }
+  Bytes bytes() const { return {at_, kKeyHeader + name().bytes + values().size() + keys().size()}; }
+
+ private:
+  friend KeyRecord TakeKey(Bytes& bytes);
+  friend KeyRecord WriteEmptyKey(unsigned char* to, std::uint8_t dimension, const Name& name);
+  explicit KeyRecord(const unsigned char* at) : at_(at) {}
+
+  const unsigned char* at_ = nullptr;
+};
+
+/// Takes the key at the front of `bytes` off them; none when it is not a whole key.
+inline KeyRecord TakeKey(Bytes& bytes) {
+  if (bytes.size() < kKeyHeader) return {};
+  const unsigned char* const at = bytes.data();
+  const std::size_t name = kUnit * Load<std::uint16_t>(at + kKeyNameUnitsAt);
+  if (at[kKeyReservedAt] != 0 || bytes.size() - kKeyHeader < name) return {};
   const std::size_t rest = bytes.size() - kKeyHeader - name;
-  const auto values = Load<std::uint64_t>(record + kValuesSizeAt);
-  const auto keys = Load<std::uint64_t>(record + kKeysSizeAt);
-  if (values > rest || keys > rest - values) return std::nullopt;
+  const auto values = Load<std::uint64_t>(at + kValuesSizeAt);
+  const auto keys = Load<std::uint64_t>(at + kKeysSizeAt);
+  if (values > rest || keys > rest - values) return {};
   bytes.remove_prefix(kKeyHeader + name + values + keys);
-  return KeyAt(record);
+  return KeyRecord(at);
 }
 
-/// Bytes of the record of a key that TakeKey has accepted.
-inline std::size_t KeyRecordSize(const unsigned char* record) {
-  const Key key = KeyAt(record);
-  return kKeyHeader + key.name.bytes + key.values.size() + key.keys.size();
-}
+/// Bytes of the record of a key without values and sub-keys.
+inline std::size_t EmptyKeySize(const Name& name) { return kKeyHeader + name.bytes; }
+
+/// \param to room for EmptyKeySize() bytes
+KeyRecord WriteEmptyKey(unsigned char* to, std::uint8_t dimension, const Name& name);
 
 /// True when the bytes are one key and so is everything in it, no more than `depth` levels deep.
 bool IsWhole(Bytes bytes, int depth);
@@ -176,8 +207,6 @@ bool IsWhole(Bytes bytes, int depth);
 inline void AppendBytes(Buffer& to, Bytes bytes) {
   to.insert(to.end(), bytes.begin(), bytes.end());
 }
-
-void AppendValue(Buffer& to, const Value& value);
 
 /// Writes a key around what is appended between construction and Close().
 class KeyWriter {

@@ -20,8 +20,8 @@ COrxStringT<wchar_t> ToWide(const record::Name& name) {
   return FromUtf16(text);
 }
 
-ValueRecord Find(const TGenericRegistryKeyImpPtr& key, std::wstring_view name) {
-  if (!key) return nullptr;
+record::ValueRecord Find(const TGenericRegistryKeyImpPtr& key, std::wstring_view name) {
+  if (!key) return {};
   LookupName sought(name);
   return key->tree->FindValue(*key, sought);
 }
@@ -75,25 +75,25 @@ int TGenericRegistryKey::AddValue(std::wstring_view name, const bin_value& value
 int TGenericRegistryKey::HasValue(std::wstring_view name) const { return Find(imp_, name) ? 1 : 0; }
 
 std::uint32_t TGenericRegistryKey::GetValueType(std::wstring_view name) const {
-  const ValueRecord found = Find(imp_, name);
-  return found ? record::ValueAt(found).type : std::uint32_t{kNoValue};
+  const record::ValueRecord found = Find(imp_, name);
+  return found ? found.value().type : std::uint32_t{kNoValue};
 }
 
 std::uint32_t TGenericRegistryKey::GetValueSize(std::wstring_view name) const {
-  const ValueRecord found = Find(imp_, name);
-  return found ? record::ValueAt(found).dataSize : 0;
+  const record::ValueRecord found = Find(imp_, name);
+  return found ? found.value().dataSize : 0;
 }
 
 std::uint8_t TGenericRegistryKey::GetValueDim(std::wstring_view name) const {
-  const ValueRecord found = Find(imp_, name);
-  return found ? record::ValueAt(found).dimension : std::uint8_t{0};
+  const record::ValueRecord found = Find(imp_, name);
+  return found ? found.value().dimension : std::uint8_t{0};
 }
 
 bool TGenericRegistryKey::GetValue(std::wstring_view name, bin_value& value, int index,
                                    bool copy) const {
-  const ValueRecord found = Find(imp_, name);
+  const record::ValueRecord found = Find(imp_, name);
   if (!found || index != 0) return false;
-  const record::Value stored = record::ValueAt(found);
+  const record::Value stored = found.value();
   const ValueDescriptor descriptor{stored.type, stored.elementSize, stored.dimension};
   return value.SetFromDescriptor(descriptor, stored.data, copy) == 0;
 }
@@ -101,7 +101,8 @@ bool TGenericRegistryKey::GetValue(std::wstring_view name, bin_value& value, int
 std::vector<COrxStringT<wchar_t>> TGenericRegistryKey::GetValueNames() const {
   std::vector<COrxStringT<wchar_t>> names;
   if (!imp_) return names;
-  for (const ValueRecord value : imp_->tree->Values(*imp_)) names.push_back(ToWide(NameOf(value)));
+  for (const record::ValueRecord value : imp_->tree->Values(*imp_))
+    names.push_back(ToWide(NameOf(value)));
   return names;
 }
 
@@ -118,9 +119,9 @@ TGenericRegistryKeyImpPtr TGenRegKeyIterator::operator++(int) {
 template <>
 COrxStringT<wchar_t> GetRegValue(const TGenericRegistryKey& key, std::wstring_view name,
                                  const COrxStringT<wchar_t>& fallback, int index) {
-  const ValueRecord found = index == 0 ? Find(key.imp_, name) : nullptr;
+  const record::ValueRecord found = index == 0 ? Find(key.imp_, name) : record::ValueRecord();
   if (!found) return fallback;
-  const record::Value stored = record::ValueAt(found);
+  const record::Value stored = found.value();
   if (stored.type != kWideString || stored.elementSize != 0) return fallback;
   std::size_t bytes = 0;
   while (record::Load<char16_t>(stored.data + bytes) != u'\0') bytes += sizeof(char16_t);

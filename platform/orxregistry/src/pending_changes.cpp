@@ -1,0 +1,45 @@
+#include "pending_changes.h"
+
+#include "key_tree.h"
+
+namespace orx {
+
+void PendingChanges::OfKey::Reserve(std::size_t value) {
+  if (value >= isPending.size()) isPending.resize(value + 1);
+  if (values.size() == values.capacity()) values.reserve(2 * values.size() + 1);
+}
+
+bool PendingChanges::OfKey::Add(std::size_t value) {
+  Reserve(value);
+  if (isPending[value]) return false;
+  values.push_back(value);
+  isPending[value] = true;
+  return true;
+}
+
+PendingChanges::OfKey& PendingChanges::Of(const Key& key) {
+  const auto [entry, isNew] = keys_.try_emplace(&key);
+  OfKey& pending = entry->second;
+  if (isNew && key.parent) {
+    try {
+      Of(*key.parent).keys.push_back(&key);
+    } catch (...) {
+      keys_.erase(&key);  // nobody would come to it
+      throw;
+    }
+  }
+  return pending;
+}
+
+const PendingChanges::OfKey* PendingChanges::Find(const Key& key) const {
+  const auto found = keys_.find(&key);
+  return found == keys_.end() ? nullptr : &found->second;
+}
+
+void PendingChanges::Clear() {
+  keys_.clear();
+  bytes_ = 0;
+  superseded_ = 0;
+}
+
+}  // namespace orx
