@@ -27,25 +27,30 @@ class ProgramTest : public testing::Test {
   /// \param input what standard input gives
   Outcome Run(const std::string& arguments, const std::string& input = "") {
     WriteBytes(directory_ / "stdin", input);
-    std::string named;
-    for (const char c : arguments) {
-      const std::string streams = EXAMPLE_STREAMS "/";
-      const std::string own = (directory_ / "").string();
-      named += c == '@' ? own : c == '%' ? streams : std::string(1, c);
-    }
     std::vector<std::string> call = {PROGRAM};
-    std::istringstream words(named);
+    std::istringstream words(arguments);
     for (std::string word; words >> word;) {
       std::string more;
-      while (word.ends_with('\\') && words.peek() == ' ' && words >> more) {
+      while (word.ends_with('\\') && words >> more) {
         word.back() = ' ';
         word += more;
       }
-      call.push_back(word == "''" ? "" : word);
+      call.push_back(word == "''" ? "" : Named(word));
     }
     const int status =
         RunProgram(call, directory_ / "stdin", directory_ / "stdout", directory_ / "stderr");
     return {status, ReadBytes(directory_ / "stdout"), ReadBytes(directory_ / "stderr")};
+  }
+
+  /// A word with the names of its files.
+  std::string Named(const std::string& word) const {
+    std::string named;
+    for (const char c : word) {
+      const std::string streams = EXAMPLE_STREAMS "/";
+      const std::string own = (directory_ / "").string();
+      named += c == '@' ? own : c == '%' ? streams : std::string(1, c);
+    }
+    return named;
   }
 
   TemporaryDirectory directory_;
