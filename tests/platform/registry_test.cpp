@@ -191,6 +191,21 @@ TEST(RegistryFile, ANewFileNeverReplacesOne) {
       << "nothing is left beside it";
 }
 
+TEST(RegistryFile, IsMadeBesideWhatIsInItsWay) {
+  namespace fs = std::filesystem;
+  const RegistryFile file;
+  const fs::path beside = file.directory / "tree.dff.new";
+  WriteBytes(beside, "what a stopped process left");
+  file.Create();
+  EXPECT_EQ(Describe(file.Load()), "(0 container(0 S_0(0 value=1:1:first)))");
+  EXPECT_FALSE(fs::exists(beside)) << "it is gone";
+  fs::remove(file.path);
+  fs::create_directory(beside);
+  file.Create("second");
+  EXPECT_EQ(Describe(file.Load()), "(0 container(0 S_0(0 value=1:1:second)))");
+  EXPECT_TRUE(fs::is_directory(beside)) << "it is somebody else's";
+}
+
 #ifdef _WIN32
 TEST(RegistryFile, ThatWasMovedAsideToBeReplacedIsPutBack) {
   const RegistryFile file;

@@ -1,8 +1,10 @@
 // Every file operation of a save fails, or is the last thing the process does, in turn.
 
 #include <dlfcn.h>
+#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <pthread.h>
+#include <sys/file.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -300,6 +302,32 @@ TEST_F(Retry, MergesTheEntryThatTheDiskDidNotTakeMeanwhile) {
   EXPECT_TRUE(fleet.Merge(fleet.directory + L"OTHER.dff"));
   EXPECT_FALSE(watched.work) << "it was done";
   EXPECT_TRUE(HoldsDatum(LoadTree(fleet.datums), 1));
+}
+
+TEST(Lock, IsAwaitedAndTold) {
+  Stage stage("tree.dff");
+  stage.Create();
+  int held = open(stage.path.c_str(), O_RDWR | O_CLOEXEC);
+  struct flock whole = {};
+  whole.l_type = F_WRLCK;
+  ASSERT_EQ(fcntl(held, F_OFD_SETLK, &whole), 0);
+  std::wstring told;
+  orx::OnAwaitedLock([&](const std::wstring& file) {
+    told = file;
+    close(std::exchange(held, -1));
+  });
+  EXPECT_TRUE(stage.Append(L"S_1", "later"));
+  orx::OnAwaitedLock({});
+  EXPECT_EQ(told, stage.path.wstring());
+}
+
+TEST(Lock, CannotBeHeldByWhoMayOnlyRead) {
+  Stage stage("tree.dff");
+  stage.Create();
+  const int reader = open(stage.path.c_str(), O_RDONLY | O_CLOEXEC);
+  ASSERT_EQ(flock(reader, LOCK_EX), 0);
+  EXPECT_TRUE(stage.Append(L"S_1", "at once"));
+  close(reader);
 }
 
 TEST(NextSave, MakesTheNameDurableThatSomebodyElseGave) {

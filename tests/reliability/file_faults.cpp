@@ -2,7 +2,6 @@
 
 #include <dlfcn.h>
 #include <fcntl.h>
-#include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -97,7 +96,14 @@ EXPORTED int open(const char* path, int flags, ...) {
 }
 EXPORTED int stat(const char* path, struct stat* to) noexcept { return PASS(stat, path, to); }
 EXPORTED int fstat(int file, struct stat* to) noexcept { return PASS(fstat, file, to); }
-EXPORTED int flock(int file, int how) noexcept { return PASS(flock, file, how); }
+EXPORTED int fcntl(int file, int command, ...) {
+  va_list arguments;
+  va_start(arguments, command);
+  void* const more = va_arg(arguments, void*);  // NOLINT(*-valist.Uninitialized): as above
+  va_end(arguments);
+  const auto real = REAL(fcntl);
+  return command == F_OFD_SETLK && FAILS ? -1 : real(file, command, more);
+}
 EXPORTED ssize_t pread(int file, void* to, size_t size, off_t offset) {
   if (const auto work = std::exchange(FileFaults::meanwhile, nullptr)) {
     const ssize_t half = REAL(pread)(file, to, size / 2, offset);

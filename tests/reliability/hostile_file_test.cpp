@@ -134,6 +134,25 @@ TEST_P(HostileFile, IsAnsweredInBoundedTimeAndMemory) {
   }
 }
 
+TEST(HostileMerge, OfManyValuesThatAreReplacedTakesTimeByTheirNumber) {
+  const auto make = [](const char* value) {
+    Key key{0, Units(u"many"), {}, {}};
+    for (int i = 0; i < 1'000'000; ++i) key.values.push_back({1, 1, 1, Number(i), value});
+    return FileOf(velta_fuzz::BytesOf(Key{0, "", {}, {key}}));
+  };
+  const RegistryFile target;
+  const RegistryFile source;
+  target.SetBytes(make("a"));
+  source.SetBytes(make("b"));
+  orx::TCSInFileKey tree = target.Load();
+  Open(RootOf(tree), L"many").DeepCopy(Open(RootOf(source.Load()), L"many"));
+  EXPECT_TRUE(tree.Save(false, orx::kRegistryVersion));
+  const orx::TGenericRegistryKey many = Open(RootOf(target.Load()), L"many");
+  RawValue last;
+  EXPECT_TRUE(many.GetValue(many.GetValueNames().back(), last, 0, true));
+  EXPECT_EQ(last.bytes(), "b");
+}
+
 INSTANTIATE_TEST_SUITE_P(With, HostileFile, testing::ValuesIn(kFiles),
                          [](const auto& test) { return test.param.what; });
 

@@ -1,7 +1,7 @@
 #include "lock_wait.h"
 
-#include <chrono>
-#include <system_error>
+#include <algorithm>
+#include <thread>
 #include <utility>
 
 #include "orxregistry/in_file_key.h"
@@ -10,6 +10,10 @@
 namespace orx {
 namespace {
 
+using std::chrono::microseconds;
+
+constexpr microseconds kFirstPause{100};
+constexpr microseconds kLongestPause{10'000};
 constexpr std::chrono::seconds kLongWait{1};
 
 AwaitedLock& Teller() {
@@ -23,27 +27,19 @@ void OnAwaitedLock(AwaitedLock tell) { Teller() = std::move(tell); }
 
 namespace os {
 
-LockWait::LockWait(const std::filesystem::path& file) {
-  if (!Teller()) return;
-  const auto watch = [this, name = ToName(file)] {
-    std::unique_lock<std::mutex> lock(mutex_);
-    if (!ended_.wait_for(lock, kLongWait, [this] { return hasEnded_; })) Teller()(name);
-  };
-  try {
-    clock_ = std::thread(watch);
-  } catch (const std::system_error&) {
-    // Waits without a word.
-  }
-}
+LockWait::LockWait(const std::filesystem::path& file)
+    : file_(file), begin_(Clock::now()), pause_(kFirstPause) {}
 
-LockWait::~LockWait() {
-  if (!clock_.joinable()) return;
-  {
-    const std::lock_guard<std::mutex> lock(mutex_);
-    hasEnded_ = true;
+bool LockWait::GoOn() {
+  const Clock::duration waited = Clock::now() - begin_;
+  if (waited > kLongestLockWait) return false;
+  if (!isTold_ && waited > kLongWait && Teller()) {
+    Teller()(ToName(file_));
+    isTold_ = true;
   }
-  ended_.notify_all();
-  clock_.join();
+  std::this_thread::sleep_for(pause_);
+  pause_ = std::min(pause_ * 3 / 2, kLongestPause);
+  return true;
 }
 
 }  // namespace os

@@ -1,26 +1,28 @@
 #pragma once
 
-#include <condition_variable>
+#include <chrono>
 #include <filesystem>
-#include <mutex>
-#include <thread>
 
 namespace orx::os {
 
-/// While one is there a file's lock is awaited, which is told to whoever asked for it
-/// (OnAwaitedLock) when it takes long.
+/// Waiting for a file's lock, between one attempt and the next.
 class LockWait {
  public:
+  /// \param file must outlive the object
   explicit LockWait(const std::filesystem::path& file);
-  LockWait(const LockWait&) = delete;
-  LockWait& operator=(const LockWait&) = delete;
-  ~LockWait();
+
+  /// Waits a little, longer from time to time. After a second it tells whoever asked for it
+  /// (OnAwaitedLock).
+  /// \return false when it has been long enough
+  bool GoOn();
 
  private:
-  std::mutex mutex_;
-  std::condition_variable ended_;
-  bool hasEnded_ = false;
-  std::thread clock_;
+  using Clock = std::chrono::steady_clock;
+
+  const std::filesystem::path& file_;
+  const Clock::time_point begin_;
+  std::chrono::microseconds pause_;
+  bool isTold_ = false;
 };
 
 }  // namespace orx::os

@@ -29,11 +29,15 @@ class File {
   /// \return nothing when the file cannot be opened
   static std::optional<File> OpenToRead(const std::filesystem::path& path);
 
-  /// Opens a file to change it and holds it against every other that opens it this way, in this
-  /// process or in others, until closed. Waits for its turn.
-  /// \param create make the file when it does not exist; it has no other name then
+  /// Opens a file to change it, and holds it against everybody who does the same, in this process
+  /// or in others, until it is closed. Waits for its turn, but not for ever.
   /// \return nothing when the file cannot be opened or locked
-  static std::optional<File> OpenLocked(const std::filesystem::path& path, bool create);
+  static std::optional<File> OpenLocked(const std::filesystem::path& path);
+
+  /// Makes a file, locked as above. One of that name that a process left when it was stopped is
+  /// removed.
+  /// \return nothing when it cannot be made, or the name is taken by something else
+  static std::optional<File> CreateLocked(const std::filesystem::path& path);
 
   File(File&& other) noexcept : handle_(other.handle_) { other.handle_ = kNone; }
   File(const File&) = delete;

@@ -1,5 +1,4 @@
 #include <fcntl.h>
-#include <sys/file.h>
 #include <sys/mman.h>
 #include <sys/stat.h>
 #include <sys/xattr.h>
@@ -33,8 +32,9 @@ auto Retry(Call call) {
 }
 
 /// Keeps the system's error when a call has failed.
-bool Check(bool done) {
-  if (!done) KeepFileError();
+/// \param call its name where it is one that some file systems lack
+bool Check(bool done, const char* call = nullptr) {
+  if (!done) KeepFileError(call);
   return done;
 }
 
@@ -52,21 +52,53 @@ bool RenameToNewName(const char* from, const char* to) {
   if (renameat2(AT_FDCWD, from, AT_FDCWD, to, RENAME_NOREPLACE) == 0) return true;
   if (errno != EINVAL && errno != ENOSYS) return false;
   // A file system that cannot rename so: a second link fails when the name is taken.
-  if (link(from, to) != 0) return false;
+  if (!Check(link(from, to) == 0, "link")) return false;
   unlink(from);
   return true;
 }
 
+/// Holds an open file against every other that is locked so. It must be open to write: who may only
+/// read a file cannot keep others from writing it.
 bool Lock(int handle, const std::filesystem::path& path) {
-  if (Retry([&] { return flock(handle, LOCK_EX | LOCK_NB); }) == 0) return true;
-  if (errno != EWOULDBLOCK) return Check(false);
-  const LockWait waiting(path);
-  return Check(Retry([&] { return flock(handle, LOCK_EX); }) == 0);
+  struct flock whole = {};
+  whole.l_type = F_WRLCK;
+  whole.l_whence = SEEK_SET;
+  LockWait wait(path);
+  while (Retry([&] { return fcntl(handle, F_OFD_SETLK, &whole); }) != 0) {
+    const bool isHeld = errno == EAGAIN || errno == EACCES;
+    if (isHeld && wait.GoOn()) continue;
+    if (isHeld) errno = EBUSY;
+    return Check(false, "fcntl");
+  }
+  return true;
 }
 
 bool HasOtherName(int handle) {
   struct stat status;
   return fstat(handle, &status) == 0 && status.st_nlink > 1;
+}
+
+/// Removes a file that a process left when it was stopped before the file got its name. Waits for
+/// one that is at work.
+/// \return false when there is something else of that name, or it cannot be removed
+bool RemoveLeftOver(const std::filesystem::path& path) {
+  const int handle =
+      Retry([&] { return open(path.c_str(), O_RDWR | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK); });
+  if (handle < 0) return Check(errno == ENOENT);
+  struct Closing {
+    int handle;
+    ~Closing() { close(handle); }
+  } const closing{handle};
+  // A process that was stopped in RenameToNewName leaves a finished file with two names. It is not
+  // locked here: a caller that holds it by its right name would wait for itself.
+  if (!HasOtherName(handle) && !Lock(handle, path)) return false;
+  struct stat opened;
+  struct stat named;
+  if (!Check(fstat(handle, &opened) == 0)) return false;
+  // While this waited, the file may have got its name.
+  if (stat(path.c_str(), &named) != 0) return Check(errno == ENOENT);
+  if (opened.st_ino != named.st_ino || opened.st_dev != named.st_dev) return true;
+  return Check(unlink(path.c_str()) == 0 || errno == ENOENT);
 }
 
 }  // namespace
@@ -77,24 +109,40 @@ std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
   return File(handle);
 }
 
-std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool create) {
-  const int flags = O_RDWR | O_CLOEXEC | (create ? O_CREAT | O_NOFOLLOW : 0);
+std::optional<File> File::OpenLocked(const std::filesystem::path& path) {
   for (;;) {
-    const int handle = Retry([&] { return open(path.c_str(), flags, kNewFileMode); });
+    const int handle = Retry([&] { return open(path.c_str(), O_RDWR | O_CLOEXEC); });
     if (!Check(handle >= 0)) return std::nullopt;
     File file(handle);
-    // A process that was stopped in RenameToNewName leaves a finished file with two names. It is
-    // not locked here: a caller that holds it by its right name would wait for itself.
-    if (create && HasOtherName(handle)) {
-      if (!Check(unlink(path.c_str()) == 0 || errno == ENOENT)) return std::nullopt;
-      continue;
-    }
     if (!Lock(handle, path)) return std::nullopt;
-    // While this waited, the file may have got its name, or been replaced by another of this name.
-    if (create && HasOtherName(handle)) continue;
+    // While this waited, the file may have been replaced by another of this name.
     const std::optional<FileStamp> opened = file.Stamp();
     const std::optional<FileStamp> named = StampOf(path);
     if (!opened) return std::nullopt;
+    if (named && opened->IsSameFile(*named)) return file;
+  }
+}
+
+std::optional<File> File::CreateLocked(const std::filesystem::path& path) {
+  constexpr int kNew = O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC;
+  for (;;) {
+    const int handle = Retry([&] { return open(path.c_str(), kNew, kNewFileMode); });
+    if (handle < 0) {
+      if (!Check(errno == EEXIST) || !RemoveLeftOver(path)) return std::nullopt;
+      continue;
+    }
+    File file(handle);
+    if (!Lock(handle, path)) {
+      unlink(path.c_str());
+      return std::nullopt;
+    }
+    // Somebody may have taken it for one that was left over.
+    const std::optional<FileStamp> opened = file.Stamp();
+    const std::optional<FileStamp> named = StampOf(path);
+    if (!opened) {
+      unlink(path.c_str());
+      return std::nullopt;
+    }
     if (named && opened->IsSameFile(*named)) return file;
   }
 }

@@ -62,16 +62,21 @@ std::optional<FileStamp> StampOfOpen(HANDLE handle) {
 }
 
 bool Lock(HANDLE handle, const std::filesystem::path& path) {
-  const auto ask = [handle](DWORD flags) {
+  const auto ask = [handle] {
     OVERLAPPED place = {};
     place.OffsetHigh = kLockedByteHigh;
-    return LockFileEx(handle, LOCKFILE_EXCLUSIVE_LOCK | flags, 0, 1, 0, &place) != 0;
+    constexpr DWORD kHow = LOCKFILE_EXCLUSIVE_LOCK | LOCKFILE_FAIL_IMMEDIATELY;
+    return LockFileEx(handle, kHow, 0, 1, 0, &place) != 0;
   };
-  if (ask(LOCKFILE_FAIL_IMMEDIATELY)) return true;
-  const DWORD error = GetLastError();
-  if (error != ERROR_LOCK_VIOLATION && error != ERROR_IO_PENDING) return Check(false);
-  const LockWait waiting(path);
-  return Check(ask(0));
+  LockWait wait(path);
+  while (!ask()) {
+    const DWORD error = GetLastError();
+    const bool isHeld = error == ERROR_LOCK_VIOLATION || error == ERROR_IO_PENDING;
+    if (isHeld && wait.GoOn()) continue;
+    SetLastError(isHeld ? ERROR_LOCK_VIOLATION : error);
+    return Check(false);
+  }
+  return true;
 }
 
 /// Replaces a file that others have open: they keep the old one.
@@ -132,6 +137,26 @@ HANDLE OpenOrPutBack(const std::filesystem::path& path, DWORD access, DWORD disp
   return Open(path, access, disposition);
 }
 
+/// True when a path leads to an open file.
+bool IsNamed(HANDLE handle, const std::filesystem::path& path) {
+  const std::optional<FileStamp> opened = StampOfOpen(handle);
+  const std::optional<FileStamp> named = StampOf(path);
+  return opened && named && opened->IsSameFile(*named);
+}
+
+/// Removes a file that a process left when it was stopped before the file got its name. Waits for
+/// one that is at work.
+/// \return false when there is something else of that name, or it cannot be removed
+bool RemoveLeftOver(const std::filesystem::path& path) {
+  const HANDLE handle = Open(path, GENERIC_READ | GENERIC_WRITE, OPEN_EXISTING);
+  if (!handle) return Check(GetLastError() == ERROR_FILE_NOT_FOUND);
+  bool isDone = Lock(handle, path);
+  // While this waited, the file may have got its name.
+  if (isDone && IsNamed(handle, path)) isDone = Check(DeleteFileW(path.c_str()) != 0);
+  CloseHandle(handle);
+  return isDone;
+}
+
 }  // namespace
 
 std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
@@ -140,22 +165,36 @@ std::optional<File> File::OpenToRead(const std::filesystem::path& path) {
   return File(handle);
 }
 
-std::optional<File> File::OpenLocked(const std::filesystem::path& path, bool create) {
+std::optional<File> File::OpenLocked(const std::filesystem::path& path) {
   for (;;) {
-    const HANDLE handle =
-        OpenOrPutBack(path, GENERIC_READ | GENERIC_WRITE, create ? OPEN_ALWAYS : OPEN_EXISTING);
+    const HANDLE handle = OpenOrPutBack(path, GENERIC_READ | GENERIC_WRITE, OPEN_EXISTING);
     if (!Check(handle != nullptr)) return std::nullopt;
     File file(handle);
     if (!Lock(handle, path)) return std::nullopt;
     // While this waited, the file may have been replaced by another of the same name.
-    const std::optional<FileStamp> opened = file.Stamp();
-    const std::optional<FileStamp> named = StampOf(path);
-    if (!opened) return std::nullopt;
-    if (named && opened->IsSameFile(*named)) {
+    if (!file.Stamp()) return std::nullopt;
+    if (IsNamed(handle, path)) {
       // One from before this file was swapped in: nobody shall put that back any more.
       Remove(OldNameOf(path));
       return file;
     }
+  }
+}
+
+std::optional<File> File::CreateLocked(const std::filesystem::path& path) {
+  for (;;) {
+    const HANDLE handle = Open(path, GENERIC_READ | GENERIC_WRITE, CREATE_NEW);
+    if (!handle) {
+      if (!Check(GetLastError() == ERROR_FILE_EXISTS) || !RemoveLeftOver(path)) return std::nullopt;
+      continue;
+    }
+    File file(handle);
+    if (!Lock(handle, path)) {
+      Remove(path);
+      return std::nullopt;
+    }
+    // Somebody may have taken it for one that was left over.
+    if (IsNamed(handle, path)) return file;
   }
 }
 

@@ -223,13 +223,21 @@ std::optional<Buffer> MakeRegistryFile(KeyTree& tree) {
 
 std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, const Buffer& bytes,
                                          const os::File* replaced) {
-  std::filesystem::path beside = path;
-  beside += ".new";
-  std::optional<os::File> file = os::File::OpenLocked(beside, true);
+  // Where a name is taken by what is not of this kind, the next is tried.
+  std::filesystem::path beside;
+  std::optional<os::File> file;
+  for (const char* const ending : {".new", ".new1", ".new2", ".new3"}) {
+    beside = path;
+    beside += ending;
+    if (std::optional<os::File> made = os::File::CreateLocked(beside)) {
+      file.emplace(*std::move(made));
+      break;
+    }
+  }
   if (!file) return std::nullopt;
   std::optional<os::FileStamp> stamp;
-  if (file->Truncate(0) && (!replaced || file->TakeAccessOf(*replaced)) &&
-      file->Write(0, bytes.data(), bytes.size()) && file->Flush()) {
+  if ((!replaced || file->TakeAccessOf(*replaced)) && file->Write(0, bytes.data(), bytes.size()) &&
+      file->Flush()) {
     // Taken while nobody else can have the file: under its new name others may append to it.
     stamp = file->Stamp();
   }
@@ -247,7 +255,7 @@ std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, cons
 
 AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
   const std::filesystem::path path = os::WithoutLinks(name);
-  std::optional<os::File> file = os::File::OpenLocked(path, false);
+  std::optional<os::File> file = os::File::OpenLocked(path);
   if (!file) return AppendResult::kFailed;
   FilePosition at = tree.position;
   const AppendResult result = CatchUp(*file, at);

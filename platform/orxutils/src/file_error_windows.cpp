@@ -12,7 +12,8 @@ thread_local DWORD keptError = ERROR_SUCCESS;
 
 }  // namespace
 
-void KeepFileError() noexcept {
+// Windows' messages tell enough without the name.
+void KeepFileError(const char* /*call*/) noexcept {
   if (keptError == ERROR_SUCCESS) keptError = GetLastError();
 }
 

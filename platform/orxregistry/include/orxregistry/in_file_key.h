@@ -1,6 +1,7 @@
 #pragma once
 
 #include <boost/thread/recursive_mutex.hpp>
+#include <chrono>
 #include <cstdint>
 #include <filesystem>
 #include <functional>
@@ -28,7 +29,10 @@ inline constexpr unsigned kRegistryVersion = 512;
 /// What trees are made and opened with; no meaning here.
 inline constexpr unsigned kRegistryFlags = 97;
 
-/// Hears of a file whose lock another process holds, from a thread of its own.
+/// A save waits so long for a file that another process holds, then it fails.
+inline constexpr std::chrono::seconds kLongestLockWait{10};
+
+/// Hears of a file whose lock another process holds, in the thread that saves.
 using AwaitedLock = std::function<void(const COrxStringT<wchar_t>& file)>;
 
 /// Has it told when a save waits for a file's lock for more than a second.

@@ -10,7 +10,8 @@ namespace orx {
 
 /// Keeps the system's last error, unless one is kept already. To be called right behind a call that
 /// failed.
-ORXUTILS_EXPORT void KeepFileError() noexcept;
+/// \param call the call's name, to be told with the error, or null; must live on
+ORXUTILS_EXPORT void KeepFileError(const char* call = nullptr) noexcept;
 
 /// Forgets the error that is kept. To be called before an operation of which one wants to know why
 /// it failed.
