@@ -43,7 +43,7 @@ int DecodeStream(const Conversion& files) {
     while (const rtcm3::Message* message = messages.Next()) {
       files.units ? AppendJsonLineInUnits(*message, files.dms, out.pending())
                   : rtcm3::AppendJsonLine(*message, out.pending());
-      out.FlushMuch();
+      out.FlushIfLarge();
     }
     counts.frames.frames > 0 ? out.Finish() : out.Discard();
     progress.Clear();
@@ -111,7 +111,7 @@ int EncodeLines(const Conversion& files) {
     }
     if (line.size() > rtcm3::kMaxJsonLine) SkipLine(in.buffer());
     const bool mayWait = in.buffer().in_avail() <= 0;
-    mayWait ? out.Flush() : out.FlushMuch();
+    mayWait ? out.Flush() : out.FlushIfLarge();
   }
   return finish();
 }

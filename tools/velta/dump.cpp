@@ -105,7 +105,7 @@ void WriteKey(const TGenericRegistryKey& key, const std::string& indent, Output&
   separator = "\n";
   for (orx::TGenRegKeyIterator keys(key); keys;) {
     text += separator;
-    out.FlushMuch();
+    out.FlushIfLarge();
     WriteKey(TGenericRegistryKey(keys++), indent + "  ", out);
     separator = ",\n";
   }

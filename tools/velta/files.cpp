@@ -25,7 +25,7 @@ namespace fs = std::filesystem;
 namespace {
 
 constexpr std::size_t kInputBuffer = std::size_t{64} * 1024;
-constexpr std::size_t kMuchOutput = std::size_t{64} * 1024;
+constexpr std::size_t kLargeOutput = std::size_t{64} * 1024;
 constexpr std::string_view kStandardStream = "-";
 
 std::runtime_error FileError(const std::string& name, const std::string& what) {
@@ -60,14 +60,14 @@ class InterruptibleBuffer : public std::streambuf {
 bool IsInput(const std::string& input, const fs::path& path) {
   if (input == kStandardStream) return orx::FileFuncs::isSameFile(stdin, path);
   std::error_code ignored;
-  return fs::equivalent(orx::ToSystemPath(ToPath(input)), path, ignored);
+  return fs::equivalent(orx::ToSystemPath(PathOf(input)), path, ignored);
 }
 
 /// True when standard output goes into a file that is read.
 bool IsWrittenTo(const std::string& input) {
   if (input == kStandardStream) return false;  // a terminal is both
   std::error_code ignored;
-  const fs::path path = orx::ToSystemPath(ToPath(input));
+  const fs::path path = orx::ToSystemPath(PathOf(input));
   return fs::is_regular_file(path, ignored) && orx::FileFuncs::isSameFile(stdout, path);
 }
 
@@ -104,9 +104,9 @@ std::wstring ToWide(const std::string& argument) {
   return *std::move(wide);
 }
 
-fs::path ToPath(const std::string& name) { return std::u8string(name.begin(), name.end()); }
+fs::path PathOf(const std::string& name) { return std::u8string(name.begin(), name.end()); }
 
-std::string ToName(const fs::path& path) {
+std::string NameOf(const fs::path& path) {
   const std::u8string name = path.u8string();
   return {name.begin(), name.end()};
 }
@@ -123,7 +123,7 @@ FileKind KindOf(const std::string& file) {
 
 void RequireFile(const std::string& file) {
   std::error_code error;
-  const fs::file_status status = fs::status(orx::ToSystemPath(ToPath(file)), error);
+  const fs::file_status status = fs::status(orx::ToSystemPath(PathOf(file)), error);
   if (status.type() == fs::file_type::not_found) {
     throw std::runtime_error(file + ": there is no such file");
   }
@@ -146,7 +146,7 @@ Input::Input(const std::string& name) : memory_(kInputBuffer) {
     buffer_ = std::make_unique<InterruptibleBuffer>(*std::cin.rdbuf());
     return;
   }
-  const fs::path path = ToPath(name);
+  const fs::path path = PathOf(name);
   std::error_code ignored;  // opening it tells
   if (fs::is_directory(path, ignored)) throw std::runtime_error(name + ": is a directory");
   file_.pubsetbuf(memory_.data(), static_cast<std::streamsize>(memory_.size()));
@@ -160,7 +160,7 @@ Input::Input(const std::string& name) : memory_(kInputBuffer) {
 Output::Output(const std::string& name, OutputKind kind, const std::vector<std::string>& inputs)
     : name_(name), kind_(kind), buffer_(std::cout.rdbuf()) {
   const bool isStandard = name == kStandardStream;
-  const fs::path path = isStandard ? fs::path() : orx::ToSystemPath(ToPath(name));
+  const fs::path path = isStandard ? fs::path() : orx::ToSystemPath(PathOf(name));
   RefuseInputs(inputs, path);
   const bool isTerminal = isStandard ? orx::FileFuncs::isTerminal(stdout) : IsTerminal(path);
   if (isTerminal && kind == OutputKind::kFrames) {
@@ -199,8 +199,8 @@ void Output::Open(const fs::path& path) {
   if (fs::exists(status) && !beside_.empty()) fs::permissions(beside_, status.permissions(), error);
 }
 
-void Output::FlushMuch() {
-  if (pending_.size() >= kMuchOutput) Flush();
+void Output::FlushIfLarge() {
+  if (pending_.size() >= kLargeOutput) Flush();
 }
 
 void Output::Flush() {

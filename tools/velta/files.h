@@ -17,10 +17,10 @@ namespace velta_tool {
 std::wstring ToWide(const std::string& argument);
 
 /// A file name in UTF-8, as those of the command line are.
-std::filesystem::path ToPath(const std::string& name);
+std::filesystem::path PathOf(const std::string& name);
 
 /// A file name as UTF-8.
-std::string ToName(const std::filesystem::path& path);
+std::string NameOf(const std::filesystem::path& path);
 
 /// The two kinds of files that the library keeps, by their extensions.
 enum class FileKind { kDatum, kProjection, kOther };
@@ -78,11 +78,11 @@ class Output {
   Output& operator=(const Output&) = delete;
   ~Output() { Discard(); }
 
-  /// What goes out when there is much of it, or by Flush().
+  /// What goes out by the next Flush().
   std::string& pending() { return pending_; }
-  /// Writes what is pending if it is much.
+  /// Writes what is pending once there is a good deal of it.
   /// \throws std::runtime_error when it cannot be written
-  void FlushMuch();
+  void FlushIfLarge();
   /// Writes what is pending.
   /// \throws std::runtime_error when it cannot be written
   void Flush();

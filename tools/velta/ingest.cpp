@@ -53,16 +53,16 @@ struct Options {
 };
 
 std::unique_ptr<RTCMDataSupport> MakeSupport(const Options& options) {
-  fs::path datums = ToPath(options.datumDir);
-  fs::path projections = ToPath(options.projectionDir);
+  fs::path datums = PathOf(options.datumDir);
+  fs::path projections = PathOf(options.projectionDir);
   if (!options.dir.empty()) {
-    datums = ToPath(options.dir) / fs::path(orx::cs::velta::kDatumFolder).relative_path();
-    projections = ToPath(options.dir) / fs::path(orx::cs::velta::kProjectionFolder).relative_path();
+    datums = PathOf(options.dir) / fs::path(orx::cs::velta::kDatumFolder).relative_path();
+    projections = PathOf(options.dir) / fs::path(orx::cs::velta::kProjectionFolder).relative_path();
   }
   if (datums.empty()) return std::make_unique<RTCMDataSupport>();
   // The library wants the separator at the end.
-  return std::make_unique<RTCMDataSupport>(ToWide(ToName(datums / "")).c_str(),
-                                           ToWide(ToName(projections / "")).c_str());
+  return std::make_unique<RTCMDataSupport>(ToWide(NameOf(datums / "")).c_str(),
+                                           ToWide(NameOf(projections / "")).c_str());
 }
 
 bool Contains(const std::vector<unsigned>& numbers, unsigned number) {
@@ -324,7 +324,7 @@ class Ingestion {
       IngestedPart& part = *std::find_if(parts.begin(), parts.end(), [&](const auto& candidate) {
         return Contains(candidate.messages, received.message);
       });
-      part.file = ToName(ToPath(orx::ToUtf8(file)).filename());
+      part.file = NameOf(PathOf(orx::ToUtf8(file)).filename());
       const std::optional<Entry> stored = FindEntry(file, received.name);
       part.isThere = stored.has_value();
       part.added = stored && !wasThere;

@@ -115,7 +115,7 @@ bool IngestedSet::HasNews() const {
 
 void IngestReport::Add(const IngestedSet& set) {
   out_.pending() += (json_ ? SetJson(set).dump() : SetText(set)) + '\n';
-  out_.FlushMuch();
+  out_.FlushIfLarge();
 }
 
 void IngestReport::AddIncomplete(std::uint32_t systemId, const std::vector<std::string>& missing) {

@@ -91,7 +91,7 @@ void Print(const std::string& file, const std::vector<Description>& entries, con
     } else {
       out.pending() += (&entry == &entries.front() ? "" : "\n") + ToText(entry);
     }
-    out.FlushMuch();
+    out.FlushIfLarge();
   }
 }
 

@@ -52,8 +52,8 @@ class SharedFiles {
     return kSuccess;
   }
 
-  /// The caller may still hold the file's lock, so the tree stays as it is. Asks neither for memory
-  /// nor the file system, as it must work when memory is out.
+  /// Counts a user less. The tree stays as it is, as the caller may still hold its lock. Allocates
+  /// nothing, so that a file can be given back when memory is out.
   void Reset(const wchar_t* name) {
     const std::lock_guard<std::mutex> lock(mutex_);
     const auto found = names_.find(std::wstring_view(name));
@@ -66,7 +66,7 @@ class SharedFiles {
  private:
   /// \return null when there is no such file
   SharedFile* Find(const wchar_t* name) {
-    const std::wstring whole = orx::ToWholeName(name);
+    const std::wstring whole = orx::AbsoluteName(name);
     const std::lock_guard<std::mutex> lock(mutex_);
     const auto found = files_.find(whole);
     if (found != files_.end()) return found->second.get();

@@ -43,8 +43,9 @@ bool TInFileKey::Save(bool /*flag*/, unsigned registryVersion) {
   const AppendResult result = AppendUnsaved(*path, *tree_);
   if (result == AppendResult::kFailed) return false;
   tree_->MarkSaved();
-  // What others appended is in the file and not in this tree. What was copied lies in the memory of
-  // whole other files, which is given up once the file is read again.
+  // Without a stamp the tree counts as changed, so that it is read again when it is next obtained:
+  // it does not have what others have appended, and holds the whole files in memory from which
+  // entries were copied into it.
   if (result == AppendResult::kBehindOthers || tree_->HasBorrowed()) {
     tree_->position.stamp = os::FileStamp();
   }
@@ -74,7 +75,7 @@ void TInFileKey::ForgetChanges() noexcept {
   try {
     Reload();
   } catch (...) {
-    // Nobody may be told that what the tree shows is there, or save it.
+    // The tree shows what is not in the file: it must not be called saved, nor be saved later.
     tree_->MarkSaved();
     tree_->error = kCannotBeOpened;
     tree_->position.stamp = os::FileStamp();

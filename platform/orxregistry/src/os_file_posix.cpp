@@ -21,7 +21,7 @@ namespace {
 
 constexpr mode_t kNewFileMode = 0666;
 constexpr mode_t kModeBits = 07777;
-/// Not to wait for somebody to write into a pipe of that name.
+/// Does not wait where the name is that of a pipe and nobody writes into it.
 constexpr int kToRead = O_RDONLY | O_CLOEXEC | O_NONBLOCK;
 
 template <class Call>

@@ -81,7 +81,7 @@ bool Lock(HANDLE handle, const std::filesystem::path& path) {
 
 /// Replaces a file that others have open: they keep the old one.
 bool RenameOver(const std::filesystem::path& from, const std::filesystem::path& to) {
-  const std::wstring name = ToWholeName(to.wstring());
+  const std::wstring name = AbsoluteName(to.wstring());
   std::vector<unsigned char> buffer(sizeof(FILE_RENAME_INFO) + name.size() * sizeof(wchar_t));
   auto* const info = reinterpret_cast<FILE_RENAME_INFO*>(buffer.data());
   *reinterpret_cast<DWORD*>(info) = kReplaceIfExists | kPosixSemantics;
@@ -174,7 +174,7 @@ std::optional<File> File::OpenLocked(const std::filesystem::path& path) {
     // While this waited, the file may have been replaced by another of the same name.
     if (!file.Stamp()) return std::nullopt;
     if (IsNamed(handle, path)) {
-      // One from before this file was swapped in: nobody shall put that back any more.
+      // What was moved aside for this file has no use any more, and must not be put back.
       Remove(OldNameOf(path));
       return file;
     }

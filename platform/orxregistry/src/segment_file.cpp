@@ -26,7 +26,7 @@ constexpr std::size_t kDescriptionAt = kDescriptionSizeAt + sizeof(std::uint32_t
 constexpr std::size_t kMaxDescription = 4096;
 constexpr std::size_t kChecksum = sizeof(std::uint64_t);
 constexpr std::size_t kMaxFileHeader = kDescriptionAt + kMaxDescription + kChecksum;
-/// A file of so many bytes is read in one piece, whatever it is.
+/// A file of at most so many bytes is read in one piece, before it is known what it is.
 constexpr std::uint64_t kReadUnasked = 1U << 16U;
 
 // Segment header: mark, zero, size of the tree, superseded bytes, checksum of the tree, checksum of
@@ -223,7 +223,7 @@ std::optional<Buffer> MakeRegistryFile(KeyTree& tree) {
 
 std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, const Buffer& bytes,
                                          const os::File* replaced) {
-  // Where a name is taken by what is not of this kind, the next is tried.
+  // A name may be taken by something that nobody left over; then the next is tried.
   std::filesystem::path beside;
   std::optional<os::File> file;
   for (const char* const ending : {".new", ".new1", ".new2", ".new3"}) {
@@ -238,7 +238,7 @@ std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, cons
   std::optional<os::FileStamp> stamp;
   if ((!replaced || file->TakeAccessOf(*replaced)) && file->Write(0, bytes.data(), bytes.size()) &&
       file->Flush()) {
-    // Taken while nobody else can have the file: under its new name others may append to it.
+    // Before it gets its name: from then on others may append to it.
     stamp = file->Stamp();
   }
   if (stamp && os::Rename(beside, path, replaced != nullptr)) return stamp;
@@ -278,7 +278,7 @@ AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
     ForgetFileError();
   }
   FinishSegment(segment, 0, at.end, at.superseded);
-  // Before anything is promised that could go with the name.
+  // A name that may not be durable yet would take with it what is promised below.
   at.isNameDurable = at.isNameDurable || FileFuncs::flushName(path);
   if (!at.isNameDurable) {
     KeepFileError();

@@ -18,7 +18,7 @@ std::optional<std::filesystem::path> ToPath(const COrxStringT<wchar_t>& name) {
   }
 }
 
-COrxStringT<wchar_t> ToWholeName(const COrxStringT<wchar_t>& name) {
+COrxStringT<wchar_t> AbsoluteName(const COrxStringT<wchar_t>& name) {
   const std::optional<std::filesystem::path> path = ToPath(name);
   if (!path) return name;
   std::error_code error;

@@ -15,12 +15,12 @@ std::optional<std::filesystem::path> ToPath(const COrxStringT<wchar_t>& name) {
 }
 
 std::filesystem::path ToSystemPath(const std::filesystem::path& path) {
-  const COrxStringT<wchar_t> name = ToWholeName(path.wstring());
+  const COrxStringT<wchar_t> name = AbsoluteName(path.wstring());
   if (name.size() <= kMaxPlainName || name.starts_with(L"\\\\?\\")) return path;
   return name.starts_with(L"\\\\") ? L"\\\\?\\UNC" + name.substr(1) : L"\\\\?\\" + name;
 }
 
-COrxStringT<wchar_t> ToWholeName(const COrxStringT<wchar_t>& name) {
+COrxStringT<wchar_t> AbsoluteName(const COrxStringT<wchar_t>& name) {
   // The standard library's own does not know the names of network shares.
   const DWORD size = GetFullPathNameW(name.c_str(), 0, nullptr, nullptr);
   COrxStringT<wchar_t> whole(size, L'\0');

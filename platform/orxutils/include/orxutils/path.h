@@ -20,7 +20,7 @@ ORXUTILS_EXPORT std::filesystem::path ToSystemPath(const std::filesystem::path& 
 
 /// The name of a file from its drive or root on, without "." and "..". What is no path of this
 /// system is left as it is.
-ORXUTILS_EXPORT COrxStringT<wchar_t> ToWholeName(const COrxStringT<wchar_t>& name);
+ORXUTILS_EXPORT COrxStringT<wchar_t> AbsoluteName(const COrxStringT<wchar_t>& name);
 
 /// A path as a wide file name. Bytes that are no UTF-8 are left out.
 ORXUTILS_EXPORT COrxStringT<wchar_t> ToName(const std::filesystem::path& path);
