@@ -68,7 +68,7 @@ bool Lock(int handle, const std::filesystem::path& path) {
     const bool isHeld = errno == EAGAIN || errno == EACCES;
     if (isHeld && wait.GoOn()) continue;
     if (isHeld) errno = EBUSY;
-    return Check(false, "fcntl");
+    return Check(false, isHeld ? nullptr : "fcntl");
   }
   return true;
 }
