@@ -26,7 +26,7 @@ void Require(bool holds) {
 }
 
 TCSInFileKey Load(const std::filesystem::path& path) {
-  return {path.wstring(), nullptr, nullptr, true, 97};
+  return {path.wstring(), nullptr, nullptr, true, orx::kRegistryFlags};
 }
 
 /// What is listed is found, and what looks like an area gives a position to ask for.
@@ -63,11 +63,11 @@ void Query(const std::wstring& path, const std::vector<std::pair<double, double>
 void Save(const RegistryFile& file, TCSInFileKey& tree, bool isGood) {
   const std::filesystem::path copy = file.directory / "copy.dff";
   const std::string before = isGood ? Describe(tree) : file.Bytes();
-  Require(tree.Save(copy.wstring(), false, 512) == isGood);
+  Require(tree.Save(copy.wstring(), false, orx::kRegistryVersion) == isGood);
   Require(!isGood || Describe(Load(copy)) == before);
   std::filesystem::remove(copy);
   velta_test::Open(RootOf(tree), L"added");
-  Require(tree.Save(false, 512) == isGood);
+  Require(tree.Save(false, orx::kRegistryVersion) == isGood);
   Require(isGood ? Describe(file.Load()) == Describe(tree) : file.Bytes() == before);
 }
 

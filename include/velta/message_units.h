@@ -20,7 +20,8 @@ inline constexpr double kTranslationResolution = 0.001;  ///< also of the rotati
 inline constexpr double kRotationResolution = 0.00002;   ///< arc-seconds
 inline constexpr double kScaleResolution = 0.00001;      ///< ppm
 
-/// What an extent of 0 stands for, and one that a message cannot hold. In latitude, radians.
+/// The whole range of latitude, radians: what an extent of 0 means, and one that is too large for a
+/// message.
 inline constexpr double kWholeLatitude = 3.141592653589793;
 inline constexpr double kWholeLongitude = 6.283185307179586;  ///< the same for longitudes, radians
 inline constexpr std::uint32_t kLargestExtent = 32766;  ///< that a message can hold, 2 arc-seconds

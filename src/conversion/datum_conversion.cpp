@@ -4,9 +4,8 @@
 #include <iterator>
 #include <string>
 
+#include "conversion/conversion_visitors.h"
 #include "conversion/entry_name.h"
-#include "conversion/message_fields.h"
-#include "conversion/truncation.h"
 
 namespace orx::cs::velta {
 namespace {
@@ -21,16 +20,7 @@ constexpr const wchar_t* kRegions[] = {
     L"Nazca",    L"Pacific", L"South America", L"Juan de Fuca", L"Philippine",
     L"Rivera",   L"Scotia"};
 
-void Truncate(double number, std::int32_t& integer) { integer = ToInt32(number); }
-void Truncate(double number, std::int64_t& integer) { integer = ToInt64(number); }
-void Truncate(double number, std::uint32_t& integer) { integer = ToUint32(number); }
-
-constexpr auto kToNumber = [](const char*, auto integer, double& number, const Scaling& scaling) {
-  number = scaling.toNumber(static_cast<double>(integer));
-};
-constexpr auto kToInteger = [](const char*, auto& integer, double number, const Scaling& scaling) {
-  Truncate(scaling.toInteger(number), integer);
-};
+constexpr ToInteger<&ToUint32> kToInteger;
 
 }  // namespace
 

@@ -18,7 +18,7 @@ COrxStringT<wchar_t> NormaliseSourceName(const COrxStringT<char>& sourceName);
 /// The region of a tectonic plate, empty for a number that is none.
 COrxStringT<wchar_t> RegionOfPlate(std::uint32_t plateNumber);
 
-/// Both directions side by side. Numbers become integers toward zero.
+/// Each conversion, then its reverse, in which numbers become integers toward zero.
 void ConvertEllipsoids(const RtcmBasicTransformMessage& message, DatumData& datum);
 void ConvertEllipsoids(const DatumData& datum, RtcmBasicTransformMessage& message);
 void ConvertParameters(const RtcmBasicTransformMessage& message, DatumData& datum);

@@ -1,29 +1,17 @@
 #include "conversion/grid_conversion.h"
 
-#include "conversion/message_fields.h"
-#include "conversion/truncation.h"
+#include "conversion/conversion_visitors.h"
 
 namespace orx::cs::velta {
 namespace {
 
-void Truncate(double number, std::int32_t& integer) { integer = ToInt32(number); }
-void Truncate(double number, std::uint32_t& integer) { integer = ToUint32(number); }
-
-constexpr auto kToNumber = [](const char*, auto integer, double& number, const Scaling& scaling) {
-  number = scaling.toNumber(integer);
-};
 /// Whole metres in integer products of 32 bits, as other users of the files form them.
 constexpr auto kToWholeMetres = [](const char*, auto integer, double& number, const Scaling&) {
   const auto product = static_cast<std::uint32_t>(integer) * kPlaneGridResolution;
   number = static_cast<decltype(integer)>(product);
 };
-constexpr auto kToInteger = [](const char*, auto& integer, double number, const Scaling& scaling) {
-  Truncate(scaling.toInteger(number), integer);
-};
-constexpr auto kToSpacing = [](const char*, std::uint32_t& integer, double number,
-                               const Scaling& scaling) {
-  integer = ToLow32(scaling.toInteger(number));
-};
+constexpr ToInteger<&ToUint32> kToInteger;
+constexpr ToInteger<&ToLow32> kToSpacing;
 
 void CopySettings(const RtcmTableMessage& message, TableData& table) {
   table.horShift = message.horShiftIndicator;

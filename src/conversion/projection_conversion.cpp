@@ -1,25 +1,15 @@
 #include "conversion/projection_conversion.h"
 
+#include "conversion/conversion_visitors.h"
 #include "conversion/entry_name.h"
-#include "conversion/message_fields.h"
 #include "conversion/projection_types.h"
-#include "conversion/truncation.h"
 
 namespace orx::cs::velta {
 namespace {
 
 constexpr int kMaxParameters = projmath::TGeoProj::kMaxParameters;
 
-void Truncate(double number, std::int64_t& integer) { integer = ToInt64(number); }
-void Truncate(double number, std::uint64_t& integer) { integer = ToUint64(number); }
-void Truncate(double number, std::uint32_t& integer) { integer = ToLow32(number); }
-
-constexpr auto kToNumber = [](const char*, auto integer, double& number, const Scaling& scaling) {
-  number = scaling.toNumber(static_cast<double>(integer));
-};
-constexpr auto kToInteger = [](const char*, auto& integer, double number, const Scaling& scaling) {
-  Truncate(scaling.toInteger(number), integer);
-};
+constexpr ToInteger<&ToLow32> kToInteger;
 
 }  // namespace
 
@@ -29,6 +19,12 @@ std::unique_ptr<projmath::TGeoProj> CreateProjection(ProjectionData& projection,
   if (!type) return nullptr;
   projection.prjType = type->name;
   return type->make ? type->make(a, second) : nullptr;
+}
+
+std::uint32_t TypeCodeOf(const Rtcm1027& message) {
+  const bool isRectified =
+      message.rectificationFlag && message.projectionType == ProjectionData::OM;
+  return isRectified ? std::uint32_t{ProjectionData::ROM} : message.projectionType;
 }
 
 std::vector<double> ParametersOf(const Rtcm1025& message) {

@@ -17,6 +17,9 @@ namespace orx::cs::velta {
 std::unique_ptr<projmath::TGeoProj> CreateProjection(ProjectionData& projection, int typeCode,
                                                      double a, double second);
 
+/// The type code of what a 1027 describes: the oblique Mercator may be the rectified one.
+std::uint32_t TypeCodeOf(const Rtcm1027& message);
+
 /// The parameters by index: degrees, metres, plain ratios.
 std::vector<double> ParametersOf(const Rtcm1025& message);
 std::vector<double> ParametersOf(const Rtcm1027& message);

@@ -7,7 +7,7 @@
 
 namespace orx::cs::velta {
 
-/// A copy of a record that another module may give back.
+/// A copy of a record whose memory another module may free.
 template <class Record>
 boost::shared_ptr<Record> MakeRecord(const Record& record) {
   return boost::allocate_shared<Record>(orx_dl_allocator<Record>(), record);

@@ -15,8 +15,8 @@ void AddEllipsoid(TGenericRegistryKey& key, const DoublesOf<2>& value,
   Add(key, value, axes);
 }
 
-/// Around the centre, also where the extent is the whole range, whose edge `validityArea` does not
-/// have.
+/// Computed from the centre: where the extent is the whole range, `validityArea` has the centre in
+/// the place of the edge.
 void AddValidityArea(TGenericRegistryKey& key, const DatumData& datum) {
   const double latitudeExtent = datum.validityArea[1];
   const double longitudeExtent = datum.validityArea[3];

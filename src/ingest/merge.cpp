@@ -29,7 +29,7 @@ ResultCode MergeFiles(const SharedFiles& kind, const COrxStringT<wchar_t>& targe
                       const COrxStringT<wchar_t>& sourcePath, MergeContainers* merge) {
   TCSInFileKey* target = nullptr;
   const ResultCode obtained = ObtainTree(kind, targetPath, &target);
-  const GiveBackLater giveBack(kind, targetPath);  // when the lock is gone
+  const GiveBackLater giveBack(kind, targetPath);  // declared before the lock: runs after it
   if (obtained != kSuccess) return obtained;
   const boost::unique_lock<boost::recursive_mutex> lock(target->GetMutex());
   ReadIfLost(*target);

@@ -37,7 +37,7 @@ ResultCode RTCMDataSupport::ParseDatum(const RtcmBasicTransformMessage& message,
   datum.heightIndicator = message.heightIndicator;
   datumEntryName = DatumEntryName(message, grid);
 
-  // Nothing may fail between obtaining the file and giving it back.
+  // Before the file is obtained, so that no exception comes between that and giving it back.
   const COrxStringT<wchar_t> path = FileOf(kDatumFiles, datumPath, datum.targetDatumName);
   const ResultCode result = InitDatumGFF(datum);
   if (result != kSuccess) return result;

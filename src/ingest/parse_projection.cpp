@@ -17,9 +17,7 @@ ResultCode RTCMDataSupport::ParseProjectionMessages(const Rtcm1026& /*message*/,
 }
 
 ResultCode RTCMDataSupport::ParseProjectionMessages(const Rtcm1027& message, const Rtcm1024* grid) {
-  std::uint32_t typeCode = message.projectionType;
-  if (typeCode == ProjectionData::OM && message.rectificationFlag) typeCode = ProjectionData::ROM;
-  return ParseProjection(message, typeCode, grid);
+  return ParseProjection(message, TypeCodeOf(message), grid);
 }
 
 template <class Message>
@@ -43,7 +41,7 @@ ResultCode RTCMDataSupport::ParseProjection(const Message& message, std::uint32_
   }
   projectionEntryName = ProjectionEntryName(message, grid);
 
-  // Nothing may fail between obtaining the file and giving it back.
+  // Before the file is obtained, so that no exception comes between that and giving it back.
   const COrxStringT<wchar_t> path =
       FileOf(kProjectionFiles, projectionPath, projection.rtcmProjName);
   const ResultCode result = InitProjectionGFF(projection);

@@ -11,7 +11,7 @@ bool ReadDoubles(const TGenericRegistryKey& key, const wchar_t* name, double* to
   const std::size_t bytes = count * sizeof(double);
   if (key.GetValueSize(name) != bytes) return false;
   TSimpleBinValue block;
-  // Text may end before its stored size does.
+  // A text with a zero in its middle gives fewer bytes than are stored.
   if (!key.GetValue(name, block, 0, false)) return false;
   if (block.GetByteSize() != bytes) return false;
   std::memcpy(to, block.GetData(), bytes);

@@ -38,7 +38,7 @@ TEST(EllipsoidalGrid, IsScaledToTheLastBitAndTheNextReplacesIt) {
   EXPECT_EQ(All(table.bounds), (Doubles{-2 * kHalf, 0.0, -536870912.0 * 0.5 * kHalf,
                                         536870912.0 * kHalf, 0.0, 1610612736.0 * kHalf}));
   EXPECT_TRUE(table.hasTable);
-  EXPECT_TRUE(!table.horShift);
+  EXPECT_FALSE(table.horShift);
 }
 
 TEST(PlaneGrid, IsScaledInWholeMetresOf32Bits) {

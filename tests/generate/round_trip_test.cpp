@@ -36,8 +36,10 @@ class RoundTripTest : public RtcmTest {
   void TravelUntilNothingChanges(Datum& datum, Projection& projection, int parts) {
     const auto visitSet = [&](auto visit) {
       Kept<decltype(visit)> kept{visit};
-      rtcm3::VisitFields(kept, datum), rtcm3::VisitFields(kept, m1023_);
-      rtcm3::VisitFields(kept, m1024_), rtcm3::VisitFields(kept, projection);
+      rtcm3::VisitFields(kept, datum);
+      rtcm3::VisitFields(kept, m1023_);
+      rtcm3::VisitFields(kept, m1024_);
+      rtcm3::VisitFields(kept, projection);
     };
     const auto numbersOfSet = [&] {
       Numbers numbers;

@@ -149,9 +149,11 @@ TEST_F(MessageTest, RefusedDatumWritesNothing) {
     EXPECT_EQ(Ingest(kLocalSet), kBadComputationIndicator);
   }
   EXPECT_EQ(Ingest(k1021), kMissing1023);
-  EXPECT_EQ(support_.GetTargetDatumName() + support_.GetRegionName(), L"");
+  EXPECT_EQ(support_.GetTargetDatumName(), L"");
+  EXPECT_EQ(support_.GetRegionName(), L"");
   EXPECT_EQ(Ingest(kDhdnSet), kBadComputationIndicator);
-  EXPECT_EQ(support_.GetTargetDatumName() + support_.GetRegionName(), L"AUTO_DHDN_BESELEurope");
+  EXPECT_EQ(support_.GetTargetDatumName(), L"AUTO_DHDN_BESEL");
+  EXPECT_EQ(support_.GetRegionName(), L"Europe");
   EXPECT_FALSE(std::filesystem::exists(datums_));
 }
 
@@ -182,7 +184,8 @@ TEST_F(MessageTest, UnsupportedProjectionIsRefusedAndNothingWritten) {
     m1025_.projectionType = type;
     EXPECT_EQ(Ingest(kDhdnSet), kUnsupportedProjection) << type;
     EXPECT_TRUE(support_.GetCustomProjectionData(summary));
-    EXPECT_EQ(summary.projectionName + summary.datumName, L"AUTO_DHDN_BESELAUTO_DHDN_BESEL");
+    EXPECT_EQ(summary.projectionName, L"AUTO_DHDN_BESEL");
+    EXPECT_EQ(summary.datumName, L"AUTO_DHDN_BESEL");
     EXPECT_EQ(summary.projectionType, type == 0 ? L"" : L"LC");
   }
   EXPECT_FALSE(std::filesystem::exists(projections_));

@@ -74,14 +74,16 @@ inline orx::TGenericRegistryKey Open(const orx::TGenericRegistryKey& parent,
 
 /// A registry file in a directory of its own.
 struct RegistryFile {
-  static orx::TCSInFileKey New() { return {L"", L"a description", nullptr, false, 97}; }
+  static orx::TCSInFileKey New() {
+    return {L"", L"a description", nullptr, false, orx::kRegistryFlags};
+  }
   std::wstring Name() const { return orx::ToName(path); }
-  orx::TCSInFileKey Load() const { return {Name(), nullptr, nullptr, true, 97}; }
+  orx::TCSInFileKey Load() const { return {Name(), nullptr, nullptr, true, orx::kRegistryFlags}; }
   /// Makes the file with a container that holds one value.
   void Create(const std::string& value = "first") const {
     orx::TCSInFileKey tree = New();
     AddEntry(tree, L"S_0", value);
-    tree.Save(Name(), false, 512);
+    tree.Save(Name(), false, orx::kRegistryVersion);
   }
   /// Adds an entry with one value to the container of a tree.
   static void AddEntry(const orx::TInFileKey& tree, const std::wstring& entry,
@@ -93,7 +95,7 @@ struct RegistryFile {
   bool Append(const std::wstring& entry, const std::string& value) const {
     orx::TCSInFileKey tree = Load();
     AddEntry(tree, entry, value);
-    return tree.Save(false, 512);
+    return tree.Save(false, orx::kRegistryVersion);
   }
   std::string Bytes() const { return ReadBytes(path); }
   void SetBytes(const std::string& bytes) const { WriteBytes(path, bytes); }

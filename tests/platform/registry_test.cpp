@@ -45,7 +45,7 @@ TEST(RegistryFormat, IsReadAndWrittenAsDocumented) {
   EXPECT_FALSE(key.HasValue(L"T")) << "names are exact";
 
   std::filesystem::remove(file.path);
-  EXPECT_TRUE(tree.Save(file.Name(), false, 512));
+  EXPECT_TRUE(tree.Save(file.Name(), false, orx::kRegistryVersion));
   EXPECT_EQ(file.Bytes(),
             File({Key(u"", replaced, Key(u"Z\u00FC", text + a, "", 7) + Key(u"l", "", ""))}));
 }
@@ -69,7 +69,7 @@ TEST(RegistryDamage, AtAnyPlaceIsDamageOrASaveThatNeverFinished) {
       EXPECT_EQ(seen, before);
     }
     RegistryFile::AddEntry(tree, L"S_9", "next");
-    EXPECT_EQ(tree.Save(false, 512), !isDamaged);
+    EXPECT_EQ(tree.Save(false, orx::kRegistryVersion), !isDamaged);
     EXPECT_EQ(file.Bytes() == bytes, isDamaged);
     EXPECT_EQ(Describe(file.Load()) == Describe(tree), !isDamaged);
   };
@@ -172,8 +172,8 @@ TEST(RegistryFile, TwoWritersLoseNothingWhileItIsWrittenAfreshNowAndThen) {
     const std::string replacing(1000, letter);
     RegistryFile::AddEntry(one, orx::Widen(name), "1");
     RegistryFile::AddEntry(other, L"S_0", replacing);
-    ASSERT_TRUE(one.Save(false, 512));
-    ASSERT_TRUE(other.Save(false, 512));
+    ASSERT_TRUE(one.Save(false, orx::kRegistryVersion));
+    ASSERT_TRUE(other.Save(false, orx::kRegistryVersion));
     entries += " " + name + "(0 value=1:1:1)";
     EXPECT_EQ(Describe(file.Load()),
               "(0 container(0 S_0(0 value=1:1:" + replacing + ")" + entries + "))");
@@ -184,8 +184,9 @@ TEST(RegistryFile, TwoWritersLoseNothingWhileItIsWrittenAfreshNowAndThen) {
 TEST(RegistryFile, ANewFileNeverReplacesOne) {
   const RegistryFile file;
   file.Create();
-  EXPECT_FALSE(RegistryFile::New().Save(file.Name(), false, 512));
-  EXPECT_FALSE(TCSInFileKey(file.Name(), nullptr, nullptr, false, 97).Save(false, 512));
+  EXPECT_FALSE(RegistryFile::New().Save(file.Name(), false, orx::kRegistryVersion));
+  EXPECT_FALSE(TCSInFileKey(file.Name(), nullptr, nullptr, false, orx::kRegistryFlags)
+                   .Save(false, orx::kRegistryVersion));
   EXPECT_EQ(Describe(file.Load()), "(0 container(0 S_0(0 value=1:1:first)))");
   EXPECT_EQ(std::distance(std::filesystem::directory_iterator(file.directory.path()), {}), 1)
       << "nothing is left beside it";
@@ -211,7 +212,8 @@ TEST(RegistryFile, ThatWasMovedAsideToBeReplacedIsPutBack) {
   const RegistryFile file;
   file.Create();
   std::filesystem::rename(file.path, file.directory / "tree.dff.replaced");
-  EXPECT_FALSE(RegistryFile::New().Save(file.Name(), false, 512)) << "it is there";
+  EXPECT_FALSE(RegistryFile::New().Save(file.Name(), false, orx::kRegistryVersion))
+      << "it is there";
   EXPECT_TRUE(std::filesystem::exists(file.path));
   std::filesystem::rename(file.path, file.directory / "tree.dff.replaced");
   EXPECT_EQ(Describe(file.Load()), "(0 container(0 S_0(0 value=1:1:first)))");
@@ -220,15 +222,17 @@ TEST(RegistryFile, ThatWasMovedAsideToBeReplacedIsPutBack) {
 
 TEST(RegistryFile, ALostFileIsNotASuccess) {
   const RegistryFile file;
-  TCSInFileKey tree(file.Name(), nullptr, nullptr, false, 97U);
-  EXPECT_TRUE(tree.Save(false, 512)) << "a new tree makes its file";
-  EXPECT_TRUE(tree.Save(false, 512)) << "and then goes on with it";
+  TCSInFileKey tree(file.Name(), nullptr, nullptr, false, orx::kRegistryFlags);
+  EXPECT_TRUE(tree.Save(false, orx::kRegistryVersion)) << "a new tree makes its file";
+  EXPECT_TRUE(tree.Save(false, orx::kRegistryVersion)) << "and then goes on with it";
   std::filesystem::remove(file.path);
-  EXPECT_FALSE(tree.Save(false, 512)) << "nothing to write, but nothing is safe either";
+  EXPECT_FALSE(tree.Save(false, orx::kRegistryVersion))
+      << "nothing to write, but nothing is safe either";
   RegistryFile::AddEntry(tree, L"S_1", "new");
-  EXPECT_FALSE(tree.Save(false, 512));
+  EXPECT_FALSE(tree.Save(false, orx::kRegistryVersion));
   file.Create();
-  EXPECT_TRUE(tree.Save(false, 512)) << "what a failed save left is kept for another try";
+  EXPECT_TRUE(tree.Save(false, orx::kRegistryVersion))
+      << "what a failed save left is kept for another try";
   EXPECT_NE(Describe(file.Load()).find("S_1"), std::string::npos);
 }
 
@@ -245,7 +249,8 @@ TEST(RegistryKey, IsCopiedAsItIsAlsoIntoItself) {
 }
 
 TEST(RegistryKey, ACopyOutlivesItsFileAndIsSavedWithWhatWasChangedInIt) {
-  const RegistryFile source, target;
+  const RegistryFile source;
+  const RegistryFile target;
   target.Create();
   const std::string lie = Key(u"lie", Value(u"a", 1, 1, "x") + Value(u"b", 0, 1, "y"), "");
   source.SetBytes(File({Key(u"", "", lie + Key(u"S_0", Value(u"value", 1, 1, "x"), "", 7))}));
@@ -264,7 +269,7 @@ TEST(RegistryKey, ACopyOutlivesItsFileAndIsSavedWithWhatWasChangedInIt) {
   EXPECT_NE(content.find(" lie(0 a=1:1:x) S_0(0 value=1:1:x) S_1(0 value=1:1:changed)"),
             std::string::npos)
       << content;
-  EXPECT_TRUE(tree.Save(false, 512));
+  EXPECT_TRUE(tree.Save(false, orx::kRegistryVersion));
   EXPECT_EQ(Describe(target.Load()), content);
 }
 

@@ -53,7 +53,7 @@ struct Stage : RegistryFile {
 
   bool Add(const std::wstring& entry, const std::string& value) {
     AddEntry(*tree, entry, value);
-    return tree->Save(false, 512);
+    return tree->Save(false, orx::kRegistryVersion);
   }
   ino_t FileNumber() const {
     struct stat status = {};
@@ -87,12 +87,14 @@ void CreateWithTwo(Stage& stage) {
 
 const Scenario kScenarios[] = {
     {"NewFile", "tree.dff",
-     [](Stage& stage) { stage.tree.emplace(stage.Name(), L"", nullptr, false, 97); },
+     [](Stage& stage) {
+       stage.tree.emplace(stage.Name(), L"", nullptr, false, orx::kRegistryFlags);
+     },
      [](Stage& stage) { return stage.Add(L"S_0", "made"); }, "", "made"},
     {"NewFileOfAnOldFileSystem", "tree.dff",
      [](Stage& stage) {
        FileFaults::isOldFileSystem = true;
-       stage.tree.emplace(stage.Name(), L"", nullptr, false, 97);
+       stage.tree.emplace(stage.Name(), L"", nullptr, false, orx::kRegistryFlags);
      },
      [](Stage& stage) { return stage.Add(L"S_0", "made"); }, "", "made"},
     {"Append", "tree.dff", CreateWithTwo, [](Stage& stage) { return stage.Add(L"S_2", "second"); },
@@ -150,7 +152,7 @@ int Try(const Scenario& scenario, Fault fault, int place) {
   SCOPED_TRACE("fault " + std::to_string(static_cast<int>(fault)) + " at " + std::to_string(place));
   Stage stage(scenario.file);
   scenario.prepare(stage);
-  if (!stage.tree) stage.tree.emplace(stage.Name(), nullptr, nullptr, true, 97);
+  if (!stage.tree) stage.tree.emplace(stage.Name(), nullptr, nullptr, true, orx::kRegistryFlags);
   const std::string before = Describe(stage.Load());
   const ino_t fileBefore = stage.FileNumber();
   bool promised = false;
@@ -333,7 +335,7 @@ TEST(Lock, CannotBeHeldByWhoMayOnlyRead) {
 TEST(NextSave, MakesTheNameDurableThatSomebodyElseGave) {
   Stage stage("tree.dff");
   stage.Create();
-  stage.tree.emplace(stage.Name(), nullptr, nullptr, true, 97);
+  stage.tree.emplace(stage.Name(), nullptr, nullptr, true, orx::kRegistryFlags);
   FileFaults::ForgetFlush(stage.path);
   EXPECT_TRUE(stage.Add(L"S_1", "to a file as it was found"));
   EXPECT_TRUE(FileFaults::IsDurable());
@@ -351,7 +353,7 @@ TEST(SaveAfresh, KeepsModeAndLinksAndIsNotNeeded) {
   const ino_t before = stage.FileNumber();
   const fs::path link = stage.directory / "link.dff";
   fs::create_symlink(stage.path, link);
-  stage.tree.emplace(link.wstring(), nullptr, nullptr, true, 97);
+  stage.tree.emplace(link.wstring(), nullptr, nullptr, true, orx::kRegistryFlags);
   for (const char letter : {'a', 'b', 'c'})
     EXPECT_TRUE(stage.Add(L"big", std::string(5000, letter)));
   EXPECT_NE(stage.FileNumber(), before);

@@ -13,7 +13,7 @@ using orx::cs::velta::RTCMDataSupport;
 using orx::cs::velta::RTCMGenerator;
 
 inline orx::TCSInFileKey LoadTree(const std::wstring& path) {
-  return {path, nullptr, nullptr, true, 97};
+  return {path, nullptr, nullptr, true, orx::kRegistryFlags};
 }
 
 inline orx::TGenericRegistryKey ContainerOf(const orx::TInFileKey& tree) {
@@ -48,14 +48,17 @@ struct Fleet {
     return RTCMDataSupport::MergeRTCMDatumfiles(datums, source) == 0;
   }
 
-  /// Every query finds set 0, the first.
-  bool Answers() const {
+  /// The queries that do not find set 0, the first: none.
+  std::string Unanswered() const {
     const double latitude = 300'000 * 2.42406840554768e-6;
     const double longitude = 36'000 * 2.42406840554768e-6;
     const RTCMGenerator generator(1, datums, projections);
-    return !generator.getAllDatums().empty() && generator.getRtcmProjMessage() &&
-           generator.getRtcmDatumMessage(latitude, longitude, 0) &&
-           generator.get1023(latitude, longitude, 0);
+    std::string unanswered;
+    if (generator.getAllDatums().empty()) unanswered += "list ";
+    if (!generator.getRtcmProjMessage()) unanswered += "projection ";
+    if (!generator.getRtcmDatumMessage(latitude, longitude, 0)) unanswered += "datum ";
+    if (!generator.get1023(latitude, longitude, 0)) unanswered += "1023 ";
+    return unanswered;
   }
 
   const std::wstring directory;

@@ -92,7 +92,7 @@ void Look(const RegistryFile& file, orx::RegistryError answer) {
   Describe(tree);
   EXPECT_EQ(tree.GetErrorState(), answer);
   RegistryFile::AddEntry(tree, L"S_1", "next");
-  EXPECT_EQ(tree.Save(false, 512), answer == orx::kRegistryOk);
+  EXPECT_EQ(tree.Save(false, orx::kRegistryVersion), answer == orx::kRegistryOk);
 }
 
 /// Does something in a process of its own, and fails when that does.

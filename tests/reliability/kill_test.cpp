@@ -56,7 +56,7 @@ const Role kRoles[] = {
        orx::TCSInFileKey tree = LoadTree(directory + L"ROVERS.dff");
        const std::string text = std::to_string(number) + std::string(10'000, ' ');
        ContainerOf(tree).AddValue(L"replaced", RawValue::Block(text), 1, true);
-       return tree.Save(false, 512);
+       return tree.Save(false, orx::kRegistryVersion);
      },
      [](const auto& datums, const auto&, std::uint32_t number) {
        RawValue value;
@@ -70,7 +70,7 @@ const Role kRoles[] = {
          const orx::TCSInFileKey tree = LoadTree(path);
          if (Describe(tree).empty() || tree.GetErrorState() != orx::kRegistryOk) return false;
        }
-       return fleet.Answers();
+       return fleet.Unanswered().empty();
      },
      [](const auto&, const auto&, auto) { return true; }},
 };

@@ -45,10 +45,11 @@ TEST(Threads, IngestMergeLookAndQueryWithoutLoss) {
     }
   };
   const auto query = [&] {
-    while (!done) EXPECT_TRUE(fleet.Answers());
+    while (!done) EXPECT_EQ(fleet.Unanswered(), "");
   };
 
-  std::vector<std::thread> readers, writers;
+  std::vector<std::thread> readers;
+  std::vector<std::thread> writers;
   for (const std::uint32_t first : {2000U, 3000U}) {
     readers.emplace_back(query);
     readers.emplace_back(look);

@@ -93,7 +93,8 @@ TEST(BlockValue, IsHeldWhereItsSizeAndTheCopyFlagSay) {
 
 TEST(BlockValue, SharesABlockAndCanBeSetFromItsOwnBytes) {
   for (const bool copy : {true, false}) {
-    TSimpleBinValue value, sharer;
+    TSimpleBinValue value;
+    TSimpleBinValue sharer;
     value.SetData(1, kBytes, 16, true);
     EXPECT_EQ(sharer.Assign(value), kSuccess);
     EXPECT_EQ(sharer.GetData(), value.GetData());

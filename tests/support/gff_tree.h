@@ -69,7 +69,7 @@ inline void FillKey(orx::TGenericRegistryKey key, const Json& content) {
 }
 
 inline Json ReadGff(const std::filesystem::path& path) {
-  const orx::TInFileKey tree(path.wstring(), nullptr, nullptr, true, 97);
+  const orx::TInFileKey tree(path.wstring(), nullptr, nullptr, true, orx::kRegistryFlags);
   if (tree.GetErrorState() != 0) throw std::runtime_error("unreadable: " + path.string());
   return ReadKey(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)));
 }
@@ -77,9 +77,10 @@ inline Json ReadGff(const std::filesystem::path& path) {
 /// Puts a new file in the place of one.
 inline void WriteGff(const std::filesystem::path& path, const Json& root) {
   std::filesystem::remove(path);
-  orx::TInFileKey tree(L"", L"test", nullptr, false, 97);
+  orx::TInFileKey tree(L"", L"test", nullptr, false, orx::kRegistryFlags);
   FillKey(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)), root);
-  if (!tree.Save(path.wstring(), false, 512)) throw std::runtime_error("unwritable");
+  if (!tree.Save(path.wstring(), false, orx::kRegistryVersion))
+    throw std::runtime_error("unwritable");
 }
 
 }  // namespace velta_test

@@ -15,6 +15,7 @@
 #include "angle.h"
 #include "conversion/message_fields.h"
 #include "conversion/projection_types.h"
+#include "decimal.h"
 #include "orxutils/orx_string.h"
 #include "terminal.h"
 #include "velta/projection_data.h"
@@ -27,13 +28,10 @@ using orx::cs::velta::DatumData;
 using orx::cs::velta::ProjectionData;
 using orx::cs::velta::TableData;
 
-constexpr double kArcSecondsPerRadian = kDegreesPerRadian * 3600;
-constexpr std::uint32_t kMolodenskiBadekas = 3;
 // Steps of the fields of areas and grids, degrees; an edge may lie between two.
-constexpr double kAreaStep = 2 / 3600.0;
-constexpr double kGridStep = 0.5 / 3600;
+constexpr double kAreaStep = orx::cs::velta::kTwoArcSeconds * kDegreesPerRadian;
+constexpr double kGridStep = orx::cs::velta::kHalfArcSecond * kDegreesPerRadian;
 
-constexpr std::string_view kDegrees = "degrees";
 constexpr std::size_t kLabelWidth = 26;
 constexpr std::size_t kValuesPerLine = 4;  // a row of a residual grid
 const std::string kNextLine = "\n" + std::string(kLabelWidth, ' ');
@@ -83,7 +81,7 @@ ordered_json Scaled(std::span<const double> values, double factor) {
   return scaled;
 }
 
-/// How the grid of a datum and that of a projection are told.
+/// How the grid of a datum and that of a projection are labelled.
 struct GridTerms {
   std::string_view areaUnit;
   double areaStep;        ///< of the fields that it is made of
@@ -136,7 +134,7 @@ void AddGrid(const TableData& grid, const ordered_json& area, const GridTerms& t
   description.insert(description.end(), properties.begin(), properties.end());
 }
 
-/// How the parameters of projections are told, by the fields of their messages.
+/// How the parameters of projections are labelled, by the fields of their messages.
 struct ParameterTerms {
   std::string_view field;
   const char* label;
@@ -182,35 +180,12 @@ ordered_json EllipsoidJson(double a, double b) {
   return ellipsoid;
 }
 
-/// True when two numbers differ by no more than the rounding of their computation. The smallest
-/// step of a message is ten times as large, that of the scale factor.
-bool IsSameNumber(double a, double b) {
-  constexpr double kRounding = 1e-12;
-  return std::abs(a - b) <= kRounding * std::max({1.0, std::abs(a), std::abs(b)});
-}
-
 bool IsSame(const ordered_json& a, const ordered_json& b) {
   if (a.is_number_float() && b.is_number_float()) {
     return IsSameNumber(a.get<double>(), b.get<double>());
   }
   if (!a.is_structured() || a.type() != b.type() || a.size() != b.size()) return a == b;
   return std::equal(a.begin(), a.end(), b.begin(), IsSame);
-}
-
-/// The number with the fewest digits that is the same but for rounding.
-/// \param step of the field that it is from, 0 when it is not known
-double Shortest(double number, double step) {
-  constexpr int kDigits = 17;
-  constexpr double kShare = 0.01;
-  for (int digits = 1; digits < kDigits; ++digits) {
-    std::array<char, 32> text;
-    std::snprintf(text.data(), text.size(), "%.*g", digits, number);
-    const double shorter = std::strtod(text.data(), nullptr);
-    const bool isSame =
-        IsSameNumber(shorter, number) || std::abs(shorter - number) <= kShare * step;
-    if (isSame) return shorter == 0 ? 0 : shorter;
-  }
-  return number;
 }
 
 ordered_json WithShortNumbers(ordered_json value, double step) {
@@ -229,16 +204,8 @@ ordered_json WithDegreesMinutesSeconds(ordered_json value) {
   return value;
 }
 
-/// Without an exponent, but for what no message can hold.
 std::string NumberText(const ordered_json& number, double step) {
-  constexpr double kLarge = 1e15;
-  if (!number.is_number_float()) return number.dump();
-  const double value = number.get<double>();
-  std::array<char, 64> digits;
-  const auto format =
-      std::abs(value) < kLarge ? std::chars_format::fixed : std::chars_format::general;
-  char* const end = std::to_chars(digits.begin(), digits.end(), Shortest(value, step), format).ptr;
-  return {digits.data(), end};
+  return number.is_number_float() ? ShortestText(number.get<double>(), step) : number.dump();
 }
 
 std::string ValueText(const ordered_json& value, double step) {
@@ -320,7 +287,7 @@ Description Describe(const DatumData& datum) {
        "arc-seconds, coordinate frame"},
       {"scale correction", "scaleCorrection", parameters[6], "ppm"},
   };
-  if (datum.computationIndicator == kMolodenskiBadekas) {
+  if (datum.computationIndicator == orx::cs::velta::kMolodenskiBadekas) {
     description.push_back(
         {"rotation point", "rotationPoint", Scaled(parameters.subspan(7, 3), 1), "m"});
   }

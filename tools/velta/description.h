@@ -7,12 +7,15 @@
 #include <vector>
 
 #include "velta/datum_data.h"
+#include "velta/message_units.h"
 #include "velta/table_data.h"
 
 namespace velta_tool {
 
-inline constexpr double kPi = 3.141592653589793;
+inline constexpr double kPi = orx::cs::velta::kWholeLatitude;
 inline constexpr double kDegreesPerRadian = 180 / kPi;
+inline constexpr double kArcSecondsPerRadian = kDegreesPerRadian * 3600;
+inline constexpr std::string_view kDegrees = "degrees";
 
 /// One thing to say about an entry.
 struct Property {

@@ -167,10 +167,7 @@ std::vector<ReceivedEntry> ReceivedProjections(const velta::MsgUtilized& set) {
     AddProjection(*set.msg1025, set.msg1024, set.msg1025->projectionType, projection, entries);
   }
   if (set.msg1027) {
-    std::uint32_t code = set.msg1027->projectionType;
-    const bool isRectified = set.msg1027->rectificationFlag && code == velta::ProjectionData::OM;
-    if (isRectified) code = velta::ProjectionData::ROM;
-    AddProjection(*set.msg1027, set.msg1024, code, projection, entries);
+    AddProjection(*set.msg1027, set.msg1024, velta::TypeCodeOf(*set.msg1027), projection, entries);
   }
   return entries;
 }

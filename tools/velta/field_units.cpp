@@ -2,9 +2,7 @@
 
 #include <algorithm>
 #include <array>
-#include <cmath>
 #include <cstdio>
-#include <cstdlib>
 #include <nlohmann/json.hpp>
 #include <string_view>
 #include <utility>
@@ -13,6 +11,7 @@
 
 #include "angle.h"
 #include "conversion/message_fields.h"
+#include "decimal.h"
 #include "description.h"
 #include "orxutils/orx_string.h"
 #include "rtcm3/fields.h"
@@ -22,36 +21,44 @@ namespace rtcm3 = orx::cs::velta::rtcm3;
 namespace velta = orx::cs::velta;
 namespace {
 
-constexpr double kArcSecondsPerRadian = kDegreesPerRadian * 3600;
-constexpr std::string_view kDegrees = "degrees";
-
 /// How the numbers of a scaling are shown.
 struct Unit {
   const velta::Scaling* scaling;
   std::string_view name;
-  const char* step;      ///< of the field, for people
   double perNumber = 1;  ///< from the unit of the description
 
   double Shown(double integer) const { return scaling->toNumber(integer) * perNumber; }
+  double Step() const { return Shown(1) - Shown(0); }
 };
 constexpr Unit kUnits[] = {
-    {&velta::kAreaAngle, kDegrees, "2 arc-seconds", kDegreesPerRadian},
-    {&velta::kGridAngle, kDegrees, "0.5 arc-seconds", kDegreesPerRadian},
-    {&velta::kProjectionAngle, kDegrees, "1.1e-8"},
-    {&velta::kGridSpacing, "arc-seconds", "0.5", kArcSecondsPerRadian},
-    {&velta::kRotation, "arc-seconds", "0.00002"},
-    {&velta::kMeanAngle, "arc-seconds", "0.001", kArcSecondsPerRadian},
-    {&velta::kResidualAngle, "arc-seconds", "0.00003", kArcSecondsPerRadian},
-    {&velta::kScaleCorrection, "ppm", "0.00001"},
-    {&velta::kTranslation, "metres", "0.001"},
-    {&velta::kSemiMajorAxis, "metres", "0.001 from 6370000"},
-    {&velta::kSemiMinorAxis, "metres", "0.001 from 6350000"},
-    {&velta::kPlaneGridLength, "metres", "10"},
-    {&velta::kMeanLength, "metres", "0.01"},
-    {&velta::kResidualLength, "metres", "0.001"},
-    {&velta::kProjectionLength, "metres", "0.001"},
-    {&velta::kScaleFactor, "factor", "1e-11 from 0.993"},
+    {&velta::kAreaAngle, kDegrees, kDegreesPerRadian},
+    {&velta::kGridAngle, kDegrees, kDegreesPerRadian},
+    {&velta::kProjectionAngle, kDegrees},
+    {&velta::kGridSpacing, "arc-seconds", kArcSecondsPerRadian},
+    {&velta::kRotation, "arc-seconds"},
+    {&velta::kMeanAngle, "arc-seconds", kArcSecondsPerRadian},
+    {&velta::kResidualAngle, "arc-seconds", kArcSecondsPerRadian},
+    {&velta::kScaleCorrection, "ppm"},
+    {&velta::kTranslation, "metres"},
+    {&velta::kSemiMajorAxis, "metres"},
+    {&velta::kSemiMinorAxis, "metres"},
+    {&velta::kPlaneGridLength, "metres"},
+    {&velta::kMeanLength, "metres"},
+    {&velta::kResidualLength, "metres"},
+    {&velta::kProjectionLength, "metres"},
+    {&velta::kScaleFactor, "factor"},
 };
+
+/// The step of a unit, and what its integers are added to.
+std::string StepText(const Unit& unit) {
+  constexpr int kDigits = 7;
+  std::array<char, 64> text;
+  std::snprintf(text.data(), text.size(), "%.*g", kDigits, unit.Step());
+  std::string step = text.data();
+  if (unit.Shown(0) == 0) return step;
+  std::snprintf(text.data(), text.size(), "%.*g", kDigits, unit.Shown(0));
+  return step + " from " + text.data();
+}
 
 /// A field that is no code, count or day.
 struct FieldUnit {
@@ -100,22 +107,10 @@ const Unit* UnitOf(std::string_view field) {
   return found == fields.end() ? nullptr : found->unit;
 }
 
-/// The decimal number with the fewest digits that is the same to a hundredth of the step.
-std::string DecimalText(double number, double step) {
-  constexpr double kShare = 0.01;
-  constexpr int kMostDecimals = 15;
-  std::array<char, 64> text{};
-  for (int decimals = 0; decimals <= kMostDecimals; ++decimals) {
-    std::snprintf(text.data(), text.size(), "%.*f", decimals, number);
-    if (std::abs(std::strtod(text.data(), nullptr) - number) <= kShare * step) break;
-  }
-  return text.data();
-}
-
 std::string ValueText(const Unit& unit, std::int64_t integer, bool dms) {
   const double value = unit.Shown(static_cast<double>(integer));
   if (dms && unit.name == kDegrees) return nlohmann::json(DegreesMinutesSeconds(value)).dump();
-  return DecimalText(value, unit.Shown(1) - unit.Shown(0));
+  return ShortestText(value, unit.Step());
 }
 
 /// Visits the fields of a message.
@@ -179,7 +174,7 @@ std::string FieldsByUnit() {
   const std::vector<FieldUnit> fields = ScaledFields();
   std::string text;
   for (const Unit& unit : kUnits) {
-    std::string line = "  " + std::string(unit.name) + ", steps of " + unit.step + ":";
+    std::string line = "  " + std::string(unit.name) + ", steps of " + StepText(unit) + ":";
     for (const FieldUnit& scaled : fields) {
       if (scaled.unit != &unit) continue;
       if (line.size() + scaled.field.size() > kLine) {

@@ -79,7 +79,7 @@ bool IsTerminal(const fs::path& path) {
   return file && orx::FileFuncs::isTerminal(file.get());
 }
 
-/// True for a file that is one, whatever its name, and for the name of one.
+/// True for a registry file under any name, and for any name that a registry file may have.
 bool IsRegistryFile(const std::string& name) {
   if (KindOf(name) != FileKind::kOther) return true;
   if (!orx::FileFuncs::isFileExists(ToWide(name))) return false;
@@ -112,13 +112,19 @@ std::string NameOf(const fs::path& path) {
 }
 
 FileKind KindOf(const std::string& file) {
-  constexpr std::size_t kExtension = 4;
-  const std::size_t length = std::min(file.size(), kExtension);
-  const std::wstring extension = orx::Widen(file.substr(file.size() - length));
-  const auto is = [&](const wchar_t* known) { return orx::EqualsIgnoringCase(extension, known); };
-  if (is(orx::cs::velta::kDatumFileExtension)) return FileKind::kDatum;
-  if (is(orx::cs::velta::kProjectionFileExtension)) return FileKind::kProjection;
+  const std::wstring name = orx::Widen(file);
+  const auto ends = [&](std::wstring_view extension) {
+    return name.size() >= extension.size() &&
+           orx::EqualsIgnoringCase(name.substr(name.size() - extension.size()), extension);
+  };
+  if (ends(orx::cs::velta::kDatumFileExtension)) return FileKind::kDatum;
+  if (ends(orx::cs::velta::kProjectionFileExtension)) return FileKind::kProjection;
   return FileKind::kOther;
+}
+
+std::string ExtensionOf(FileKind kind) {
+  return orx::ToUtf8(kind == FileKind::kDatum ? orx::cs::velta::kDatumFileExtension
+                                              : orx::cs::velta::kProjectionFileExtension);
 }
 
 void RequireFile(const std::string& file) {
@@ -134,12 +140,14 @@ void RequireFile(const std::string& file) {
 
 const CLI::Validator kFileName(
     [](std::string& name) { return name.empty() ? "the name is empty" : ""; }, "");
-const CLI::Validator kDatumFile =
-    KindCheck(".dff", [](FileKind kind) { return kind == FileKind::kDatum; });
+const CLI::Validator kDatumFile = KindCheck(ExtensionOf(FileKind::kDatum),
+                                            [](FileKind kind) { return kind == FileKind::kDatum; });
 const CLI::Validator kProjectionFile =
-    KindCheck(".prj", [](FileKind kind) { return kind == FileKind::kProjection; });
+    KindCheck(ExtensionOf(FileKind::kProjection),
+              [](FileKind kind) { return kind == FileKind::kProjection; });
 const CLI::Validator kDatumOrProjectionFile =
-    KindCheck(".dff or .prj", [](FileKind kind) { return kind != FileKind::kOther; });
+    KindCheck(ExtensionOf(FileKind::kDatum) + " or " + ExtensionOf(FileKind::kProjection),
+              [](FileKind kind) { return kind != FileKind::kOther; });
 
 Input::Input(const std::string& name) : memory_(kInputBuffer) {
   if (name == kStandardStream) {

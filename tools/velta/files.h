@@ -25,11 +25,13 @@ std::string NameOf(const std::filesystem::path& path);
 /// The two kinds of files that the library keeps, by their extensions.
 enum class FileKind { kDatum, kProjection, kOther };
 FileKind KindOf(const std::string& file);
+/// \param kind one of the two
+std::string ExtensionOf(FileKind kind);
 
 /// \throws std::runtime_error that says why the file is none that can be read
 void RequireFile(const std::string& file);
 
-/// What nobody should have asked for: it is refused before anything is done.
+/// A request that is refused before anything is done.
 struct WrongCall : std::runtime_error {
   using std::runtime_error::runtime_error;
 };
@@ -119,8 +121,8 @@ struct FileState {
   std::string text;  ///< empty when nothing is wrong
 };
 
-/// The state of a file that the library reads without telling it: the whole is read, also what the
-/// library does not use.
+/// The state of a file, which the library does not tell. Reads the whole of it, also what the
+/// library skips.
 FileState StateOf(const std::string& file);
 
 }  // namespace velta_tool

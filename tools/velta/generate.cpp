@@ -113,7 +113,7 @@ std::string NearestAreas(const std::string& file, std::string_view key, double n
   return lines;
 }
 
-/// What is wrong with a file, in front of what follows from it.
+/// The damage of a file and a separator, to stand in front of what follows from it.
 std::string Before(const std::string& damage) { return damage.empty() ? "" : damage + "; "; }
 
 /// Says that a datum file has no entry to use for the position. The library does not tell an area
@@ -140,9 +140,9 @@ std::runtime_error NoPlaneGridError(const Options& options, const std::string& d
       NearestAreas(options.projection, "gridArea", northing, easting, 0, Decimal));
 }
 
-/// Says of which entry a message does not hold what is stored.
+/// Names the entry whose numbers do not fit the message.
 std::runtime_error MisfitError(unsigned number, const Options& options, std::string reason) {
-  // What a double becomes that no integer can hold.
+  // Truncation gives these for numbers that no integer holds.
   for (const char* const beyond : {", not -2147483648", ", not -9223372036854775808"}) {
     if (reason.ends_with(beyond)) {
       reason.replace(reason.rfind(','), reason.npos, ", and what is stored is beyond any");

@@ -78,7 +78,7 @@ std::vector<unsigned> Held(const rtcm3::MessageSet& set, std::initializer_list<u
   return held;
 }
 
-/// What may be otherwise when the set is tried again; a message stays what it is.
+/// True for results that another try may change; those that are due to the messages stay.
 bool IsOfTheFiles(ResultCode result) {
   constexpr ResultCode kOfMessages[] = {
       orx::cs::velta::kMissing1023, orx::cs::velta::kBadComputationIndicator,
@@ -383,8 +383,8 @@ class Ingestion {
   std::unique_ptr<const RTCMDataSupport> fresh_;
   std::unique_ptr<RTCMDataSupport> support_;
   rtcm3::MessageSets sets_;
-  std::uint64_t repeatsBefore_ = 0;  ///< in front of the message in hand
-  /// What files have otherwise than received, by file and entry.
+  std::uint64_t repeatsBefore_ = 0;  ///< counted before the current message
+  /// Differences that have been reported, by file and entry.
   std::map<std::pair<std::wstring, std::wstring>, std::vector<std::string>> toldDifferences_;
   std::map<std::wstring, std::set<std::string>, orx::NameOrder> receivedNames_;  ///< by file
   std::map<std::wstring, bool> holdsOtherKind_;                                  ///< by file

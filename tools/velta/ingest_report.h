@@ -19,7 +19,7 @@ struct IngestedPart {
   std::string file;                ///< name without its directory
   bool isThere = false;            ///< the file has the entry
   bool added = false;              ///< it has got it now
-  /// What it has otherwise than received; the file's values stay.
+  /// Labels of the values that differ from the received ones; the file's stay.
   std::vector<std::string> different;
   bool isDifferenceNew = false;  ///< that has not been told yet
 };
@@ -28,7 +28,7 @@ struct IngestedSet {
   std::uint32_t systemId;
   orx::cs::velta::ResultCode result;
   std::vector<IngestedPart> parts;
-  std::vector<std::string> changed;    ///< fields of the datum message that were other before
+  std::vector<std::string> changed;    ///< fields of the datum message that changed
   std::vector<unsigned> notAnnounced;  ///< received, but not announced by the datum message
 
   bool IsDone() const { return result == orx::cs::velta::kSuccess; }

@@ -26,7 +26,7 @@ struct Merge {
   bool json = false;
 };
 
-/// How many of the source's entries the target has, and has not.
+/// How many of the source's entries are new in the target, and how many it had.
 struct MergeCounts {
   std::size_t added = 0;
   std::size_t replaced = 0;
@@ -45,8 +45,7 @@ MergeCounts Count(const Entries& target, const Entries& source) {
 void RequireUsable(const std::string& file, const Entries& found) {
   if (!found.error.empty()) throw std::runtime_error(file + ": " + found.error);
   if (found.entries.empty() || HoldsOtherKind(file)) {
-    throw std::runtime_error(file + ": is named " +
-                             (KindOf(file) == FileKind::kDatum ? ".dff" : ".prj") +
+    throw std::runtime_error(file + ": is named " + ExtensionOf(KindOf(file)) +
                              ", but has no entry of that kind, or some of the other");
   }
 }

@@ -35,11 +35,11 @@ class SharedFile : public orx::TCSInFileKey {
   }
 };
 
-/// The table of shared files. A name that no file has leaves nothing in it.
-class SharedFiles {
+/// The table of shared files. A name without a file is not entered.
+class FileTable {
  public:
-  /// Counts a user, also of a file that has gone or cannot be read any more, as it is given back in
-  /// any case; not when there is no such file or an exception passes.
+  /// Counts a user even when the file has gone or cannot be read any more, because it is given back
+  /// all the same; not when there never was a file or an exception passes.
   std::int32_t Get(const wchar_t* name, orx::TCSInFileKey** file) {
     *file = nullptr;
     SharedFile* const shared = Find(name);
@@ -90,8 +90,8 @@ class SharedFiles {
   std::map<std::wstring, SharedFile*, orx::NameOrder> names_;
 };
 
-SharedFiles& Files() {
-  static SharedFiles files;
+FileTable& Files() {
+  static FileTable files;
   return files;
 }
 

@@ -69,7 +69,7 @@ bool TInFileKey::Save(const COrxStringT<wchar_t>& fileName, bool /*flag*/,
   return file && PublishFile(*path, *file, nullptr);
 }
 
-bool TInFileKey::HasUnsavedChanges() const { return tree_->has_unsaved(); }
+bool TInFileKey::HasUnsavedChanges() const { return tree_->HasUnsaved(); }
 
 void TInFileKey::ForgetChanges() noexcept {
   try {

@@ -80,8 +80,8 @@ void KeyTree::AddLayer(Key& key, record::KeyRecord record) {
   key.last_ = layer;
 }
 
-// Taking a layer apart twice is the same as once, so a list counts as whole only when all of it is
-// done, whatever interrupts that.
+// An exception may interrupt the taking apart. To do it again adds nothing twice, so a list is
+// marked whole only at the end.
 
 NamedList<ValueRecord>& KeyTree::TakeValues(Key& key) {
   if (!key.values_) key.values_ = Make<NamedList<ValueRecord>>(&memory_);

@@ -119,7 +119,7 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   void DeepCopy(Key& to, Key& from);
 
   /// True from the first change until MarkSaved().
-  bool has_unsaved() const { return pending_.any(); }
+  bool HasUnsaved() const { return pending_.Any(); }
   /// Bytes of saved values that unsaved ones replace.
   std::uint64_t superseded() const { return pending_.superseded(); }
   /// Appends the record of the root with what is not saved.
@@ -154,7 +154,7 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   std::pmr::monotonic_buffer_resource memory_;
   Key* root_;
   VisitedValues visited_;
-  bool isAsLoaded_ = true;  ///< the layers of the keys are all there is
+  bool isAsLoaded_ = true;  ///< nothing was changed since it was loaded
   PendingChanges pending_;
 };
 

@@ -11,7 +11,7 @@ class LockWait {
   /// \param file must outlive the object
   explicit LockWait(const std::filesystem::path& file);
 
-  /// Waits a little, longer from time to time. After a second it tells whoever asked for it
+  /// Waits a little, each time somewhat longer. After a second it tells whoever asked for it
   /// (OnAwaitedLock).
   /// \return false when it has been long enough
   bool GoOn();

@@ -10,7 +10,7 @@
 /// operating system. Every failure is reported by the result; nothing throws.
 namespace orx::os {
 
-/// Tells a file, and a state of it, from others.
+/// Identifies a file and its state.
 struct FileStamp {
   std::uint64_t device = 0;
   std::uint64_t file = 0;
@@ -54,7 +54,7 @@ class File {
   bool Truncate(std::uint64_t size);
 
   /// Gives the file the owner, the group and the mode of another, where the system has them.
-  /// \return false when that cannot be done, or is not all that tells who may use the file
+  /// \return false when that fails, or when an access control list says more
   bool TakeAccessOf(const File& other);
 
   /// Makes what was written durable, the file's size included.

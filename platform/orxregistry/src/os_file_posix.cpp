@@ -32,7 +32,7 @@ auto Retry(Call call) {
 }
 
 /// Keeps the system's error when a call has failed.
-/// \param call its name where it is one that some file systems lack
+/// \param call its name, if it is one that some file systems do not support
 bool Check(bool done, const char* call = nullptr) {
   if (!done) KeepFileError(call);
   return done;

@@ -24,7 +24,7 @@ PendingChanges::OfKey& PendingChanges::Of(const Key& key) {
     try {
       Of(*key.parent).keys.push_back(&key);
     } catch (...) {
-      keys_.erase(&key);  // nobody would come to it
+      keys_.erase(&key);  // no save would reach it
       throw;
     }
   }

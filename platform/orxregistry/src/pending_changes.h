@@ -26,18 +26,18 @@ class PendingChanges {
 
     /// Makes room, so that Add() of the same place does not throw.
     void Reserve(std::size_t value);
-    /// \return false when it was pending
+    /// \return false when it was pending already
     bool Add(std::size_t value);
   };
 
   /// True from the first change until Clear().
-  bool any() const { return !keys_.empty(); }
+  bool Any() const { return !keys_.empty(); }
   /// What a save will write at least.
   std::size_t bytes() const { return bytes_; }
   /// Bytes of saved values that pending ones replace.
   std::uint64_t superseded() const { return superseded_; }
 
-  /// What is pending of a key, which gets known to the keys above it.
+  /// What is pending of a key, which is also entered at the keys above it.
   OfKey& Of(const Key& key);
   /// \return null when nothing is
   const OfKey* Find(const Key& key) const;

@@ -137,7 +137,7 @@ inline Value ValueRecord::value() const {
 inline ValueRecord TakeValue(Bytes& bytes) {
   if (bytes.size() < kValueHeader) return {};
   const ValueRecord record(bytes.data());
-  const Value value = record.value();  // where it claims to be
+  const Value value = record.value();  // not checked yet
   const std::size_t size = kValueHeader + value.name.bytes + value.dataSize;
   if (size > bytes.size() || !IsConsistent(value)) return {};
   bytes.remove_prefix(size);

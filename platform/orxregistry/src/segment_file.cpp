@@ -223,7 +223,7 @@ std::optional<Buffer> MakeRegistryFile(KeyTree& tree) {
 
 std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, const Buffer& bytes,
                                          const os::File* replaced) {
-  // A name may be taken by something that nobody left over; then the next is tried.
+  // Something that is no left-over may have the name; then the next is tried.
   std::filesystem::path beside;
   std::optional<os::File> file;
   for (const char* const ending : {".new", ".new1", ".new2", ".new3"}) {
@@ -259,7 +259,7 @@ AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
   if (!file) return AppendResult::kFailed;
   FilePosition at = tree.position;
   const AppendResult result = CatchUp(*file, at);
-  if (result == AppendResult::kFailed || !tree.has_unsaved()) return result;
+  if (result == AppendResult::kFailed || !tree.HasUnsaved()) return result;
 
   Buffer segment(kSegmentHeader);
   tree.WriteUnsaved(segment);

@@ -52,7 +52,7 @@ struct FilePosition {
 
 /// How an append ended.
 enum class AppendResult {
-  kFailed,       ///< what was durable still is; nothing else is promised
+  kFailed,       ///< nothing durable was lost; whether the new part is in the file is open
   kAppended,     ///< durable; the tree's position is that of the new end
   kBehindOthers  ///< durable, behind segments that somebody else appended since that position
 };

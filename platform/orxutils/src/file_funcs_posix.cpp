@@ -51,7 +51,7 @@ bool MakeDirectory(const fs::path& path, std::error_code& error) {
   if (parent != path && !MakeDirectory(parent, error)) return false;
   if (!fs::create_directory(path, error)) {
     std::error_code ignored;
-    if (fs::is_directory(path, ignored)) {  // another's
+    if (fs::is_directory(path, ignored)) {  // another process made it
       error.clear();
       return true;
     }
@@ -88,7 +88,7 @@ bool flushName(const fs::path& path) noexcept try {
     return Retry([&] { return fsync(names.get()); }) == 0 || errno == EINVAL;
   }
   if (errno != EACCES) return false;
-  // Who may not read the directory has the whole file system flushed.
+  // Without the right to read the directory, the whole file system is flushed.
   const Handle named(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK);
   return named.get() >= 0 && syncfs(named.get()) == 0;
 } catch (const std::bad_alloc&) {

@@ -5,7 +5,7 @@
 namespace orx {
 namespace {
 
-/// The longest that a directory's name may be without its long form.
+/// The longest name that Windows takes for a directory without the `\\?\` form.
 constexpr std::size_t kMaxPlainName = 247;
 
 }  // namespace

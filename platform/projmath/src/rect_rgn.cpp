@@ -13,7 +13,7 @@ bool InRange(double value, double from, double extent) {
   return value >= from && value <= from + extent;
 }
 
-/// What whole turns cost a longitude in rounding, radians: far below a micrometre on the ground.
+/// The rounding error of taking off whole turns, radians: far below a micrometre on the ground.
 constexpr double kTurnRounding = 1e-14;
 
 /// Looks for the longitude in the range as it is, then for the same meridian by another number.

@@ -27,7 +27,7 @@ COrxStringT<wchar_t> GetUserGeoDir() {
   const std::filesystem::path replacement = Variable(kReplacement);
   if (!replacement.empty()) return NameOf({kReplacement, replacement});
   Directory data = DataDirectory();
-  // Below the working directory nobody would look for it.
+  // A relative directory would depend on the working directory.
   if (!data.path.is_absolute()) {
     throw std::runtime_error(data.source + " names no directory; set it or " + kReplacement);
   }

@@ -29,7 +29,7 @@ inline constexpr unsigned kRegistryVersion = 512;
 /// What trees are made and opened with; no meaning here.
 inline constexpr unsigned kRegistryFlags = 97;
 
-/// A save waits so long for a file that another process holds, then it fails.
+/// How long a save waits for a file that another process holds.
 inline constexpr std::chrono::seconds kLongestLockWait{10};
 
 /// Hears of a file whose lock another process holds, in the thread that saves.

@@ -14,7 +14,7 @@ namespace orx {
 /// \return nothing when the name is no text, and so no path
 ORXUTILS_EXPORT std::optional<std::filesystem::path> ToPath(const COrxStringT<wchar_t>& name);
 
-/// A path in the form in which this system's calls take it: on Windows one longer than MAX_PATH
+/// A path in the form in which this system's calls take it: on Windows one too long for that
 /// gets the absolute form that may be so long, every other stays as it is.
 ORXUTILS_EXPORT std::filesystem::path ToSystemPath(const std::filesystem::path& path);
 
