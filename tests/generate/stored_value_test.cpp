@@ -20,7 +20,7 @@ constexpr double kLatitude = 374415 * kHalfSecond;
 constexpr double kLongitude = 64815 * kHalfSecond;
 constexpr const char* kAll = "list datum 1023 1024 projection";
 constexpr const char* kNoGrid = "list datum projection";
-constexpr const char* kNoGridNorList = "datum projection";
+constexpr const char* kNoList = "datum projection";
 
 /// The DHDN set's files, to be changed and asked about.
 class StoredValueTest : public RtcmTest {
@@ -146,15 +146,15 @@ TEST_F(StoredValueTest, GridsOfAnyShapeAreSafe) {
                                                      {1, 1, kNoGrid},
                                                      {1, 4, kNoGrid},
                                                      {16, 1, kNoGrid},
-                                                     {5, 5, kNoGridNorList},
-                                                     {17, 1, kNoGridNorList},
-                                                     {0, 0, kNoGridNorList},
-                                                     {0, 4, kNoGridNorList},
-                                                     {4, 0, kNoGridNorList},
-                                                     {-4, -4, kNoGridNorList},
-                                                     {65536, 65536, kNoGridNorList},
-                                                     {INT32_MIN, -1, kNoGridNorList},
-                                                     {-1, 1, kNoGridNorList}};
+                                                     {5, 5, kNoList},
+                                                     {17, 1, kNoList},
+                                                     {0, 0, kNoList},
+                                                     {0, 4, kNoList},
+                                                     {4, 0, kNoList},
+                                                     {-4, -4, kNoList},
+                                                     {65536, 65536, kNoList},
+                                                     {INT32_MIN, -1, kNoList},
+                                                     {-1, 1, kNoList}};
   for (const auto& [rows, columns, found] : cases) {
     for (Json* const key : {&DatumEntry()["TargetDatum"], &ProjectionEntry()["TableProj"]}) {
       (*key)["NRowsT"][kContent] = {rows};

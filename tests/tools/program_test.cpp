@@ -209,14 +209,5 @@ TEST_F(ProgramTest, TakesWhatAnOperatorSendsWhereverTheRecordingEnds) {
   }
 }
 
-TEST_F(ProgramTest, ConvertsTheExamplesToTheByteBothWays) {
-  for (const std::string name : {"dhdn", "molodenski"}) {
-    const std::string frames = ReadBytes(EXAMPLE_STREAMS "/" + name + ".rtcm3");
-    const std::string lines = ReadBytes(EXAMPLE_STREAMS "/" + name + ".jsonl");
-    EXPECT_EQ(Run("encode -", lines).out, frames);
-    EXPECT_EQ(Run("decode -", frames).out, lines);
-  }
-}
-
 }  // namespace
 }  // namespace velta_test
