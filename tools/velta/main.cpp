@@ -4,6 +4,7 @@
 #include <exception>
 #include <iostream>
 #include <sstream>
+#include <stdexcept>
 #include <string>
 #include <utility>
 #include <vector>
@@ -73,7 +74,9 @@ int Run(std::vector<std::string> arguments) {
     std::ostringstream out;
     std::ostringstream err;
     const int status = program.exit(error, out, err);
-    std::cout << out.str();
+    if (!(std::cout << out.str() << std::flush)) {
+      throw std::runtime_error("standard output: cannot be written");
+    }
     std::cerr << WithoutControls(err.str());  // names of files among it
     return status == 0 ? kDone : kWrongCall;
   }

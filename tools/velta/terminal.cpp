@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <string_view>
 #include <utility>
 
 #include "orxutils/file_funcs.h"
@@ -13,31 +14,41 @@ constexpr std::chrono::seconds kLongInput{1};
 constexpr std::chrono::milliseconds kBetweenUpdates{200};
 constexpr double kMegabyte = 1e6;
 
-/// The control character at a place of a UTF-8 text, one of ASCII or of U+0080 to U+009F.
-/// \return its code, -1 when there is none
-int ControlAt(const std::string& text, std::size_t at) {
-  constexpr unsigned char kDelete = 0x7F;
-  constexpr unsigned char kLead = 0xC2;
-  const auto first = static_cast<unsigned char>(text[at]);
-  if (first < ' ' || first == kDelete) return first;
-  if (first != kLead || at + 1 == text.size()) return -1;
-  const auto second = static_cast<unsigned char>(text[at + 1]);
-  return second >= 0x80 && second < 0xA0 ? second : -1;
+/// A character that a terminal obeys instead of showing it.
+struct Control {
+  unsigned code = 0;
+  std::size_t bytes = 0;  ///< in UTF-8; 0: there is none
+};
+
+/// The control character at a place of a UTF-8 text: one of ASCII, of U+0080 to U+009F, or one that
+/// ends or reorders a line.
+Control ControlAt(std::string_view text, std::size_t at) {
+  constexpr unsigned kDelete = 0x7F;
+  const auto byte = [&](std::size_t i) {
+    return at + i < text.size() ? static_cast<unsigned char>(text[at + i]) : 0U;
+  };
+  if (byte(0) < ' ' || byte(0) == kDelete) return {byte(0), 1};
+  if (byte(0) == 0xC2 && byte(1) >= 0x80 && byte(1) < 0xA0) return {byte(1), 2};
+  if (byte(0) != 0xE2) return {};
+  const unsigned code = 0x2000 | (byte(1) & 0x3FU) << 6U | (byte(2) & 0x3FU);
+  const auto isIn = [code](unsigned first, unsigned last) { return code >= first && code <= last; };
+  const bool reorders = isIn(0x200E, 0x200F) || isIn(0x202A, 0x202E) || isIn(0x2066, 0x2069);
+  const bool endsLine = isIn(0x2028, 0x2029);
+  return reorders || endsLine ? Control{code, 3} : Control();
 }
 
 std::string Escaped(const std::string& text, bool keepsLines) {
-  constexpr int kFirstOfTwoBytes = 0x80;
   std::string escaped;
-  for (std::size_t at = 0; at < text.size(); ++at) {
-    const int control = ControlAt(text, at);
-    if (control < 0 || (keepsLines && control == '\n')) {
-      escaped += text[at];
+  for (std::size_t at = 0; at < text.size();) {
+    const Control control = ControlAt(text, at);
+    if (control.bytes == 0 || (keepsLines && control.code == '\n')) {
+      escaped += text[at++];
       continue;
     }
     char code[sizeof "\\u0000"];
-    std::snprintf(code, sizeof code, "\\u%04x", static_cast<unsigned>(control) & 0xFFU);
+    std::snprintf(code, sizeof code, "\\u%04x", control.code & 0xFFFFU);
     escaped += code;
-    if (control >= kFirstOfTwoBytes) ++at;
+    at += control.bytes;
   }
   return escaped;
 }
@@ -47,7 +58,7 @@ std::string Escaped(const std::string& text, bool keepsLines) {
 std::string WithoutControls(std::string text) {
   const auto isSuspicious = [](char c) {
     const auto byte = static_cast<unsigned char>(c);
-    return (byte < ' ' && byte != '\n') || byte == 0x7F || byte == 0xC2;
+    return (byte < ' ' && byte != '\n') || byte == 0x7F || byte == 0xC2 || byte == 0xE2;
   };
   if (std::none_of(text.begin(), text.end(), isSuspicious)) return text;
   return Escaped(text, true);
