@@ -46,17 +46,18 @@ boost::shared_ptr<RtcmBasicTransformMessage> MakeMessage(const projmath::TRectRg
 boost::shared_ptr<RtcmBasicTransformMessage> RTCMGenerator::getRtcmDatumMessage(
     double latitude, double longitude, double /*height*/) const {
   const TGenericRegistryKey container = OpenContainer(datumFile_);
-  for (TGenRegKeyIterator walk(container); walk;) {
-    const TGenericRegistryKey standard =
-        OpenExisting(TGenericRegistryKey(walk++), layout::kStandardDatum);
-    projmath::TRectRgn area;
-    if (!ReadValidityArea(standard, area)) return nullptr;
-    if (!area.Inside(latitude, longitude, false)) continue;
-    DatumData datum;
-    if (!ReadTransformation(container, standard, datum)) return nullptr;
-    return MakeMessage(area, datum, static_cast<std::uint32_t>(systemId_));
-  }
-  return nullptr;
+  TGenericRegistryKey standard(nullptr);  // of the entry that is looked at
+  projmath::TRectRgn area;
+  const auto areaOf = [&](const TGenericRegistryKey& entry, projmath::TRectRgn& its) {
+    standard = OpenExisting(entry, layout::kStandardDatum);
+    if (!ReadValidityArea(standard, its)) return false;
+    area = its;
+    return true;
+  };
+  if (FirstHolding(container, latitude, longitude, false, areaOf).IsNull()) return nullptr;
+  DatumData datum;
+  if (!ReadTransformation(container, standard, datum)) return nullptr;
+  return MakeMessage(area, datum, static_cast<std::uint32_t>(systemId_));
 }
 
 }  // namespace orx::cs::velta

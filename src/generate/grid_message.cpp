@@ -18,28 +18,26 @@ struct GridKind {
 constexpr GridKind kEllipsoidal{layout::kDatumGrid, false};
 constexpr GridKind kPlane{layout::kProjectionGrid, true};
 
-/// The record of the first entry whose grid holds the position. An entry in front of it that cannot
-/// be searched ends the search.
+/// The record of the first entry whose grid holds the position.
 template <class Message>
 boost::shared_ptr<Message> FindGrid(const COrxStringT<wchar_t>& fileName, const GridKind& kind,
                                     double north, double east, std::int32_t systemId) {
   const TGenericRegistryKey container = OpenContainer(fileName);
-  for (TGenRegKeyIterator walk(container); walk;) {
-    const TGenericRegistryKey gridKey = OpenExisting(TGenericRegistryKey(walk++), kind.layout.key);
-    StoredGrid grid;
-    if (!ReadGridArea(gridKey, kind.layout, grid)) return nullptr;
-    const TableData& table = grid.table;
-    const projmath::TRectRgn area{table.bounds[0], table.bounds[1], table.bounds[2],
-                                  table.bounds[3]};
-    if (!area.Inside(north, east, kind.isPlane)) continue;
-    // A single row or column has no step.
-    if (grid.rows == 1 || grid.columns == 1 || !ReadGridValues(gridKey, grid)) return nullptr;
-    Message message;
-    message.systemId = static_cast<std::uint32_t>(systemId);
-    ConvertGrid(table, message);
-    return MakeRecord(message);
-  }
-  return nullptr;
+  TGenericRegistryKey gridKey(nullptr);  // of the entry that is looked at
+  StoredGrid grid;
+  const auto areaOf = [&](const TGenericRegistryKey& entry, projmath::TRectRgn& area) {
+    gridKey = OpenExisting(entry, kind.layout.key);
+    if (!ReadGridArea(gridKey, kind.layout, grid)) return false;
+    area = AreaOf(grid);
+    return true;
+  };
+  if (FirstHolding(container, north, east, kind.isPlane, areaOf).IsNull()) return nullptr;
+  // A single row or column has no step.
+  if (grid.rows == 1 || grid.columns == 1 || !ReadGridValues(gridKey, grid)) return nullptr;
+  Message message;
+  message.systemId = static_cast<std::uint32_t>(systemId);
+  ConvertGrid(grid.table, message);
+  return MakeRecord(message);
 }
 
 }  // namespace

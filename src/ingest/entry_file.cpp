@@ -31,7 +31,11 @@ ResultCode CreateFileWithEntry(const SharedFiles& kind, const COrxStringT<wchar_
 ResultCode OpenShared(const SharedFiles& kind, const COrxStringT<wchar_t>& path) {
   kind.current = nullptr;
   ResultCode result = ObtainTree(kind, path, &kind.current);
-  if (result == kSuccess && kind.current->GetErrorState() != kRegistryOk) result = kind.trouble;
+  if (result == kSuccess) {
+    // Somebody else may have it read again just now.
+    const boost::unique_lock<boost::recursive_mutex> lock(kind.current->GetMutex());
+    if (kind.current->GetErrorState() != kRegistryOk) result = kind.trouble;
+  }
   if (result != kSuccess) GiveBack(kind, path);
   return result;
 }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "orxregistry/registry_key.h"
+#include "projmath/rect_rgn.h"
 #include "store/gff_layout.h"
 #include "velta/result_codes.h"
 #include "velta/table_data.h"
@@ -22,6 +23,12 @@ struct StoredGrid {
   /// extents; they are not finite when there is but one row or column.
   TableData table;
 };
+
+/// The area that a grid covers, by its `bounds`.
+inline projmath::TRectRgn AreaOf(const StoredGrid& stored) {
+  const double(&bounds)[6] = stored.table.bounds;
+  return {bounds[0], bounds[1], bounds[2], bounds[3]};
+}
 
 /// Reads what a search needs: the counts and `bounds`.
 /// \return false when one of them is missing

@@ -52,22 +52,20 @@ std::optional<Description> DescribeProjection(const TGenericRegistryKey& entry) 
   return Describe(projection);
 }
 
-std::optional<TRectRgn> AreaOf(const TGenericRegistryKey& entry) {
-  TRectRgn area;
-  if (!velta::ReadValidityArea(velta::OpenExisting(entry, layout::kStandardDatum), area)) {
-    return std::nullopt;
-  }
-  return area;
+bool ReadArea(const TGenericRegistryKey& entry, TRectRgn& area) {
+  return velta::ReadValidityArea(velta::OpenExisting(entry, layout::kStandardDatum), area);
 }
 
-std::optional<TRectRgn> GridAreaOf(FileKind kind, const TGenericRegistryKey& entry) {
-  const auto& layout = kind == FileKind::kDatum ? layout::kDatumGrid : layout::kProjectionGrid;
+bool ReadGridArea(const layout::ResidualGrid& layout, const TGenericRegistryKey& entry,
+                  TRectRgn& area) {
   velta::StoredGrid grid;
-  if (!velta::ReadGridArea(velta::OpenExisting(entry, layout.key), layout, grid)) {
-    return std::nullopt;
-  }
-  const double(&bounds)[6] = grid.table.bounds;
-  return TRectRgn{bounds[0], bounds[1], bounds[2], bounds[3]};
+  if (!velta::ReadGridArea(velta::OpenExisting(entry, layout.key), layout, grid)) return false;
+  area = velta::AreaOf(grid);
+  return true;
+}
+
+const layout::ResidualGrid& GridLayoutOf(FileKind kind) {
+  return kind == FileKind::kDatum ? layout::kDatumGrid : layout::kProjectionGrid;
 }
 
 Entry ReadEntry(FileKind kind, const TGenericRegistryKey& container,
@@ -76,8 +74,9 @@ Entry ReadEntry(FileKind kind, const TGenericRegistryKey& container,
   entry.name = orx::ToUtf8(key.GetName());
   entry.content =
       kind == FileKind::kDatum ? DescribeDatum(container, key) : DescribeProjection(key);
-  entry.area = AreaOf(key);
-  entry.gridArea = GridAreaOf(kind, key);
+  TRectRgn area;
+  if (ReadArea(key, area)) entry.area = area;
+  if (ReadGridArea(GridLayoutOf(kind), key, area)) entry.gridArea = area;
   return entry;
 }
 
@@ -112,14 +111,17 @@ Entries ReadEntries(const std::string& file) {
   return found;
 }
 
-const Entry* UsedFor(unsigned message, const Entries& found, const Position& position) {
-  for (const Entry& entry : found.entries) {
-    if (message == 1025) return &entry;
-    const auto& area = message == 1021 ? entry.area : entry.gridArea;
-    if (!area) return nullptr;
-    if (area->Inside(position.north, position.east, message == 1024)) return &entry;
-  }
-  return nullptr;
+std::string UsedFor(unsigned message, const std::string& file, const Position& position) {
+  const TGenericRegistryKey container = velta::OpenContainer(ToWide(file));
+  const auto areaOf = [&](const TGenericRegistryKey& entry, TRectRgn& area) {
+    return message == 1021 ? ReadArea(entry, area)
+                           : ReadGridArea(GridLayoutOf(KindOf(file)), entry, area);
+  };
+  const TGenericRegistryKey entry =
+      message == 1025
+          ? velta::FirstSubKey(container)
+          : velta::FirstHolding(container, position.north, position.east, message == 1024, areaOf);
+  return orx::ToUtf8(entry.GetName());
 }
 
 bool HoldsOtherKind(const std::string& file) {

@@ -150,11 +150,9 @@ std::runtime_error MisfitError(unsigned number, const Options& options, std::str
   }
   const Source source = SourceOf(number, options);
   const unsigned kind = number == 1022 ? 1021 : number == 1027 ? 1025 : number;
-  const Entries found = ReadEntries(source.file);
-  const Entry* const entry = UsedFor(kind, found, source.position);
-  return std::runtime_error(source.file + ": what is stored in " +
-                            (entry ? Printable(entry->name) : "it") + " does not fit a " +
-                            std::to_string(number) + ": " + reason);
+  const std::string entry = UsedFor(kind, source.file, source.position);
+  return std::runtime_error(source.file + ": what is stored in " + Printable(entry) +
+                            " does not fit a " + std::to_string(number) + ": " + reason);
 }
 
 /// What is wrong with a file of which a part can be read; empty when nothing is.

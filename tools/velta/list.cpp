@@ -33,19 +33,27 @@ struct Options {
   }
 };
 
-/// What the library makes of an entry, for people; empty when nothing.
-std::string Uses(const std::string& file, const Entries& found, const Entry& entry,
-                 const std::optional<Position>& position) {
-  if (KindOf(file) == FileKind::kProjection) {
-    return &entry == UsedFor(1025, found, {}) ? "projection message" : "";
+/// The entries of which the library makes messages, by their names.
+struct UsedEntries {
+  std::string datum;
+  std::string grid;
+  std::string projection;
+
+  /// \param position of the entries of a datum file that are used, if one is given
+  UsedEntries(const std::string& file, const std::optional<Position>& position) {
+    if (KindOf(file) == FileKind::kProjection) projection = UsedFor(1025, file, {});
+    if (!position) return;
+    datum = UsedFor(1021, file, *position);
+    grid = UsedFor(1023, file, *position);
   }
-  if (!position) return "";
-  const bool isOfDatum = &entry == UsedFor(1021, found, *position);
-  const bool isOfGrid = &entry == UsedFor(1023, found, *position);
-  if (isOfDatum && isOfGrid) return "datum message, residual grid";
-  if (isOfDatum) return "datum message";
-  return isOfGrid ? "residual grid" : "";
-}
+  /// What an entry is used for, for people; empty when for nothing.
+  std::string For(const std::string& entry) const {
+    if (entry == projection) return "projection message";
+    if (entry == datum && entry == grid) return "datum message, residual grid";
+    if (entry == datum) return "datum message";
+    return entry == grid ? "residual grid" : "";
+  }
+};
 
 /// The description of a complete entry with its name in front and what it is used for.
 Description Labelled(const Entry& entry, const std::string& uses) {
@@ -99,10 +107,11 @@ void Print(const std::string& file, const std::vector<Description>& entries, con
 std::vector<Description> Chosen(const std::string& file, const Entries& found,
                                 const Options& options) {
   const std::optional<Position> position = options.position();
+  const UsedEntries used(file, position);
   std::vector<Description> chosen;
   for (const Entry& entry : found.entries) {
     if (!entry.content || (position && !Holds(entry, *position))) continue;
-    Description description = Labelled(entry, Uses(file, found, entry, position));
+    Description description = Labelled(entry, used.For(entry.name));
     if (options.dms) description = WithDegreesMinutesSeconds(std::move(description));
     chosen.push_back(std::move(description));
   }
