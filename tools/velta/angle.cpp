@@ -6,6 +6,8 @@
 #include <cstdio>
 #include <vector>
 
+#include "decimal.h"
+
 namespace velta_tool {
 namespace {
 
@@ -102,7 +104,9 @@ std::optional<double> ParseAngle(std::string_view text, const Coordinate& coordi
 std::string DegreesMinutesSeconds(double degrees) {
   constexpr int kDecimals = 7;
   constexpr long long kUnitsPerSecond = 10'000'000;
-  if (!std::isfinite(degrees)) return std::to_string(degrees);
+  constexpr double kNoAngle = 1e6;  // nor can units of seconds be counted there
+  const bool isAngle = std::abs(degrees) < kNoAngle;
+  if (!isAngle) return ShortestText(degrees, 0);
   long long rest = std::llround(std::abs(degrees) * kSixty * kSixty * kUnitsPerSecond);
   const long long units = rest % kUnitsPerSecond;
   rest /= kUnitsPerSecond;

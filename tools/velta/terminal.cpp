@@ -29,7 +29,8 @@ Control ControlAt(std::string_view text, std::size_t at) {
   };
   if (byte(0) < ' ' || byte(0) == kDelete) return {byte(0), 1};
   if (byte(0) == 0xC2 && byte(1) >= 0x80 && byte(1) < 0xA0) return {byte(1), 2};
-  if (byte(0) != 0xE2) return {};
+  const auto continues = [&](std::size_t i) { return byte(i) >= 0x80 && byte(i) < 0xC0; };
+  if (byte(0) != 0xE2 || !continues(1) || !continues(2)) return {};
   const unsigned code = 0x2000 | (byte(1) & 0x3FU) << 6U | (byte(2) & 0x3FU);
   const auto isIn = [code](unsigned first, unsigned last) { return code >= first && code <= last; };
   const bool reorders = isIn(0x200E, 0x200F) || isIn(0x202A, 0x202E) || isIn(0x2066, 0x2069);
