@@ -12,10 +12,11 @@ namespace orx::cs::velta {
 /// \return null when there is no such file or no container key in it
 TGenericRegistryKey OpenContainer(const COrxStringT<wchar_t>& fileName);
 
-/// The first entry whose area holds a position. An entry in front of it whose area cannot be read
-/// ends the search. \param plane as TRectRgn::Inside() takes it, and so `north` and `east` \param
-/// areaOf reads the area of an entry: (entry, area) to true when it can be read \return null when
-/// there is none
+/// The first entry whose area holds a position. An entry in front of it whose area cannot be
+/// read ends the search.
+/// \param plane as TRectRgn::Inside() takes it, and so `north` and `east`
+/// \param areaOf reads the area of an entry: (entry, area) to true when it can be read
+/// \return null when there is none
 template <class AreaOf>
 TGenericRegistryKey FirstHolding(const TGenericRegistryKey& container, double north, double east,
                                  bool plane, const AreaOf& areaOf) {

@@ -40,10 +40,10 @@ struct Position {
 };
 
 /// The name of the entry of which the library makes a message: the first whose area, or whose
-/// residual grid, holds the position; of a projection's parameters the first of all. \param message
-/// number of the message, 1021 standing for a 1022, 1025 for a 1027 \return empty when there is
-/// none; also when an entry in front is not readable, at which the library
-///     ends its search
+/// residual grid, holds the position; of a projection's parameters the first of all.
+/// \param message number of the message, 1021 standing for a 1022, 1025 for a 1027
+/// \return empty when there is none; also when an entry in front is not readable, at which the
+///     library ends its search
 std::string UsedFor(unsigned message, const std::string& file, const Position& position);
 
 /// True when a file has an entry of the other kind than its extension says.

@@ -201,9 +201,7 @@ void KeyTree::WriteUnsaved(record::Buffer& to) {
 
 void KeyTree::WriteUnsaved(record::Buffer& to, const Key& key) {
   record::KeyWriter writer(to, key.dimension(), key.name());
-  static const PendingChanges::OfKey kNothing;
-  const PendingChanges::OfKey* const found = pending_.Find(key);
-  const PendingChanges::OfKey& pending = found ? *found : kNothing;
+  const PendingChanges::OfKey& pending = pending_.At(key);
   if (pending.copied) record::AppendBytes(to, pending.copied.values());
   for (const std::size_t place : pending.values) {
     record::AppendBytes(to, key.values_->items()[place].bytes());

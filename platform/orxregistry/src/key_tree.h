@@ -122,7 +122,7 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   bool HasUnsaved() const { return pending_.Any(); }
   /// Bytes of saved values that unsaved ones replace.
   std::uint64_t superseded() const { return pending_.superseded(); }
-  /// Appends the record of the root with what is not saved.
+  /// Appends the record of the root with what is not saved; something is.
   void WriteUnsaved(record::Buffer& to);
   /// Appends the record of the root with everything.
   void WriteAll(record::Buffer& to) { WriteAll(to, *root_); }

@@ -31,11 +31,6 @@ PendingChanges::OfKey& PendingChanges::Of(const Key& key) {
   return pending;
 }
 
-const PendingChanges::OfKey* PendingChanges::Find(const Key& key) const {
-  const auto found = keys_.find(&key);
-  return found == keys_.end() ? nullptr : &found->second;
-}
-
 void PendingChanges::Clear() {
   keys_.clear();
   bytes_ = 0;

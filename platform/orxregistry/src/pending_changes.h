@@ -39,8 +39,8 @@ class PendingChanges {
 
   /// What is pending of a key, which is also entered at the keys above it.
   OfKey& Of(const Key& key);
-  /// \return null when nothing is
-  const OfKey* Find(const Key& key) const;
+  /// What is pending of a key of which something is.
+  const OfKey& At(const Key& key) const { return keys_.at(&key); }
 
   void CountBytes(std::size_t bytes) { bytes_ += bytes; }
   void CountSuperseded(std::size_t bytes) { superseded_ += bytes; }
