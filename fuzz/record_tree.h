@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <cstring>
 #include <iterator>
+#include <map>
 #include <random>
 #include <string>
 #include <string_view>
@@ -32,10 +33,32 @@ struct Key {
   std::vector<Key> keys;
 };
 
-/// A segment: the record of its root, not taken apart.
+/// What a key holds, or several do: the shapes, and the data in the same order.
+struct Content {
+  std::string shape;
+  std::string data;
+};
+
+enum PieceKind : std::uint8_t { kTree = 1, kShape, kEntry, kNode, kTrailer };
+
+/// A piece as it lies in a file. Where others refer to it, they do so by its place.
+struct Piece {
+  std::uint8_t kind = 0;
+  std::string content;
+  std::uint64_t at = 0;
+};
+
 struct Segment {
   std::uint64_t superseded = 0;
-  std::string tree;
+  std::vector<Piece> pieces;
+  std::uint64_t at = 0;
+};
+
+struct File {
+  std::string description;  ///< in UTF-16
+  std::string areas;        ///< as they are stored
+  std::uint32_t fanOut = 64;
+  std::vector<Segment> segments;
 };
 
 template <class Integer>
@@ -58,94 +81,230 @@ Integer TakeInteger(std::string_view& bytes) {
   return value;
 }
 
-inline std::vector<Segment> TakeApart(std::string_view file) {
-  std::vector<Segment> segments;
-  Take(file, 12);
-  Take(file, TakeInteger<std::uint32_t>(file));
-  Take(file, 8);
-  while (!file.empty()) {
-    Take(file, 8);
-    const auto size = TakeInteger<std::uint64_t>(file);
-    const auto superseded = TakeInteger<std::uint64_t>(file);
-    Take(file, 16);
-    segments.push_back({superseded, std::string(Take(file, size))});
-  }
-  return segments;
+inline std::uint64_t Checksum(std::string_view bytes, std::uint64_t seed = 0) {
+  return XXH3_64bits_withSeed(bytes.data(), bytes.size(), seed);
 }
 
-/// \param description in UTF-16
-inline std::string PutTogether(const std::vector<Segment>& segments,
-                               const std::string& description = "") {
-  const auto checksum = [](const std::string& bytes, std::size_t from, std::uint64_t seed = 0) {
-    return std::uint64_t{XXH3_64bits_withSeed(bytes.data() + from, bytes.size() - from, seed)};
-  };
-  std::string file("\x89ORX\r\n\x1A\n\0\2\0\0", 12);
-  Append(file, static_cast<std::uint32_t>(description.size()));
-  file += description;
-  Append(file, checksum(file, 0));
-  for (const Segment& segment : segments) {
-    const std::size_t at = file.size();
-    file.append("SEG1\0\0\0\0", 8);
-    Append(file, std::uint64_t{segment.tree.size()});
-    Append(file, segment.superseded);
-    Append(file, checksum(segment.tree, 0));
-    Append(file, checksum(file, at, at));
-    file += segment.tree;
+inline File TakeApart(std::string_view bytes) {
+  const std::size_t size = bytes.size();
+  const auto here = [&] { return std::uint64_t{size - bytes.size()}; };
+  File file;
+  Take(bytes, 12);
+  const auto description = TakeInteger<std::uint32_t>(bytes);
+  const auto areas = TakeInteger<std::uint32_t>(bytes);
+  file.fanOut = TakeInteger<std::uint32_t>(bytes);
+  file.description = Take(bytes, description);
+  file.areas = Take(bytes, areas);
+  Take(bytes, 8);
+  while (!bytes.empty()) {
+    Segment& segment = file.segments.emplace_back();
+    segment.at = here();
+    Take(bytes, 8);
+    const std::uint64_t end = TakeInteger<std::uint64_t>(bytes) + here() + 16;
+    segment.superseded = TakeInteger<std::uint64_t>(bytes);
+    Take(bytes, 8);
+    while (!bytes.empty() && here() < end) {
+      Piece& piece = segment.pieces.emplace_back();
+      piece.at = here();
+      Take(bytes, 8);
+      const auto kindAndSize = TakeInteger<std::uint64_t>(bytes);
+      piece.kind = static_cast<std::uint8_t>(kindAndSize);
+      piece.content = Take(bytes, kindAndSize >> 8);
+    }
   }
   return file;
 }
 
-inline Key TakeKey(std::string_view& bytes, int depth = 0) {
+/// Where in a piece the places of others are.
+inline std::vector<std::size_t> ReferencesIn(const Piece& piece) {
+  if (piece.kind == kEntry) return {0};
+  if (piece.kind == kTrailer) return {0, 8, 16};
+  if (piece.kind != kNode) return {};
+  std::string_view content = piece.content;
+  Take(content, 4);
+  const auto items = TakeInteger<std::uint32_t>(content);
+  std::vector<std::size_t> found;
+  for (std::size_t i = 0; i < items && i < content.size(); ++i) {
+    found.push_back(8 + i * (content.size() / items));
+  }
+  return found;
+}
+
+/// Puts another place where a piece says that something is.
+inline void Refer(std::string& content, std::size_t at,
+                  const std::map<std::uint64_t, std::uint64_t>& places) {
+  std::uint64_t place = 0;
+  if (content.size() < at + sizeof place) return;
+  std::memcpy(&place, content.data() + at, sizeof place);
+  const auto found = places.find(place);
+  if (found != places.end()) std::memcpy(content.data() + at, &found->second, sizeof place);
+}
+
+/// \return the file, with all checksums and sizes right, and what refers to the place of something
+///     referring to where that is now
+inline std::string PutTogether(const File& file) {
+  std::string bytes("\x89ORX\r\n\x1A\2\0\2\0\0", 12);
+  Append(bytes, static_cast<std::uint32_t>(file.description.size()));
+  Append(bytes, static_cast<std::uint32_t>(file.areas.size()));
+  Append(bytes, file.fanOut);
+  bytes += file.description + file.areas;
+  Append(bytes, Checksum(bytes));
+  std::map<std::uint64_t, std::uint64_t> places;
+  std::uint64_t place = bytes.size();
+  std::uint64_t oldEnd = 0;
+  for (const Segment& segment : file.segments) {
+    places[segment.at] = place;
+    place += 32;
+    for (const Piece& piece : segment.pieces) {
+      places[piece.at] = place;
+      place += 16 + piece.content.size();
+      oldEnd = piece.at + 16 + piece.content.size();
+    }
+  }
+  places.emplace(oldEnd, place);
+  for (const Segment& segment : file.segments) {
+    const std::uint64_t segmentAt = bytes.size();
+    std::string pieces;
+    for (Piece piece : segment.pieces) {
+      for (const std::size_t at : ReferencesIn(piece)) Refer(piece.content, at, places);
+      std::string checked;
+      Append(checked, std::uint64_t{piece.content.size()} << 8 | piece.kind);
+      checked += piece.content;
+      Append(pieces, Checksum(checked, segmentAt + 32 + pieces.size()));
+      pieces += checked;
+    }
+    bytes.append("SEG1\0\0\0\0", 8);
+    Append(bytes, std::uint64_t{pieces.size()});
+    Append(bytes, segment.superseded);
+    Append(bytes, Checksum(std::string_view(bytes).substr(segmentAt), segmentAt));
+    bytes += pieces;
+  }
+  return bytes;
+}
+
+inline Key TakeContent(std::string_view& shape, std::string_view& data, int depth = 0);
+
+inline Key TakeHead(std::string_view& bytes) {
   Key key;
-  std::string_view header = Take(bytes, 20);
-  const auto valuesSize = TakeInteger<std::uint64_t>(header);
-  const auto keysSize = TakeInteger<std::uint64_t>(header);
-  const std::size_t nameSize = 2 * std::size_t{TakeInteger<std::uint16_t>(header)};
-  key.dimension = TakeInteger<std::uint8_t>(header);
+  const std::size_t nameSize = 2 * std::size_t{TakeInteger<std::uint16_t>(bytes)};
+  key.dimension = TakeInteger<std::uint8_t>(bytes);
+  Take(bytes, 1);
   key.name = Take(bytes, nameSize);
-  std::string_view values = Take(bytes, valuesSize);
-  std::string_view keys = Take(bytes, keysSize);
+  return key;
+}
+
+/// A key without a name.
+inline Key TakeContent(std::string_view& shape, std::string_view& data, int depth) {
+  Key key;
+  const auto valuesShape = TakeInteger<std::uint64_t>(shape);
+  const auto keysShape = TakeInteger<std::uint64_t>(shape);
+  Take(shape, 16);
+  std::string_view values = Take(shape, valuesShape);
+  std::string_view keys = Take(shape, keysShape);
   while (!values.empty()) {
     Value value;
     const auto dataSize = TakeInteger<std::uint32_t>(values);
     value.elementSize = TakeInteger<std::uint32_t>(values);
-    const std::size_t valueNameSize = 2 * std::size_t{TakeInteger<std::uint16_t>(values)};
+    const std::size_t nameSize = 2 * std::size_t{TakeInteger<std::uint16_t>(values)};
     value.type = TakeInteger<std::uint8_t>(values);
     value.dimension = TakeInteger<std::uint8_t>(values);
-    value.name = Take(values, valueNameSize);
-    value.data = Take(values, dataSize);
+    value.name = Take(values, nameSize);
+    value.data = Take(data, dataSize);
     key.values.push_back(value);
   }
-  while (!keys.empty() && depth < 100) key.keys.push_back(TakeKey(keys, depth + 1));
+  while (!keys.empty() && depth < 100) {
+    const Key head = TakeHead(keys);
+    Key& sub = key.keys.emplace_back(TakeContent(keys, data, depth + 1));
+    sub.name = head.name;
+    sub.dimension = head.dimension;
+  }
   return key;
 }
 
-inline std::string BytesOf(const Value& value) {
-  std::string bytes;
-  Append(bytes, static_cast<std::uint32_t>(value.data.size()));
-  Append(bytes, value.elementSize);
-  Append(bytes, static_cast<std::uint16_t>(value.name.size() / 2));
-  Append(bytes, value.type);
-  Append(bytes, value.dimension);
-  return bytes.append(value.name, 0, value.name.size() / 2 * 2) + value.data;
+inline Content ContentOf(const Value& value) {
+  Content content;
+  Append(content.shape, static_cast<std::uint32_t>(value.data.size()));
+  Append(content.shape, value.elementSize);
+  Append(content.shape, static_cast<std::uint16_t>(value.name.size() / 2));
+  Append(content.shape, value.type);
+  Append(content.shape, value.dimension);
+  content.shape.append(value.name, 0, value.name.size() / 2 * 2);
+  content.data = value.data;
+  return content;
 }
 
-/// A key's record around its values' and its keys'.
-inline std::string Around(const Key& key, const std::string& values, const std::string& keys) {
-  std::string bytes;
-  Append(bytes, std::uint64_t{values.size()});
-  Append(bytes, std::uint64_t{keys.size()});
-  Append(bytes, static_cast<std::uint16_t>(key.name.size() / 2));
-  Append(bytes, key.dimension);
-  Append(bytes, std::uint8_t{0});
-  return bytes.append(key.name, 0, key.name.size() / 2 * 2) + values + keys;
+/// What a key holds around its values' and its keys'.
+inline Content Around(const Content& values, const Content& keys) {
+  Content content;
+  for (const std::string* const part : {&values.shape, &keys.shape, &values.data, &keys.data}) {
+    Append(content.shape, std::uint64_t{part->size()});
+  }
+  content.shape += values.shape + keys.shape;
+  content.data = values.data + keys.data;
+  return content;
 }
 
-inline std::string BytesOf(const Key& key) {
-  std::string values, keys;
-  for (const Value& value : key.values) values += BytesOf(value);
-  for (const Key& sub : key.keys) keys += BytesOf(sub);
-  return Around(key, values, keys);
+inline std::string HeadOf(const Key& key) {
+  std::string head;
+  Append(head, static_cast<std::uint16_t>(key.name.size() / 2));
+  Append(head, key.dimension);
+  Append(head, std::uint8_t{0});
+  return head.append(key.name, 0, key.name.size() / 2 * 2);
+}
+
+inline Content ContentOf(const Key& key) {
+  Content values;
+  Content keys;
+  for (const Value& value : key.values) {
+    const Content content = ContentOf(value);
+    values.shape += content.shape;
+    values.data += content.data;
+  }
+  for (const Key& sub : key.keys) {
+    const Content content = ContentOf(sub);
+    keys.shape += HeadOf(sub) + content.shape;
+    keys.data += content.data;
+  }
+  return Around(values, keys);
+}
+
+/// An entry of the shape at a place.
+inline Piece EntryOf(std::uint64_t shapeAt, const Key& key) {
+  Piece piece{kEntry, {}, 0};
+  Append(piece.content, shapeAt);
+  piece.content += HeadOf(key) + ContentOf(key).data;
+  return piece;
+}
+
+/// A segment with what the root holds; entries are sub-keys of the first key. Each new shape of
+/// entries is in front of the first that has it, and a large one in front of each.
+inline Segment SegmentOf(const Content& tree, const std::vector<Key>& entries = {}) {
+  static std::uint64_t nowhere = std::uint64_t{1} << 60U;
+  Segment segment;
+  segment.at = ++nowhere;
+  segment.pieces.push_back({kTree, tree.shape + tree.data, ++nowhere});
+  std::map<std::string, std::uint64_t> shapes;
+  for (const Key& entry : entries) {
+    const Content content = ContentOf(entry);
+    const auto [shape, isNew] = shapes.try_emplace(content.shape, nowhere + 1);
+    const bool isLarge =
+        16 + content.shape.size() >= 4 * (25 + HeadOf(entry).size() + content.data.size());
+    if (isNew || isLarge)
+      segment.pieces.push_back({kShape, content.shape, shape->second = ++nowhere});
+    segment.pieces.push_back(EntryOf(shape->second, entry));
+    segment.pieces.back().at = ++nowhere;
+  }
+  Piece& trailer = segment.pieces.emplace_back(Piece{kTrailer, {}, ++nowhere});
+  Append(trailer.content, segment.at);
+  trailer.content.append(16, '\0');
+  return segment;
+}
+
+/// The same of a key: what it holds, its first sub-key's being the entries.
+inline Segment SegmentOf(Key root) {
+  std::vector<Key> entries;
+  if (!root.keys.empty()) entries.swap(root.keys.front().keys);
+  return SegmentOf(ContentOf(root), entries);
 }
 
 /// Spoils registry files; `Mutate(bytes, size, largest size)` spoils plain bytes.
@@ -154,30 +313,27 @@ class Spoiler {
  public:
   Spoiler(unsigned seed, Mutate* mutate) : random_(seed), mutate_(mutate) {}
 
-  std::string operator()(std::string_view file) {
-    std::vector<Segment> segments = TakeApart(file);
-    if (segments.empty() || Chance(16)) return PutTogether({{0, Small(std::string(file))}});
-    Segment& segment = Any(segments);
+  std::string operator()(std::string_view bytes) {
+    File file = TakeApart(bytes);
+    if (file.segments.empty() || Chance(16)) {
+      return PutTogether({{}, {}, 64, {SegmentOf(Content{Small(std::string(bytes)), {}})}});
+    }
+    Segment& segment = Any(file.segments);
     switch (random_() % 8) {
       case 0:
-        segments.push_back(segment);
+        file.segments.push_back(segment);
         break;
       case 1:
-        segments.erase(segments.begin() + (&segment - segments.data()));
+        file.segments.erase(file.segments.begin() + (&segment - file.segments.data()));
         break;
       case 2:
-        segment.superseded = Chance(2) ? 0 : random_();
-        break;
-      case 3:
-        segment.tree = Small(segment.tree);
+        (Chance(2) ? segment.superseded : segment.at) = Chance(2) ? 0 : random_();
+        if (Chance(4)) file.areas = Small(file.areas);
         break;
       default:
-        std::string_view bytes = segment.tree;
-        Key root = TakeKey(bytes);
-        Spoil(root);
-        segment.tree = BytesOf(root);
+        if (!segment.pieces.empty()) Spoil(segment, Any(segment.pieces));
     }
-    return PutTogether(segments);
+    return PutTogether(file);
   }
 
  private:
@@ -192,6 +348,53 @@ class Spoiler {
     bytes.resize(size + 64);
     bytes.resize(mutate_(reinterpret_cast<std::uint8_t*>(bytes.data()), size, bytes.size()));
     return bytes;
+  }
+
+  void Spoil(Segment& segment, Piece& piece) {
+    const auto place = segment.pieces.begin() + (&piece - segment.pieces.data());
+    if (Chance(8)) {
+      Piece copy = piece;
+      segment.pieces.insert(place, std::move(copy));
+    } else if (Chance(16)) {
+      segment.pieces.erase(place);
+    } else if (piece.kind == kTree) {
+      Key root = TakeTree(piece.content);
+      Spoil(root);
+      const Content spoiled = ContentOf(root);
+      piece.content = spoiled.shape + spoiled.data;
+    } else if (const Piece* const shape = ShapeOf(segment, piece)) {
+      std::string_view entry = std::string_view(piece.content).substr(8);
+      const Key head = TakeHead(entry);
+      std::string_view shapeBytes = shape->content;
+      Key key = TakeContent(shapeBytes, entry);
+      key.name = head.name;
+      Spoil(key);
+      const std::uint64_t at = piece.at + 1;
+      piece.content = EntryOf(at, key).content;
+      segment.pieces.insert(place, {kShape, ContentOf(key).shape, at});
+    } else {
+      piece.content = Small(piece.content);
+    }
+  }
+
+  static Key TakeTree(std::string_view bytes) {
+    std::string_view shape = bytes;
+    std::string_view sizes = bytes;
+    const std::uint64_t values = TakeInteger<std::uint64_t>(sizes);
+    const std::uint64_t keys = TakeInteger<std::uint64_t>(sizes);
+    std::string_view data = bytes;
+    Take(data, 32 + values + keys);
+    return TakeContent(shape, data);
+  }
+
+  /// \return the shape of an entry that lies in the same segment, or null
+  static const Piece* ShapeOf(const Segment& segment, const Piece& piece) {
+    std::string_view content = piece.content;
+    const auto at = TakeInteger<std::uint64_t>(content);
+    for (const Piece& shape : segment.pieces) {
+      if (piece.kind == kEntry && shape.kind == kShape && shape.at == at) return &shape;
+    }
+    return nullptr;
   }
 
   /// A key somewhere below this one, or it.

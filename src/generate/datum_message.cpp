@@ -2,6 +2,7 @@
 
 #include "conversion/datum_conversion.h"
 #include "generate/make_record.h"
+#include "store/area_search.h"
 #include "store/gff_layout.h"
 #include "store/stored_entries.h"
 #include "velta/message_units.h"
@@ -45,7 +46,7 @@ boost::shared_ptr<RtcmBasicTransformMessage> MakeMessage(const projmath::TRectRg
 
 boost::shared_ptr<RtcmBasicTransformMessage> RTCMGenerator::getRtcmDatumMessage(
     double latitude, double longitude, double /*height*/) const {
-  const TGenericRegistryKey container = OpenContainer(datumFile_);
+  TAreaWalk walk = EntriesAround(datumFile_, kSearchedValidity, latitude, longitude);
   TGenericRegistryKey standard(nullptr);  // of the entry that is looked at
   projmath::TRectRgn area;
   const auto areaOf = [&](const TGenericRegistryKey& entry, projmath::TRectRgn& its) {
@@ -54,9 +55,9 @@ boost::shared_ptr<RtcmBasicTransformMessage> RTCMGenerator::getRtcmDatumMessage(
     area = its;
     return true;
   };
-  if (FirstHolding(container, latitude, longitude, false, areaOf).IsNull()) return nullptr;
+  if (FirstHolding(walk, latitude, longitude, false, areaOf).IsNull()) return nullptr;
   DatumData datum;
-  if (!ReadTransformation(container, standard, datum)) return nullptr;
+  if (!ReadTransformation(walk.Container(), standard, datum)) return nullptr;
   return MakeMessage(area, datum, static_cast<std::uint32_t>(systemId_));
 }
 

@@ -3,8 +3,8 @@
 #include "conversion/grid_conversion.h"
 #include "generate/make_record.h"
 #include "projmath/rect_rgn.h"
+#include "store/area_search.h"
 #include "store/residual_grid.h"
-#include "store/stored_entries.h"
 #include "velta/rtcm_generator.h"
 
 namespace orx::cs::velta {
@@ -13,16 +13,16 @@ namespace {
 /// What differs between the two grids.
 struct GridKind {
   const layout::ResidualGrid& layout;
-  bool isPlane;
+  const SearchedArea& area;
 };
-constexpr GridKind kEllipsoidal{layout::kDatumGrid, false};
-constexpr GridKind kPlane{layout::kProjectionGrid, true};
+constexpr GridKind kEllipsoidal{layout::kDatumGrid, kSearchedDatumGrid};
+constexpr GridKind kPlane{layout::kProjectionGrid, kSearchedProjectionGrid};
 
 /// The record of the first entry whose grid holds the position.
 template <class Message>
 boost::shared_ptr<Message> FindGrid(const COrxStringT<wchar_t>& fileName, const GridKind& kind,
                                     double north, double east, std::int32_t systemId) {
-  const TGenericRegistryKey container = OpenContainer(fileName);
+  TAreaWalk walk = EntriesAround(fileName, kind.area, north, east);
   TGenericRegistryKey gridKey(nullptr);  // of the entry that is looked at
   StoredGrid grid;
   const auto areaOf = [&](const TGenericRegistryKey& entry, projmath::TRectRgn& area) {
@@ -31,7 +31,7 @@ boost::shared_ptr<Message> FindGrid(const COrxStringT<wchar_t>& fileName, const 
     area = AreaOf(grid);
     return true;
   };
-  if (FirstHolding(container, north, east, kind.isPlane, areaOf).IsNull()) return nullptr;
+  if (FirstHolding(walk, north, east, kind.area.isPlane, areaOf).IsNull()) return nullptr;
   // A single row or column has no step.
   if (grid.rows == 1 || grid.columns == 1 || !ReadGridValues(gridKey, grid)) return nullptr;
   Message message;

@@ -2,9 +2,8 @@
 
 #include "conversion/projection_conversion.h"
 #include "generate/make_record.h"
+#include "store/area_search.h"
 #include "store/gff_layout.h"
-#include "store/registry_tree.h"
-#include "store/stored_entries.h"
 #include "velta/rtcm_generator.h"
 
 namespace orx::cs::velta {
@@ -36,7 +35,7 @@ boost::shared_ptr<RtcmMessage> Finish(Message message, std::int32_t systemId) {
 }  // namespace
 
 boost::shared_ptr<RtcmMessage> RTCMGenerator::getRtcmProjMessage() const {
-  const TGenericRegistryKey entry = FirstSubKey(OpenContainer(projFile_));
+  const TGenericRegistryKey entry = AllEntries(projFile_, kSearchedProjectionGrid).Next();
   const TGenericRegistryKey standard = OpenExisting(entry, layout::kStandardProjection);
   COrxStringT<wchar_t> typeName;
   if (!Read(standard, layout::kProjectionType, typeName)) return nullptr;

@@ -19,6 +19,7 @@ ResultCode CreateFileWithEntry(const SharedFiles& kind, const COrxStringT<wchar_
                                const FillKey& fillEntry) {
   TCSInFileKey tree(L"", kTreeDescription, nullptr, false, kRegistryFlags);
   if (tree.GetErrorState() != kRegistryOk) return kind.trouble;
+  tree.IndexBy(kind.areas());
   const TGenericRegistryKey root{TGenericRegistryKeyPtr(tree)};
   TGenericRegistryKey container(root, containerName, 0, true);
   fillContainer(container);

@@ -2,6 +2,7 @@
 
 #include "orxregistry/in_file_key.h"
 #include "orxutils/orx_string.h"
+#include "store/area_search.h"
 #include "velta/file_names.h"
 #include "velta/rtcm_data_support.h"
 
@@ -17,17 +18,20 @@ struct SharedFiles {
   TCSInFileKey*& current;      ///< the file worked on
   const char* obtainFunction;  ///< entry points of the sibling library
   const char* giveBackFunction;
-  ResultCode trouble;  ///< what is answered for a file that cannot be used
+  const EntryAreas& (*areas)();  ///< by which new files find their entries
+  ResultCode trouble;            ///< what is answered for a file that cannot be used
 };
 
-inline constexpr SharedFiles kDatumFiles{kDatumFileExtension,           RTCMDataSupport::DLLdatum,
-                                         RTCMDataSupport::GFFDatumFile, "GetPtrDatumGFF",
-                                         "ResetRTCMDatumFile",          kDatumFileTrouble};
+inline constexpr SharedFiles kDatumFiles{
+    kDatumFileExtension, RTCMDataSupport::DLLdatum, RTCMDataSupport::GFFDatumFile,
+    "GetPtrDatumGFF",    "ResetRTCMDatumFile",      &DatumAreas,
+    kDatumFileTrouble};
 inline constexpr SharedFiles kProjectionFiles{kProjectionFileExtension,
                                               RTCMDataSupport::DLLprojection,
                                               RTCMDataSupport::GFFProjectionFile,
                                               "GetPtrProjectionGFF",
                                               "ResetRTCMGridFile",
+                                              &ProjectionAreas,
                                               kProjectionFileTrouble};
 
 /// Loads the sibling library unless that has been done.

@@ -20,6 +20,7 @@ struct ValueOf {
 /// A block of doubles, by its name.
 template <std::size_t count>
 struct DoublesOf {
+  static constexpr std::uint32_t kBytes = count * sizeof(double);
   const wchar_t* name;
 };
 

@@ -12,23 +12,6 @@ namespace orx::cs::velta {
 /// \return null when there is no such file or no container key in it
 TGenericRegistryKey OpenContainer(const COrxStringT<wchar_t>& fileName);
 
-/// The first entry whose area holds a position. An entry in front of it whose area cannot be
-/// read ends the search.
-/// \param plane as TRectRgn::Inside() takes it, and so `north` and `east`
-/// \param areaOf reads the area of an entry: (entry, area) to true when it can be read
-/// \return null when there is none
-template <class AreaOf>
-TGenericRegistryKey FirstHolding(const TGenericRegistryKey& container, double north, double east,
-                                 bool plane, const AreaOf& areaOf) {
-  for (TGenRegKeyIterator walk(container); walk;) {
-    TGenericRegistryKey entry(walk++);
-    projmath::TRectRgn area;
-    if (!areaOf(entry, area)) break;
-    if (area.Inside(north, east, plane)) return entry;
-  }
-  return TGenericRegistryKey(nullptr);
-}
-
 /// Reads the area of validity from a datum entry's "StandardDatum". An extent of 0 is the whole
 /// range.
 /// \return false when there is none of the right size

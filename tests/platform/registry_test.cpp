@@ -11,43 +11,50 @@ namespace {
 using namespace std::string_view_literals;
 using orx::TCSInFileKey;
 
-std::string Key(const std::u16string& name, const std::string& values, const std::string& keys,
-                std::uint8_t dimension = 0) {
-  return velta_fuzz::Around({dimension, Units(name), {}, {}}, values, keys);
+velta_fuzz::Value Value(const std::u16string& name, std::uint8_t type, std::uint32_t elementSize,
+                        const std::string& data, std::uint8_t dimension = 1) {
+  return {elementSize, type, dimension, Units(name), data};
 }
 
-std::string Value(const std::u16string& name, std::uint8_t type, std::uint32_t elementSize,
-                  const std::string& data, std::uint8_t dimension = 1) {
-  return velta_fuzz::BytesOf(velta_fuzz::Value{elementSize, type, dimension, Units(name), data});
+velta_fuzz::Key Key(const std::u16string& name, const std::vector<velta_fuzz::Value>& values,
+                    const std::vector<velta_fuzz::Key>& keys, std::uint8_t dimension = 0) {
+  return {dimension, Units(name), values, keys};
 }
 
-/// A file of these trees, one a segment.
-std::string File(const std::vector<std::string>& trees) {
-  std::vector<velta_fuzz::Segment> segments;
-  for (const std::string& tree : trees) segments.push_back({0, tree});
-  return velta_fuzz::PutTogether(segments, Units(u"ab"));
+std::string File(const std::vector<velta_fuzz::Segment>& segments) {
+  return velta_fuzz::PutTogether({Units(u"ab"), {}, 64, segments});
 }
 
 TEST(RegistryFormat, IsReadAndWrittenAsDocumented) {
   const RegistryFile file;
-  const std::string a = Value(u"a", 1, 2, "xy");
-  const std::string text = Value(u"t", 5, 0, Units(u"S\u00FC! \U0001F4CD\0"sv));
-  const std::string replaced = Value(u"a", 2, 1, "z", 2);
-  file.SetBytes(File({Key(u"", a, Key(u"Z\u00FC", text, "", 7)),
-                      Key(u"", replaced, Key(u"l", "", "") + Key(u"Z\u00FC", a, "", 9))}));
-  TCSInFileKey tree = file.Load();
-  const std::string shown = orx::Narrow(L"S\u00FC! \U0001F4CD");
-  EXPECT_EQ(Describe(tree), "(0 a=2:2:z Z\xFC(7 t=5:1:" + shown + " a=1:1:xy) l(0))");
-  const orx::TGenericRegistryKey key = Open(RootOf(tree), L"Z\u00FC");
+  const velta_fuzz::Value a = Value(u"a", 1, 2, "xy");
+  const velta_fuzz::Value text = Value(u"t", 5, 0, Units(u"S\u00FC! \U0001F4CD\0"sv));
+  const velta_fuzz::Value replaced = Value(u"a", 2, 1, "z", 2);
+  const velta_fuzz::Key first = Key(u"e", {a, text}, {Key(u"k", {a}, {}, 3)});
+  const velta_fuzz::Key second = Key(u"f", {a, text}, {Key(u"k", {a}, {}, 3)}, 2);
+  const velta_fuzz::Key other = Key(u"l", {}, {});
+  const auto tree = [&](const velta_fuzz::Value& value, const std::vector<velta_fuzz::Value>& its) {
+    return ContentOf(Key(u"", {value}, {Key(u"Z\u00FC", its, {}, 7), other}));
+  };
+  const auto added = ContentOf(Key(u"", {replaced}, {other, Key(u"Z\u00FC", {a}, {}, 9)}));
+  file.SetBytes(
+      File({SegmentOf(ContentOf(Key(u"", {a}, {Key(u"Z\u00FC", {text}, {}, 7)})), {first}),
+            SegmentOf(added, {second, Key(u"e", {replaced}, {})})}));
+  TCSInFileKey read = file.Load();
+  const std::string shown = " t=5:1:" + orx::Narrow(L"S\u00FC! \U0001F4CD");
+  const std::string k = shown + " k(3 a=1:1:xy))";
+  EXPECT_EQ(Describe(read), "(0 a=2:2:z Z\xFC(7" + shown + " a=1:1:xy e(0 a=2:2:z" + k +
+                                " f(2 a=1:1:xy" + k + ") l(0))");
+  const orx::TGenericRegistryKey key = Open(RootOf(read), L"Z\u00FC");
   EXPECT_EQ(orx::GetRegValue<std::wstring>(key, L"t", L"", 0), L"S\u00FC! \U0001F4CD");
   EXPECT_EQ(orx::GetRegValue<std::wstring>(key, L"a", L"no text", 0), L"no text");
   EXPECT_EQ(key.GetValueSize(L"t"), 14U) << "4 characters, a pair of surrogates, the end";
   EXPECT_FALSE(key.HasValue(L"T")) << "names are exact";
 
   std::filesystem::remove(file.path);
-  EXPECT_TRUE(tree.Save(file.Name(), false, orx::kRegistryVersion));
-  EXPECT_EQ(file.Bytes(),
-            File({Key(u"", replaced, Key(u"Z\u00FC", text + a, "", 7) + Key(u"l", "", ""))}));
+  EXPECT_TRUE(read.Save(file.Name(), false, orx::kRegistryVersion));
+  const velta_fuzz::Key changed = Key(u"e", {replaced, text}, first.keys);
+  EXPECT_EQ(file.Bytes(), File({SegmentOf(tree(replaced, {text, a}), {changed, second})}));
 }
 
 TEST(RegistryDamage, AtAnyPlaceIsDamageOrASaveThatNeverFinished) {
@@ -84,24 +91,38 @@ TEST(RegistryDamage, AtAnyPlaceIsDamageOrASaveThatNeverFinished) {
 }
 
 TEST(RegistryRecords, ThatLieAreDamage) {
-  const std::string good = Value(u"a", 1, 2, "xy");
-  std::string longName = good;
-  longName[8] = '\x7F';
-  const std::pair<const char*, std::string> cases[] = {
-      {"text without an end", Key(u"", good + Value(u"t", 5, 0, "ab"), "")},
-      {"text of no bytes", Key(u"", good + Value(u"t", 5, 0, ""), "")},
-      {"size and bytes disagree", Key(u"", good + Value(u"t", 1, 3, "ab"), "")},
-      {"no type", Key(u"", good + Value(u"t", 0, 2, "ab"), "")},
-      {"name beyond the end", Key(u"", good + longName, "")},
-      {"half a value", Key(u"", good + good.substr(0, 13), "")},
-      {"half a key", Key(u"", good, Key(u"k", "", "").substr(0, 21))},
-      {"sizes that wrap around", std::string(8, '\xFF') + "\1" + std::string(11, '\0')},
-      {"bytes behind the root", Key(u"", good, "") + "x"},
-      {"no root", ""},
+  const velta_fuzz::Value good = Value(u"a", 1, 2, "xy");
+  velta_fuzz::Content longName = ContentOf(Key(u"", {good, good}, {}));
+  longName.shape[32 + 14 + 8] = '\x7F';
+  velta_fuzz::Content half = ContentOf(Key(u"", {good}, {Key(u"k", {}, {})}));
+  half.shape.pop_back();
+  velta_fuzz::Content wrapping = ContentOf(Key(u"", {good}, {}));
+  wrapping.shape.replace(0, 8, 8, '\xFF');
+  velta_fuzz::Content noData = ContentOf(Key(u"", {good}, {}));
+  noData.data.pop_back();
+  velta_fuzz::Content more = ContentOf(Key(u"", {good}, {}));
+  more.data += "x";
+  const velta_fuzz::Key entry = Key(u"e", {good}, {});
+  const velta_fuzz::Segment lonely = SegmentOf(ContentOf(Key(u"", {good}, {})), {entry});
+  velta_fuzz::Segment shapeless = SegmentOf(Key(u"", {good}, {Key(u"c", {}, {entry})}));
+  shapeless.pieces.erase(shapeless.pieces.begin() + 1);
+  const std::pair<const char*, velta_fuzz::Segment> cases[] = {
+      {"text without an end", SegmentOf(Key(u"", {good, Value(u"t", 5, 0, "ab")}, {}))},
+      {"text of no bytes", SegmentOf(Key(u"", {good, Value(u"t", 5, 0, "")}, {}))},
+      {"size and bytes disagree", SegmentOf(Key(u"", {good, Value(u"t", 1, 3, "ab")}, {}))},
+      {"no type", SegmentOf(Key(u"", {good, Value(u"t", 0, 2, "ab")}, {}))},
+      {"name beyond the end", SegmentOf(longName)},
+      {"half a key", SegmentOf(half)},
+      {"sizes that wrap around", SegmentOf(wrapping)},
+      {"less data than the shape says", SegmentOf(noData)},
+      {"more data than the shape says", SegmentOf(more)},
+      {"no root", SegmentOf(velta_fuzz::Content{})},
+      {"an entry and no key to be in", lonely},
+      {"an entry without its shape", shapeless},
   };
-  for (const auto& [what, bytes] : cases) {
+  for (const auto& [what, segment] : cases) {
     const RegistryFile file;
-    file.SetBytes(File({bytes}));
+    file.SetBytes(File({segment}));
     const TCSInFileKey tree = file.Load();
     const std::string seen = Describe(tree);
     EXPECT_EQ(tree.GetErrorState(), orx::kDamaged) << what;
@@ -252,23 +273,25 @@ TEST(RegistryKey, ACopyOutlivesItsFileAndIsSavedWithWhatWasChangedInIt) {
   const RegistryFile source;
   const RegistryFile target;
   target.Create();
-  const std::string lie = Key(u"lie", Value(u"a", 1, 1, "x") + Value(u"b", 0, 1, "y"), "");
-  source.SetBytes(File({Key(u"", "", lie + Key(u"S_0", Value(u"value", 1, 1, "x"), "", 7))}));
+  const velta_fuzz::Key lie = Key(u"lie", {Value(u"a", 1, 1, "x"), Value(u"b", 0, 1, "y")}, {});
+  const velta_fuzz::Key entry = Key(u"S_0", {Value(u"value", 1, 1, "x")}, {}, 7);
+  source.SetBytes(File({SegmentOf(Key(u"", {}, {Key(u"container", {}, {lie, entry})}))}));
   TCSInFileKey tree = target.Load();
   {
     const TCSInFileKey other = source.Load();
+    const orx::TGenericRegistryKey from = Open(RootOf(other), L"container");
     for (const std::wstring name : {L"lie", L"S_0", L"S_1"}) {
-      Open(RootOf(tree), name).DeepCopy(Open(RootOf(other), name == L"lie" ? name : L"S_0"));
+      const std::wstring copied = name == L"lie" ? name : L"S_0";
+      Open(Open(RootOf(tree), L"container"), name).DeepCopy(Open(from, copied));
     }
     EXPECT_EQ(other.GetErrorState(), orx::kDamaged);
   }
   source.SetBytes("");
-  Open(RootOf(tree), L"S_1").AddValue(L"value", RawValue::Block("changed"), 1, true);
+  Open(Open(RootOf(tree), L"container"), L"S_1")
+      .AddValue(L"value", RawValue::Block("changed"), 1, true);
   RegistryFile::AddEntry(tree, L"S_2", "new");
   const std::string content = Describe(tree);
-  EXPECT_NE(content.find(" lie(0 a=1:1:x) S_0(0 value=1:1:x) S_1(0 value=1:1:changed)"),
-            std::string::npos)
-      << content;
+  EXPECT_NE(content.find(" lie(0 a=1:1:x) S_1(0 value=1:1:changed)"), std::string::npos) << content;
   EXPECT_TRUE(tree.Save(false, orx::kRegistryVersion));
   EXPECT_EQ(Describe(target.Load()), content);
 }

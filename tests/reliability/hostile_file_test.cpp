@@ -29,7 +29,9 @@ constexpr bool kMemoryIsOurs = false;
 constexpr bool kMemoryIsOurs = true;
 #endif
 
-std::string FileOf(const std::string& tree) { return velta_fuzz::PutTogether({{0, tree}}); }
+std::string FileOf(const velta_fuzz::Segment& segment) {
+  return velta_fuzz::PutTogether({{}, {}, 64, {segment}});
+}
 
 /// A container of so many keys with so many values each, the names of both by their number.
 std::string Keys(int count, int values, const std::function<std::string(int)>& name) {
@@ -38,7 +40,7 @@ std::string Keys(int count, int values, const std::function<std::string(int)>& n
     Key& key = container.keys.emplace_back(Key{0, name(i), {}, {}});
     for (int j = 0; j < values; ++j) key.values.push_back({1, 1, 1, name(j), "x"});
   }
-  return FileOf(velta_fuzz::BytesOf(Key{0, "", {}, {container}}));
+  return FileOf(SegmentOf(Key{0, "", {}, {container}}));
 }
 std::string Number(int i) { return {reinterpret_cast<const char*>(&i), sizeof i}; }
 std::string Unit(int i) { return Number(i).substr(0, 2); }
@@ -46,18 +48,19 @@ std::string Same(int) { return "same"; }
 std::string Long(int i) { return std::string(0x1FFFE, static_cast<char>(i)); }
 
 std::string Nested(std::uint64_t depth) {
-  std::string tree;
+  velta_fuzz::Content tree;
   while (depth-- > 0) {
-    velta_fuzz::Append(tree, std::uint64_t{0});
-    velta_fuzz::Append(tree, depth * 20);
-    velta_fuzz::Append(tree, 0);
+    velta_fuzz::Append(tree.shape, std::uint64_t{0});
+    velta_fuzz::Append(tree.shape, depth * 36);
+    tree.shape.append(depth > 0 ? 20 : 16, '\0');
   }
-  return FileOf(tree);
+  return FileOf(velta_fuzz::SegmentOf(tree));
 }
 /// A key with a value; of one of the two the sizes are the largest there are.
 std::string Lying(std::size_t place, std::size_t bytes) {
-  std::string tree = velta_fuzz::BytesOf(Key{0, "", {{1, 1, 1, "", "x"}}, {}});
-  return FileOf(tree.replace(place, bytes, bytes, '\xFF'));
+  velta_fuzz::Content tree = ContentOf(Key{0, "", {{1, 1, 1, "", "x"}}, {}});
+  tree.shape.replace(place, bytes, bytes, '\xFF');
+  return FileOf(velta_fuzz::SegmentOf(tree));
 }
 
 const struct Hostile {
@@ -76,8 +79,8 @@ const struct Hostile {
     {"EveryUnitAsAName", [] { return Keys(0x10000, 1, Unit); }, 0, orx::kRegistryOk, 12},
     {"LongestNames", [] { return Keys(100, 1, Long); }, 0, orx::kRegistryOk, 4},
     {"DeepNesting", [] { return Nested(100'000); }, 0, orx::kDamaged, 4},
-    {"FourGigabytesInAValue", [] { return Lying(20, 8); }, 0, orx::kDamaged, 0},
-    {"ExabytesInAKey", [] { return Lying(0, 15); }, 0, orx::kDamaged, 0},
+    {"FourGigabytesInAValue", [] { return Lying(32, 8); }, 0, orx::kDamaged, 0},
+    {"ExabytesInAKey", [] { return Lying(0, 31); }, 0, orx::kDamaged, 0},
 };
 
 /// Asks for everything and looks at everything.
@@ -138,7 +141,7 @@ TEST(HostileMerge, OfManyValuesThatAreReplacedTakesTimeByTheirNumber) {
   const auto make = [](const char* value) {
     Key key{0, Units(u"many"), {}, {}};
     for (int i = 0; i < 1'000'000; ++i) key.values.push_back({1, 1, 1, Number(i), value});
-    return FileOf(velta_fuzz::BytesOf(Key{0, "", {}, {key}}));
+    return FileOf(SegmentOf(Key{0, "", {}, {key}}));
   };
   const RegistryFile target;
   const RegistryFile source;

@@ -10,6 +10,7 @@
 #include "files.h"
 #include "orxutils/file_error.h"
 #include "orxutils/orx_string.h"
+#include "store/area_search.h"
 #include "store/gff_layout.h"
 #include "store/key_values.h"
 #include "store/registry_tree.h"
@@ -93,6 +94,12 @@ void AddProjection(const Message& message, const velta::Rtcm1024* grid, std::uin
                      Describe(projection)});
 }
 
+/// Where the entry for a message is looked for.
+const velta::SearchedArea& SearchedFor(unsigned message) {
+  if (message == 1021) return velta::kSearchedValidity;
+  return message == 1023 ? velta::kSearchedDatumGrid : velta::kSearchedProjectionGrid;
+}
+
 }  // namespace
 
 Entries ReadEntries(const std::string& file) {
@@ -112,15 +119,17 @@ Entries ReadEntries(const std::string& file) {
 }
 
 std::string UsedFor(unsigned message, const std::string& file, const Position& position) {
-  const TGenericRegistryKey container = velta::OpenContainer(ToWide(file));
   const auto areaOf = [&](const TGenericRegistryKey& entry, TRectRgn& area) {
     return message == 1021 ? ReadArea(entry, area)
                            : ReadGridArea(GridLayoutOf(KindOf(file)), entry, area);
   };
+  const velta::SearchedArea& searched = SearchedFor(message);
+  const auto& [north, east] = position;
+  orx::TAreaWalk walk = message == 1025 ? velta::AllEntries(ToWide(file), searched)
+                                        : velta::EntriesAround(ToWide(file), searched, north, east);
   const TGenericRegistryKey entry =
-      message == 1025
-          ? velta::FirstSubKey(container)
-          : velta::FirstHolding(container, position.north, position.east, message == 1024, areaOf);
+      message == 1025 ? walk.Next()
+                      : velta::FirstHolding(walk, north, east, searched.isPlane, areaOf);
   return orx::ToUtf8(entry.GetName());
 }
 

@@ -53,11 +53,10 @@ bool TInFileKey::Save(bool /*flag*/, unsigned registryVersion) {
 }
 
 bool TInFileKey::SaveNew(const std::filesystem::path& path) {
-  const std::optional<record::Buffer> file = MakeRegistryFile(*tree_);
-  const auto stamp = file ? PublishFile(path, *file, nullptr) : std::nullopt;
-  if (!stamp) return false;
+  std::optional<FilePosition> position = SaveNewFile(path, *tree_);
+  if (!position) return false;
   tree_->MarkSaved();
-  tree_->position = {*stamp, file->size(), 0, true};
+  tree_->position = *std::move(position);
   return true;
 }
 
@@ -65,9 +64,10 @@ bool TInFileKey::Save(const COrxStringT<wchar_t>& fileName, bool /*flag*/,
                       unsigned registryVersion) {
   const std::optional<std::filesystem::path> path = ToPath(fileName);
   if (!path || registryVersion != kRegistryVersion || tree_->error != kRegistryOk) return false;
-  const std::optional<record::Buffer> file = MakeRegistryFile(*tree_);
-  return file && PublishFile(*path, *file, nullptr);
+  return SaveNewFile(*path, *tree_).has_value();
 }
+
+void TInFileKey::IndexBy(const EntryAreas& areas) { tree_->header.areas = areas; }
 
 bool TInFileKey::HasUnsavedChanges() const { return tree_->HasUnsaved(); }
 

@@ -7,8 +7,16 @@
 namespace orx {
 namespace {
 
+using record::Bytes;
+using record::Content;
+using record::ContentBuffer;
+using record::ContentWriter;
+using record::KeyRecord;
+using record::Part;
 using record::ValueRecord;
 
+/// How deep the entries are below the root.
+constexpr int kEntryDepth = 2;
 constexpr std::size_t kMaxNameBytes = std::numeric_limits<std::uint16_t>::max() * sizeof(char16_t);
 
 bool IsSame(const record::Value& a, const record::Value& b) {
@@ -20,13 +28,12 @@ bool IsSame(const record::Value& a, const record::Value& b) {
 
 record::Name NameOf(const TGenericRegistryKeyImp* key) { return key->name(); }
 
-bool VisitedValues::Visit(const TGenericRegistryKeyImp& key, record::KeyRecord record) {
+bool VisitedValues::Visit(const TGenericRegistryKeyImp& key, Part values) {
   key_ = nullptr;
   count_ = 0;
   last_ = 0;
-  record::Bytes bytes = record.values();
-  while (!bytes.empty()) {
-    const ValueRecord value = record::TakeValue(bytes);
+  while (!values.shapes.empty()) {
+    const ValueRecord value = record::TakeValue(values);
     if (!value || count_ == kMost) return false;
     const auto place = std::find_if(
         values_, values_ + count_, [&](ValueRecord other) { return other.name() == value.name(); });
@@ -45,24 +52,18 @@ ValueRecord VisitedValues::Find(LookupName& name) {
   return {};
 }
 
-KeyTree::KeyTree(std::u16string text)
-    : description(std::move(text)),
-      root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {}
+KeyTree::KeyTree(const std::u16string& description)
+    : root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {
+  header.description = description;
+}
 
 KeyTree::KeyTree(FileContent content)
     : error(content.error),
-      description(std::move(content.description)),
-      position{content.stamp, content.end, content.superseded, false},
-      file_(std::move(content.memory)),
+      header(content.header),
+      position{content.stamp, content.end, content.superseded, false, {}},
+      content_(std::move(content)),
       root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {
-  for (record::Bytes segment : content.segments) {
-    const record::KeyRecord root = record::TakeKey(segment);
-    if (!root || !segment.empty()) {
-      error = kDamaged;
-      return;
-    }
-    AddLayer(*root_, root);
-  }
+  for (const Content& tree : content_.trees) AddLayer(*root_, tree);
 }
 
 /// For a record, in the tree's memory.
@@ -70,12 +71,17 @@ unsigned char* KeyTree::Room(std::size_t bytes) {
   return static_cast<unsigned char*>(memory_.allocate(bytes, 1));
 }
 
-record::KeyRecord KeyTree::MakeRecord(const record::Name& name, std::uint8_t dimension) {
-  return record::WriteEmptyKey(Room(record::EmptyKeySize(name)), dimension, name);
+KeyRecord KeyTree::MakeRecord(const record::Name& name, std::uint8_t dimension) {
+  return record::MakeKey(record::WriteHead(Room(record::HeadSize(name)), dimension, name), {});
 }
 
-void KeyTree::AddLayer(Key& key, record::KeyRecord record) {
-  auto* const layer = Make<Key::Layer>(Key::Layer{record, nullptr});
+KeyTree::Key& KeyTree::MakeLoose(Key& above, KeyRecord record, record::Buffer memory) {
+  content_.moreMemory.push_back(std::move(memory));
+  return *Make<Key>(*this, &above, record);
+}
+
+void KeyTree::AddLayer(Key& key, const Content& content) {
+  auto* const layer = Make<Key::Layer>(Key::Layer{content, nullptr});
   (key.last_ ? key.last_ : &key.first_)->next = layer;
   key.last_ = layer;
 }
@@ -87,9 +93,9 @@ NamedList<ValueRecord>& KeyTree::TakeValues(Key& key) {
   if (!key.values_) key.values_ = Make<NamedList<ValueRecord>>(&memory_);
   if (key.valuesAreWhole_) return *key.values_;
   for (const Key::Layer* layer = &key.first_; layer; layer = layer->next) {
-    record::Bytes bytes = layer->record.values();
-    while (!bytes.empty()) {
-      const ValueRecord value = record::TakeValue(bytes);
+    Part values = layer->content.values();
+    while (!values.shapes.empty()) {
+      const ValueRecord value = record::TakeValue(values);
       if (!value) {
         error = kDamaged;
         break;
@@ -105,29 +111,43 @@ NamedList<KeyTree::Key*>& KeyTree::TakeKeys(Key& key) {
   if (!key.keys_) key.keys_ = Make<NamedList<Key*>>(&memory_);
   if (key.keysAreWhole_) return *key.keys_;
   for (const Key::Layer* layer = &key.first_; layer; layer = layer->next) {
-    record::Bytes bytes = layer->record.keys();
-    while (!bytes.empty()) {
-      const record::KeyRecord found = record::TakeKey(bytes);
+    Part keys = layer->content.keys();
+    while (!keys.shapes.empty()) {
+      const KeyRecord found = record::TakeKey(keys);
       if (!found || key.depth_ == record::kMaxDepth) {
         error = kDamaged;
         break;
       }
-      const record::Name name = found.name();
-      const std::size_t place = key.keys_->Find(name);
-      if (place < key.keys_->items().size()) {
-        AddLayer(*key.keys_->items()[place], found);
-      } else {
-        key.keys_->Append(Make<Key>(*this, &key, found));
-      }
+      TakeKey(key, found);
     }
+  }
+  if (key.parent == root_ && &key == Container()) {
+    for (const FileContent::Entry& entry : content_.entries) TakeKey(key, entry.key);
   }
   key.keysAreWhole_ = true;
   return *key.keys_;
 }
 
+/// Lays a key over the one of its name, or puts it behind the others.
+void KeyTree::TakeKey(Key& above, const KeyRecord& found) {
+  const record::Name name = found.name();
+  const std::size_t place = above.keys_->Find(name);
+  if (place < above.keys_->items().size()) {
+    AddLayer(*above.keys_->items()[place], found.content());
+  } else {
+    above.keys_->Append(Make<Key>(*this, &above, found));
+  }
+}
+
+KeyTree::Key* KeyTree::Container() {
+  const auto& keys = Keys(*root_);
+  return keys.empty() ? nullptr : keys.front();
+}
+
 ValueRecord KeyTree::FindValue(Key& key, LookupName& name) {
-  const bool readWhereTheyLie = !key.values_ && key.HasOneLayer() &&
-                                (visited_.IsAt(key) || visited_.Visit(key, key.first_.record));
+  const bool readWhereTheyLie =
+      !key.values_ && key.HasOneLayer() &&
+      (visited_.IsAt(key) || visited_.Visit(key, key.first_.content.values()));
   if (readWhereTheyLie) return visited_.Find(name);
   const auto& values = TakeValues(key);
   const std::size_t place = values.Find(name);
@@ -138,7 +158,7 @@ KeyTree::Key* KeyTree::OpenKey(Key& key, const record::Name& name, std::uint8_t 
   if (Key* const found = FindKey(key, name)) return found;
   if (key.depth_ == record::kMaxDepth || name.bytes > kMaxNameBytes) return nullptr;
   auto* const made = Make<Key>(*this, &key, MakeRecord(name, dimension));
-  MarkUnsaved(*made);
+  MarkUnsaved(*made).isNew = true;
   TakeKeys(key).Append(made);
   return made;
 }
@@ -152,32 +172,30 @@ bool KeyTree::SetValue(Key& key, const record::Value& value) {
   if (replaces && IsSame(replaced.value(), value)) return true;
 
   PendingChanges::OfKey& pending = MarkUnsaved(key);
-  const std::size_t size = record::ValueRecordSize(value);
-  const ValueRecord made = record::WriteValue(Room(size), value);
+  const ValueRecord made = record::WriteValue(Room(record::ValueSize(value)), value);
   if (replaces) {
-    if (pending.Add(place)) pending_.CountSuperseded(replaced.bytes().size());
+    if (pending.Add(place)) pending_.CountSuperseded(record::ValueSize(replaced.value()));
     values.Replace(place, made);
   } else {
     pending.Reserve(place);
     values.Append(made);
     pending.Add(place);
   }
-  pending_.CountBytes(size);
   return true;
 }
 
 void KeyTree::DeepCopy(Key& to, Key& from) {
   if (&to == &from) return;
   KeyTree& source = *from.tree;
-  if (&source != this && source.isAsLoaded_ && from.HasOneLayer() && to.IsBlank()) {
+  const bool isInEntries = to.depth_ >= kEntryDepth && from.depth_ >= kEntryDepth;
+  if (isInEntries && &source != this && source.isAsLoaded_ && from.HasOneLayer() && to.IsBlank()) {
     // As a whole, and where it lies: this is how entries are copied when files are merged.
-    const record::KeyRecord record = from.first_.record;
-    if (record::IsWhole(record.bytes(), record::kMaxDepth - to.depth_)) {
+    const Content content = from.first_.content;
+    if (record::IsWhole(content, record::kMaxDepth - to.depth_)) {
       lenders_.insert(source.shared_from_this());
       PendingChanges::OfKey& pending = MarkUnsaved(to);
-      AddLayer(to, record);
-      pending.copied = record;
-      pending_.CountBytes(record.bytes().size());
+      AddLayer(to, content);
+      pending.copied = content;
       return;
     }
   }
@@ -194,29 +212,87 @@ PendingChanges::OfKey& KeyTree::MarkUnsaved(const Key& key) {
   return pending_.Of(key);
 }
 
-void KeyTree::WriteUnsaved(record::Buffer& to) {
-  to.reserve(to.size() + pending_.bytes());
-  WriteUnsaved(to, *root_);
+bool KeyTree::AddsEntriesOnly() {
+  const PendingChanges::OfKey& ofRoot = pending_.At(*root_);
+  const Key* const container = Container();
+  if (!ofRoot.values.empty() || ofRoot.keys != std::vector<const Key*>{container}) return false;
+  const PendingChanges::OfKey& pending = pending_.At(*container);
+  return !pending.isNew && pending.values.empty() &&
+         std::all_of(pending.keys.begin(), pending.keys.end(),
+                     [this](const Key* entry) { return pending_.At(*entry).isNew; });
 }
 
-void KeyTree::WriteUnsaved(record::Buffer& to, const Key& key) {
-  record::KeyWriter writer(to, key.dimension(), key.name());
-  const PendingChanges::OfKey& pending = pending_.At(key);
-  if (pending.copied) record::AppendBytes(to, pending.copied.values());
-  for (const std::size_t place : pending.values) {
-    record::AppendBytes(to, key.values_->items()[place].bytes());
+const std::vector<const KeyTree::Key*>& KeyTree::UnsavedEntries() {
+  static const std::vector<const Key*> none;
+  const Key* const container = Container();
+  const PendingChanges::OfKey* const pending = container ? pending_.Find(*container) : nullptr;
+  return pending ? pending->keys : none;
+}
+
+void KeyTree::WriteUnsaved(SegmentWriter& to) {
+  if (!AddsEntriesOnly()) {
+    ContentBuffer tree;
+    WriteUnsaved(tree, *root_);
+    to.AddTree(tree);
   }
+  for (const Key* const entry : UnsavedEntries()) {
+    const PendingChanges::OfKey& pending = pending_.At(*entry);
+    if (pending.copied && pending.values.empty() && pending.keys.empty()) {
+      to.AddEntry(entry->record_.head(), *pending.copied);
+      continue;
+    }
+    ContentBuffer content;
+    WriteUnsaved(content, *entry);
+    to.AddEntry(entry->record_.head(), record::ContentOf(content));
+  }
+}
+
+/// Writes what is not saved of a key; of the container, without its entries.
+void KeyTree::WriteUnsaved(ContentBuffer& to, const Key& key) {
+  ContentWriter writer(to);
+  const PendingChanges::OfKey& pending = pending_.At(key);
+  if (pending.copied) writer.Append(pending.copied->values());
+  for (const std::size_t place : pending.values) writer.Append(key.values_->items()[place]);
   writer.EndValues();
-  if (pending.copied) record::AppendBytes(to, pending.copied.keys());
-  for (const Key* const sub : pending.keys) WriteUnsaved(to, *sub);
+  if (pending.copied) writer.Append(pending.copied->keys());
+  if (&key != Container()) {
+    for (const Key* const sub : pending.keys) {
+      record::AppendBytes(to.shape, sub->record_.head());
+      WriteUnsaved(to, *sub);
+    }
+  }
   writer.Close();
 }
 
-void KeyTree::WriteAll(record::Buffer& to, Key& key) {
-  record::KeyWriter writer(to, key.dimension(), key.name());
-  for (const ValueRecord value : Values(key)) record::AppendBytes(to, value.bytes());
+void KeyTree::WriteAll(SegmentWriter& to) {
+  ContentBuffer tree;
+  WriteAll(tree, *root_);
+  to.AddTree(tree);
+  if (!Container()) return;
+  for (Key* const entry : Keys(*Container())) {
+    const bool isAsItLies = isAsLoaded_ && entry->HasOneLayer() &&
+                            record::IsWhole(entry->first_.content, record::kMaxDepth - kEntryDepth);
+    if (isAsItLies) {
+      to.AddEntry(entry->record_.head(), entry->first_.content);
+      continue;
+    }
+    ContentBuffer content;
+    WriteAll(content, *entry);
+    to.AddEntry(entry->record_.head(), record::ContentOf(content));
+  }
+}
+
+/// Writes all of a key; of the container, without its entries.
+void KeyTree::WriteAll(ContentBuffer& to, Key& key) {
+  ContentWriter writer(to);
+  for (const ValueRecord value : Values(key)) writer.Append(value);
   writer.EndValues();
-  for (Key* const sub : Keys(key)) WriteAll(to, *sub);
+  if (&key != Container()) {
+    for (Key* const sub : Keys(key)) {
+      record::AppendBytes(to.shape, sub->record_.head());
+      WriteAll(to, *sub);
+    }
+  }
   writer.Close();
 }
 

@@ -4,7 +4,6 @@
 #include <memory>
 #include <memory_resource>
 #include <set>
-#include <string>
 #include <utility>
 #include <vector>
 
@@ -17,18 +16,19 @@
 
 namespace orx {
 
-/// A key in memory: the records that are laid over one another to make it. Its sub-keys and its
+/// A key in memory: its record, and what is laid over what that holds. Its sub-keys and its
 /// values are each taken apart when they are first needed.
 class TGenericRegistryKeyImp {
  public:
   TGenericRegistryKeyImp(KeyTree& owner, TGenericRegistryKeyImp* above, record::KeyRecord record)
       : tree(&owner),
         parent(above),
-        first_{record, nullptr},
+        record_(record),
+        first_{record.content(), nullptr},
         depth_(static_cast<std::uint8_t>(above ? above->depth_ + 1 : 0)) {}
 
-  record::Name name() const { return first_.record.name(); }
-  std::uint8_t dimension() const { return first_.record.dimension(); }
+  record::Name name() const { return record_.name(); }
+  std::uint8_t dimension() const { return record_.dimension(); }
 
   KeyTree* const tree;
   TGenericRegistryKeyImp* const parent;  ///< null for the root
@@ -37,17 +37,15 @@ class TGenericRegistryKeyImp {
   friend class KeyTree;
 
   struct Layer {
-    record::KeyRecord record;
+    record::Content content;
     Layer* next;
   };
 
   bool HasOneLayer() const { return !first_.next; }
   /// True when nobody has put anything into it or looked for anything in it.
-  bool IsBlank() const {
-    return HasOneLayer() && !values_ && !keys_ && first_.record.values().empty() &&
-           first_.record.keys().empty();
-  }
+  bool IsBlank() const { return HasOneLayer() && !values_ && !keys_ && first_.content.IsEmpty(); }
 
+  const record::KeyRecord record_;
   Layer first_;
   Layer* last_ = nullptr;  ///< null: the first is the last
   NamedList<record::ValueRecord>* values_ = nullptr;
@@ -62,7 +60,7 @@ class TGenericRegistryKeyImp {
 class VisitedValues {
  public:
   /// \return false when the key has too many values, or damaged ones
-  bool Visit(const TGenericRegistryKeyImp& key, record::KeyRecord record);
+  bool Visit(const TGenericRegistryKeyImp& key, record::Part values);
   bool IsAt(const TGenericRegistryKeyImp& key) const { return key_ == &key; }
   /// Looks at the value found last and those behind it first.
   /// \return none when there is none of that name
@@ -81,7 +79,8 @@ class VisitedValues {
 /// since it was last saved is kept apart, so that saving costs what changed.
 ///
 /// What always holds: A key is what its layers make when they are laid over one another in their
-/// order, and nothing is ever taken out of it. Records lie in the file's bytes, in `memory_`, or in
+/// order, the entries of the file behind those of the first key below the root, and nothing is ever
+/// taken out of it. Records lie in the file's bytes, in `memory_`, or in
 /// the trees of `lenders_`, and stay there as long as the tree does. A list of values or of
 /// sub-keys is either not there, or growing while its layers are taken apart, or whole; only a
 /// whole one gets what is new, and the places in it do not move. Whatever is not in the file is
@@ -90,7 +89,8 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
  public:
   using Key = TGenericRegistryKeyImp;
 
-  explicit KeyTree(std::u16string text);
+  /// A tree without a file.
+  explicit KeyTree(const std::u16string& description);
   explicit KeyTree(FileContent content);
   KeyTree(const KeyTree&) = delete;
   KeyTree& operator=(const KeyTree&) = delete;
@@ -122,17 +122,27 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   bool HasUnsaved() const { return pending_.Any(); }
   /// Bytes of saved values that unsaved ones replace.
   std::uint64_t superseded() const { return pending_.superseded(); }
-  /// Appends the record of the root with what is not saved; something is.
-  void WriteUnsaved(record::Buffer& to);
-  /// Appends the record of the root with everything.
-  void WriteAll(record::Buffer& to) { WriteAll(to, *root_); }
+  /// True when all that is not saved are new sub-keys of the first key below the root, which are
+  /// the tree's entries.
+  bool AddsEntriesOnly();
+  /// The entries of which something is not saved.
+  const std::vector<const Key*>& UnsavedEntries();
+  /// Writes what is not saved; something is.
+  void WriteUnsaved(SegmentWriter& to);
+  void WriteAll(SegmentWriter& to);
   void MarkSaved() { pending_.Clear(); }
+  /// Makes a key that is not among the sub-keys of the one above it.
+  /// \param memory in which the record lies
+  Key& MakeLoose(Key& above, record::KeyRecord record, record::Buffer memory);
   /// True when some of the tree lies in the memory of trees that it was copied from.
   bool HasBorrowed() const { return !lenders_.empty(); }
 
+  /// What the tree was loaded from.
+  FileContent& content() { return content_; }
+
   RegistryError error = kRegistryOk;
-  const std::u16string description;
-  FilePosition position;  ///< where the tree's file was last seen to end
+  format::FileHeader header;  ///< of the tree's file
+  FilePosition position;      ///< where it was last seen to end
 
  private:
   template <class T, class... Arguments>
@@ -142,14 +152,17 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   }
   unsigned char* Room(std::size_t bytes);
   record::KeyRecord MakeRecord(const record::Name& name, std::uint8_t dimension);
-  void AddLayer(Key& key, record::KeyRecord record);
+  void AddLayer(Key& key, const record::Content& content);
+  void TakeKey(Key& above, const record::KeyRecord& found);
+  /// The first key below the root; null when there is none.
+  Key* Container();
   NamedList<record::ValueRecord>& TakeValues(Key& key);
   NamedList<Key*>& TakeKeys(Key& key);
   PendingChanges::OfKey& MarkUnsaved(const Key& key);
-  void WriteUnsaved(record::Buffer& to, const Key& key);
-  void WriteAll(record::Buffer& to, Key& key);
+  void WriteUnsaved(record::ContentBuffer& to, const Key& key);
+  void WriteAll(record::ContentBuffer& to, Key& key);
 
-  os::Memory file_;
+  FileContent content_;
   std::set<std::shared_ptr<KeyTree>> lenders_;  ///< trees in whose memory copied records lie
   std::pmr::monotonic_buffer_resource memory_;
   Key* root_;

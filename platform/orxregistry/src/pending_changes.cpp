@@ -33,7 +33,6 @@ PendingChanges::OfKey& PendingChanges::Of(const Key& key) {
 
 void PendingChanges::Clear() {
   keys_.clear();
-  bytes_ = 0;
   superseded_ = 0;
 }
 

@@ -2,6 +2,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <optional>
 #include <unordered_map>
 #include <vector>
 
@@ -19,7 +20,8 @@ class PendingChanges {
 
   /// What is pending of a key.
   struct OfKey {
-    record::KeyRecord copied;         ///< a record that all of the key's content came from, or none
+    bool isNew = false;                     ///< no file has the key
+    std::optional<record::Content> copied;  ///< what all that the key holds came from, if one did
     std::vector<std::size_t> values;  ///< places of the values, in the order in which they changed
     std::vector<bool> isPending;      ///< by place; those behind its end are not
     std::vector<const Key*> keys;
@@ -32,8 +34,6 @@ class PendingChanges {
 
   /// True from the first change until Clear().
   bool Any() const { return !keys_.empty(); }
-  /// What a save will write at least.
-  std::size_t bytes() const { return bytes_; }
   /// Bytes of saved values that pending ones replace.
   std::uint64_t superseded() const { return superseded_; }
 
@@ -41,15 +41,18 @@ class PendingChanges {
   OfKey& Of(const Key& key);
   /// What is pending of a key of which something is.
   const OfKey& At(const Key& key) const { return keys_.at(&key); }
+  /// \return null when nothing is pending of the key
+  const OfKey* Find(const Key& key) const {
+    const auto found = keys_.find(&key);
+    return found == keys_.end() ? nullptr : &found->second;
+  }
 
-  void CountBytes(std::size_t bytes) { bytes_ += bytes; }
   void CountSuperseded(std::size_t bytes) { superseded_ += bytes; }
 
   void Clear();
 
  private:
   std::unordered_map<const Key*, OfKey> keys_;
-  std::size_t bytes_ = 0;
   std::uint64_t superseded_ = 0;
 };
 

@@ -21,46 +21,57 @@ ValueRecord WriteValue(unsigned char* to, const Value& value) {
   to[kValueDimensionAt] = value.dimension;
   unsigned char* const data = std::copy_n(value.name.units, value.name.bytes, to + kValueHeader);
   std::copy_n(value.data, value.dataSize, data);
-  return ValueRecord(to);
+  return {to, data};
 }
 
-KeyRecord WriteEmptyKey(unsigned char* to, std::uint8_t dimension, const Name& name) {
-  Store(to + kValuesSizeAt, std::uint64_t{0});
-  Store(to + kKeysSizeAt, std::uint64_t{0});
+Content::Content() {
+  static constexpr unsigned char kNothing[kContentHeader] = {};
+  shape_ = kNothing;
+  data_ = kNothing;
+}
+
+Bytes WriteHead(unsigned char* to, std::uint8_t dimension, const Name& name) {
   Store(to + kKeyNameUnitsAt, static_cast<std::uint16_t>(name.bytes / kUnit));
   to[kKeyDimensionAt] = dimension;
   to[kKeyReservedAt] = 0;
   std::copy_n(name.units, name.bytes, to + kKeyHeader);
-  return KeyRecord(to);
+  return {to, HeadSize(name)};
 }
 
-bool IsWhole(Bytes bytes, int depth) {
-  const KeyRecord key = TakeKey(bytes);
-  if (!key || !bytes.empty() || depth < 0) return false;
-  for (Bytes values = key.values(); !values.empty();) {
+bool IsWhole(const Content& content, int depth) {
+  if (depth < 0) return false;
+  for (Part values = content.values(); !values.shapes.empty();) {
     if (!TakeValue(values)) return false;
   }
-  for (Bytes keys = key.keys(); !keys.empty();) {
+  for (Part keys = content.keys(); !keys.shapes.empty();) {
     const KeyRecord sub = TakeKey(keys);
-    if (!sub || !IsWhole(sub.bytes(), depth - 1)) return false;
+    if (!sub || !IsWhole(sub.content(), depth - 1)) return false;
   }
   return true;
 }
 
-KeyWriter::KeyWriter(Buffer& to, std::uint8_t dimension, const Name& name)
-    : to_(to), start_(to.size()) {
-  to.resize(start_ + EmptyKeySize(name));
-  WriteEmptyKey(to.data() + start_, dimension, name);
-  valuesStart_ = to.size();
-  keysStart_ = to.size();
+ContentWriter::ContentWriter(ContentBuffer& to)
+    : to_(to), start_(to.shape.size()), dataStart_(to.data.size()) {
+  to.shape.resize(start_ + kContentHeader);
 }
 
-void KeyWriter::EndValues() { keysStart_ = to_.size(); }
+void ContentWriter::Append(const Part& part) {
+  AppendBytes(to_.shape, part.shapes);
+  AppendBytes(to_.data, part.data);
+}
 
-void KeyWriter::Close() {
-  unsigned char* const record = to_.data() + start_;
-  Store(record + kValuesSizeAt, std::uint64_t{keysStart_ - valuesStart_});
-  Store(record + kKeysSizeAt, std::uint64_t{to_.size() - keysStart_});
+void ContentWriter::EndValues() {
+  valuesShape_ = to_.shape.size() - start_ - kContentHeader;
+  valuesData_ = to_.data.size() - dataStart_;
+}
+
+void ContentWriter::Close() {
+  unsigned char* const header = to_.shape.data() + start_;
+  const std::size_t shape = to_.shape.size() - start_ - kContentHeader;
+  Store(header + kValuesShapeAt, std::uint64_t{valuesShape_});
+  Store(header + kKeysShapeAt, std::uint64_t{shape - valuesShape_});
+  Store(header + kValuesDataAt, std::uint64_t{valuesData_});
+  Store(header + kKeysDataAt, std::uint64_t{to_.data.size() - dataStart_ - valuesData_});
 }
 
 }  // namespace orx::record

@@ -1,147 +1,88 @@
 #include "segment_file.h"
 
 #include <algorithm>
-#include <cstring>
-#include <string_view>
+#include <unordered_set>
 #include <utility>
 
 #include "key_tree.h"
 #include "orxutils/file_error.h"
 #include "orxutils/file_funcs.h"
 
-#define XXH_INLINE_ALL
-#include <xxhash.h>
-
 namespace orx {
 namespace {
 
+using format::PieceKind;
 using record::Buffer;
 using record::Bytes;
 
-// File header: magic, registry version, bytes of the description, the description, checksum.
-constexpr unsigned char kMagic[8] = {0x89, 'O', 'R', 'X', '\r', '\n', 0x1A, '\n'};
-constexpr std::size_t kVersionAt = sizeof kMagic;
-constexpr std::size_t kDescriptionSizeAt = kVersionAt + sizeof(std::uint32_t);
-constexpr std::size_t kDescriptionAt = kDescriptionSizeAt + sizeof(std::uint32_t);
-constexpr std::size_t kMaxDescription = 4096;
-constexpr std::size_t kChecksum = sizeof(std::uint64_t);
-constexpr std::size_t kMaxFileHeader = kDescriptionAt + kMaxDescription + kChecksum;
 /// A file of at most so many bytes is read in one piece, before it is known what it is.
 constexpr std::uint64_t kReadUnasked = 1U << 16U;
 
-// Segment header: mark, zero, size of the tree, superseded bytes, checksum of the tree, checksum of
-// the header itself, for which its place in the file is the seed.
-constexpr std::uint32_t kSegmentMark = 0x31474553;  // "SEG1"
-constexpr std::size_t kTreeSizeAt = 8;
-constexpr std::size_t kSupersededAt = 16;
-constexpr std::size_t kTreeChecksumAt = 24;
-constexpr std::size_t kHeaderChecksumAt = 32;
-constexpr std::size_t kSegmentHeader = 40;
-
-std::uint64_t Checksum(const unsigned char* bytes, std::size_t size, std::uint64_t seed = 0) {
-  return XXH3_64bits_withSeed(bytes, size, seed);
-}
-
-struct SegmentHeader {
-  std::uint64_t treeSize;
-  std::uint64_t superseded;
-  std::uint64_t treeChecksum;
-};
-
-/// Size of the file's header, or 0 when the bytes do not begin with one.
-std::size_t CheckFileHeader(Bytes bytes) {
-  if (bytes.size() < kDescriptionAt + kChecksum) return 0;
-  if (std::memcmp(bytes.data(), kMagic, sizeof kMagic) != 0) return 0;
-  if (record::Load<std::uint32_t>(bytes.data() + kVersionAt) != kRegistryVersion) return 0;
-  const auto description = record::Load<std::uint32_t>(bytes.data() + kDescriptionSizeAt);
-  if (description > kMaxDescription || description % sizeof(char16_t) != 0) return 0;
-  const std::size_t checked = kDescriptionAt + description;
-  if (bytes.size() < checked + kChecksum) return 0;
-  const auto stored = record::Load<std::uint64_t>(bytes.data() + checked);
-  return stored == Checksum(bytes.data(), checked) ? checked + kChecksum : 0;
-}
-
-std::u16string DescriptionOf(Bytes bytes) {
-  const auto size = record::Load<std::uint32_t>(bytes.data() + kDescriptionSizeAt);
-  std::u16string description(size / sizeof(char16_t), u'\0');
-  std::memcpy(description.data(), bytes.data() + kDescriptionAt, size);
-  return description;
-}
-
-Buffer MakeFileHeader(const std::u16string& description) {
-  const std::size_t size = std::min(description.size() * sizeof(char16_t), kMaxDescription);
-  Buffer header;
-  header.reserve(kDescriptionAt + size + kChecksum);
-  header.insert(header.end(), kMagic, kMagic + sizeof kMagic);
-  record::Append(header, std::uint32_t{kRegistryVersion});
-  record::Append(header, static_cast<std::uint32_t>(size));
-  const auto* const text = reinterpret_cast<const unsigned char*>(description.data());
-  header.insert(header.end(), text, text + size);
-  record::Append(header, Checksum(header.data(), header.size()));
-  return header;
-}
-
-bool IsSegmentHeader(Bytes bytes, std::size_t at) {
-  if (bytes.size() - at < kSegmentHeader) return false;
-  const unsigned char* const header = bytes.data() + at;
-  return record::Load<std::uint32_t>(header) == kSegmentMark &&
-         record::Load<std::uint64_t>(header + kHeaderChecksumAt) ==
-             Checksum(header, kHeaderChecksumAt, at);
-}
-
-SegmentHeader SegmentHeaderAt(const unsigned char* header) {
-  return {record::Load<std::uint64_t>(header + kTreeSizeAt),
-          record::Load<std::uint64_t>(header + kSupersededAt),
-          record::Load<std::uint64_t>(header + kTreeChecksumAt)};
-}
-
-/// Fills in a segment's header, for which there is room in front of its tree.
-/// \param start where in `bytes` the header is; the tree is all that comes behind it
-/// \param at where in the file the segment will be
-void FinishSegment(Buffer& bytes, std::size_t start, std::uint64_t at, std::uint64_t superseded) {
-  unsigned char* const header = bytes.data() + start;
-  const unsigned char* const tree = header + kSegmentHeader;
-  const std::uint64_t treeSize = bytes.size() - start - kSegmentHeader;
-  record::Store(header, kSegmentMark);
-  record::Store(header + kTreeSizeAt, treeSize);
-  record::Store(header + kSupersededAt, superseded);
-  record::Store(header + kTreeChecksumAt, Checksum(tree, treeSize));
-  record::Store(header + kHeaderChecksumAt, Checksum(header, kHeaderChecksumAt, at));
-}
-
-/// Tells damage from a save that never finished: behind damage there is another segment.
-bool HasSegmentBehind(Bytes bytes, std::size_t at) {
-  const std::string_view text(reinterpret_cast<const char*>(bytes.data()), bytes.size());
-  const std::string_view mark(reinterpret_cast<const char*>(&kSegmentMark), sizeof kSegmentMark);
-  for (at = text.find(mark, at + 1); at != text.npos; at = text.find(mark, at + 1)) {
-    if (IsSegmentHeader(bytes, at)) return true;
+/// Takes a piece of a segment over.
+/// \param hasContainer there is a key below the root whose sub-keys entries could be
+/// \return false when the piece is not right
+bool TakePiece(const format::Piece& piece, bool& hasContainer, FileContent& content,
+               const FindShape& findShape) {
+  switch (piece.kind) {
+    case PieceKind::kTree: {
+      const std::optional<record::Content> tree = record::SplitContent(piece.content);
+      if (!tree) return false;
+      hasContainer = hasContainer || !tree->keys().shapes.empty();
+      content.trees.push_back(*tree);
+      return true;
+    }
+    case PieceKind::kShape:
+      content.shapes.emplace_hint(content.shapes.end(), piece.at, piece.content);
+      return true;
+    case PieceKind::kEntry: {
+      const std::optional<format::Entry> entry = format::ReadEntry(piece.content);
+      if (!entry || !hasContainer) return false;
+      const Bytes* shape = content.ShapeAt(entry->shapeAt);
+      if (!shape && findShape(entry->shapeAt)) shape = content.ShapeAt(entry->shapeAt);
+      const auto key = shape ? format::MakeEntry(*entry, piece.at, *shape) : record::KeyRecord();
+      if (!key) return false;
+      content.entries.push_back({key, piece.at});
+      return true;
+    }
+    case PieceKind::kNode:
+      return true;
+    case PieceKind::kTrailer:
+      content.trailer = format::ReadTrailer(piece.content);
+      return true;
   }
   return false;
 }
 
-/// Finds the segments of a file that is in memory.
+/// Tells damage from a save that never finished: behind damage there is another segment.
+bool HasSegmentBehind(Bytes bytes, std::size_t at) {
+  for (at = format::FindSegmentMark(bytes, at + 1); at < bytes.size();
+       at = format::FindSegmentMark(bytes, at + 1)) {
+    if (format::ReadSegmentHeader(bytes.substr(at), at)) return true;
+  }
+  return false;
+}
+
+/// In a file that is read as a whole, all shapes are in its content.
+bool FindNoShape(std::uint64_t /*at*/) { return false; }
+
+/// Finds what is in a file that is in memory.
 void FindSegments(Bytes bytes, FileContent& content) {
-  std::size_t at = CheckFileHeader(bytes);
-  if (at == 0) {
+  Bytes rest = bytes;
+  std::optional<format::FileHeader> header = format::TakeFileHeader(rest);
+  if (!header) {
     content.error = kNotARegistryFile;
     return;
   }
-  content.description = DescriptionOf(bytes);
-  content.end = at;
-  while (at < bytes.size()) {
-    if (!IsSegmentHeader(bytes, at)) break;
-    const SegmentHeader header = SegmentHeaderAt(bytes.data() + at);
-    const std::size_t treeAt = at + kSegmentHeader;
-    if (header.treeSize > bytes.size() - treeAt) break;
-    if (Checksum(bytes.data() + treeAt, header.treeSize) != header.treeChecksum) break;
-    content.segments.push_back(bytes.substr(treeAt, header.treeSize));
-    content.superseded = header.superseded;
-    at = treeAt + header.treeSize;
-    content.end = at;
+  content.header = *std::move(header);
+  const std::size_t start = bytes.size() - rest.size();
+  content.end = start;
+  while (const std::size_t size =
+             AddSegment(bytes.substr(content.end), content.end, content, &FindNoShape)) {
+    content.end += size;
   }
   // A file gets its name only with its first segment in it, so one without was cut off later.
   const bool damaged =
-      content.segments.empty() || (at < bytes.size() && HasSegmentBehind(bytes, at));
+      content.end == start || (content.end < bytes.size() && HasSegmentBehind(bytes, content.end));
   if (damaged) content.error = kDamaged;
 }
 
@@ -156,9 +97,10 @@ FileContent ReadOnce(const os::File& file) {
   content.stamp = *stamp;
   if (stamp->size > kReadUnasked) {
     // No more is read of what is no registry file, however large.
-    unsigned char header[kMaxFileHeader];
+    unsigned char header[format::kMaxFileHeader];
     const auto headerSize = file.Read(0, header, sizeof header);
-    if (!headerSize || CheckFileHeader(Bytes(header, *headerSize)) == 0) {
+    Bytes start(header, headerSize.value_or(0));
+    if (!format::TakeFileHeader(start)) {
       content.error = headerSize ? kNotARegistryFile : kCannotBeOpened;
       return content;
     }
@@ -173,8 +115,102 @@ FileContent ReadOnce(const os::File& file) {
   return content;
 }
 
-/// Reads an open file from its start.
-FileContent ReadContent(const os::File& file) {
+/// A whole file that holds all of a tree in one segment.
+struct NewFile {
+  Buffer bytes;
+  FileGrowth growth;
+};
+
+/// \return nothing when the tree turns out to be damaged
+std::optional<NewFile> MakeFile(KeyTree& tree) {
+  Buffer bytes;
+  format::AppendFileHeader(bytes, tree.header);
+  const std::uint64_t start = bytes.size();
+  NewFile file{std::move(bytes), FileGrowth(tree.header, start)};
+  SegmentWriter writer(file.growth, file.bytes, start);
+  tree.WriteAll(writer);
+  if (tree.error != kRegistryOk) return std::nullopt;
+  writer.Finish(0, true);
+  return file;
+}
+
+/// The content of a file and one more segment, written anew without what is superseded.
+std::optional<NewFile> Compact(FileContent content, Buffer segment) {
+  const Buffer& added = content.moreMemory.emplace_back(std::move(segment));
+  if (AddSegment({added.data(), added.size()}, content.end, content, &FindNoShape) == 0)
+    return std::nullopt;
+  KeyTree merged(std::move(content));
+  return MakeFile(merged);
+}
+
+/// Brings the position of a tree up to what is in its locked file.
+/// \param others receives what the file holds when it was read because it has changed
+/// \return kFailed when the file is not one to append to
+AppendResult CatchUp(const os::File& file, KeyTree& tree, FilePosition& position,
+                     std::optional<FileContent>& others) {
+  const std::optional<os::FileStamp> stamp = file.Stamp();
+  if (!stamp) return AppendResult::kFailed;
+  if (*stamp == position.stamp && position.growth) return AppendResult::kAppended;
+  if (*stamp == position.stamp && position.end == tree.content().end) {
+    position.growth.emplace(tree.content());
+    return AppendResult::kAppended;
+  }
+  others = ReadRegistryFile(file);
+  if (others->error != kRegistryOk) return AppendResult::kFailed;
+  position = {others->stamp, others->end, others->superseded, false, FileGrowth(*others)};
+  return AppendResult::kBehindOthers;
+}
+
+/// True when a file holds one of the entries that a tree is about to add.
+bool HoldsAnyOf(const FileContent& content, const std::vector<const KeyTree::Key*>& added) {
+  struct Hash {
+    std::size_t operator()(const record::Name& name) const { return record::HashOf(name); }
+  };
+  std::unordered_set<record::Name, Hash> names;
+  for (const KeyTree::Key* const entry : added) names.insert(entry->name());
+  return std::any_of(content.entries.begin(), content.entries.end(), [&](const auto& entry) {
+    return names.find(entry.key.name()) != names.end();
+  });
+}
+
+/// Writes a segment behind the end of a file, and makes it durable.
+bool Append(os::File& file, std::uint64_t end, const Buffer& segment) {
+  std::size_t done = 0;
+  if (segment.size() > format::kCheckedWithItsTrailer) {
+    done = segment.size() - format::kTrailer;
+    if (!file.Write(end, segment.data(), done) || !file.Flush()) return false;
+  }
+  return file.Write(end + done, segment.data() + done, segment.size() - done) && file.Flush();
+}
+
+}  // namespace
+
+const Bytes* FileContent::ShapeAt(std::uint64_t at) const {
+  const auto found = shapes.find(at);
+  return found == shapes.end() ? nullptr : &found->second;
+}
+
+std::size_t AddSegment(Bytes bytes, std::uint64_t at, FileContent& content,
+                       const FindShape& findShape) {
+  const std::size_t trees = content.trees.size();
+  const std::size_t entries = content.entries.size();
+  bool hasContainer = content.hasContainer;
+  format::SegmentHeader header;
+  const std::size_t size = format::TakeSegment(bytes, at, header, [&](const format::Piece& piece) {
+    return TakePiece(piece, hasContainer, content, findShape);
+  });
+  if (size == 0) {
+    content.trees.resize(trees);
+    content.entries.resize(entries);
+    content.shapes.erase(content.shapes.lower_bound(at), content.shapes.end());
+    return 0;
+  }
+  content.hasContainer = hasContainer;
+  content.superseded = header.superseded;
+  return size;
+}
+
+FileContent ReadRegistryFile(const os::File& file) {
   for (;;) {
     FileContent content = ReadOnce(file);
     // What looks like damage can be a save that others cut off and wrote over meanwhile.
@@ -182,43 +218,12 @@ FileContent ReadContent(const os::File& file) {
   }
 }
 
-/// The content of a file and one more tree, written anew without what is superseded.
-std::optional<Buffer> Compact(FileContent content, Bytes added) {
-  content.segments.push_back(added);
-  KeyTree merged(std::move(content));
-  return MakeRegistryFile(merged);
-}
-
-/// Brings the position up to what is in the locked file.
-/// \return kFailed when the file is not one to append to
-AppendResult CatchUp(const os::File& file, FilePosition& position) {
-  const std::optional<os::FileStamp> stamp = file.Stamp();
-  if (!stamp) return AppendResult::kFailed;
-  if (*stamp == position.stamp) return AppendResult::kAppended;
-  const FileContent content = ReadContent(file);
-  if (content.error != kRegistryOk) return AppendResult::kFailed;
-  position = {content.stamp, content.end, content.superseded, false};
-  return AppendResult::kBehindOthers;
-}
-
-}  // namespace
-
 FileContent ReadRegistryFile(const std::filesystem::path& path) {
   const std::optional<os::File> file = os::File::OpenToRead(path);
-  if (file) return ReadContent(*file);
+  if (file) return ReadRegistryFile(*file);
   FileContent content;
   content.error = kCannotBeOpened;
   return content;
-}
-
-std::optional<Buffer> MakeRegistryFile(KeyTree& tree) {
-  std::optional<Buffer> file = MakeFileHeader(tree.description);
-  const std::size_t start = file->size();
-  file->resize(start + kSegmentHeader);
-  tree.WriteAll(*file);
-  if (tree.error != kRegistryOk) return std::nullopt;
-  FinishSegment(*file, start, start, 0);
-  return file;
 }
 
 std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, const Buffer& bytes,
@@ -253,23 +258,42 @@ std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, cons
   return std::nullopt;
 }
 
+std::optional<FilePosition> SaveNewFile(const std::filesystem::path& path, KeyTree& tree) {
+  std::optional<NewFile> file = MakeFile(tree);
+  const auto stamp = file ? PublishFile(path, file->bytes, nullptr) : std::nullopt;
+  if (!stamp) return std::nullopt;
+  return FilePosition{*stamp, file->bytes.size(), 0, true, std::move(file->growth)};
+}
+
 AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
   const std::filesystem::path path = os::WithoutLinks(name);
   std::optional<os::File> file = os::File::OpenLocked(path);
   if (!file) return AppendResult::kFailed;
+  // Unless all goes well, what the file grows from is had from it again.
+  std::optional<FileGrowth> growth;
+  growth.swap(tree.position.growth);
   FilePosition at = tree.position;
-  const AppendResult result = CatchUp(*file, at);
-  if (result == AppendResult::kFailed || !tree.HasUnsaved()) return result;
-
-  Buffer segment(kSegmentHeader);
-  tree.WriteUnsaved(segment);
+  at.growth.swap(growth);
+  std::optional<FileContent> others;
+  const AppendResult result = CatchUp(*file, tree, at, others);
+  if (result == AppendResult::kFailed) return result;
+  if (!tree.HasUnsaved()) {
+    if (result == AppendResult::kAppended) tree.position = std::move(at);
+    return result;
+  }
+  const bool addsOnly =
+      tree.AddsEntriesOnly() && !(others && HoldsAnyOf(*others, tree.UnsavedEntries()));
+  const bool losesIndex = at.growth->HasIndex() && !addsOnly;
+  Buffer segment;
+  SegmentWriter writer(*at.growth, segment, at.end);
+  tree.WriteUnsaved(writer);
   at.superseded += tree.superseded();
-  if (at.superseded > (at.end + segment.size()) / 2) {
-    const Bytes unsaved(segment.data() + kSegmentHeader, segment.size() - kSegmentHeader);
-    const std::optional<Buffer> whole = Compact(ReadContent(*file), unsaved);
+  writer.Finish(at.superseded, addsOnly);
+  if (losesIndex || at.superseded > (at.end + segment.size()) / 2) {
+    std::optional<NewFile> whole = Compact(ReadRegistryFile(*file), segment);
     if (!whole) return AppendResult::kFailed;
-    if (const auto stamp = PublishFile(path, *whole, &*file)) {
-      tree.position = {*stamp, whole->size(), 0, true};
+    if (const auto stamp = PublishFile(path, whole->bytes, &*file)) {
+      tree.position = {*stamp, whole->bytes.size(), 0, true, std::move(whole->growth)};
       return result;
     }
     // An append needs less room, and fewer rights. But the new file may have the name already.
@@ -277,7 +301,6 @@ AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
     if (!named || !named->IsSameFile(at.stamp)) return AppendResult::kFailed;
     ForgetFileError();
   }
-  FinishSegment(segment, 0, at.end, at.superseded);
   // A name that may not be durable yet would take with it what is promised below.
   at.isNameDurable = at.isNameDurable || FileFuncs::flushName(path);
   if (!at.isNameDurable) {
@@ -285,15 +308,13 @@ AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
     return AppendResult::kFailed;
   }
   const bool cutOff = at.stamp.size == at.end || file->Truncate(at.end);
-  const bool written =
-      cutOff && file->Write(at.end, segment.data(), segment.size()) && file->Flush();
-  if (!written) {
+  if (!cutOff || !Append(*file, at.end, segment)) {
     file->Truncate(at.end);
     return AppendResult::kFailed;
   }
   at.end += segment.size();
   at.stamp = file->Stamp().value_or(os::FileStamp());
-  tree.position = at;
+  tree.position = std::move(at);
   return result;
 }
 

@@ -7,6 +7,7 @@
 #include <functional>
 #include <memory>
 
+#include "orxregistry/entry_areas.h"
 #include "orxregistry/export.h"
 #include "orxregistry/registry_key.h"
 #include "orxutils/orx_string.h"
@@ -87,6 +88,11 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
   /// \param flag no meaning here
   /// \param registryVersion kRegistryVersion
   bool Save(const COrxStringT<wchar_t>& fileName, bool flag, unsigned registryVersion);
+
+  /// Has the files that this tree is written to find their entries by areas. For a tree without a
+  /// file.
+  /// \param areas at most kMaxEntryAreas
+  void IndexBy(const EntryAreas& areas);
 
   /// True when the tree has changes that no save has made durable.
   bool HasUnsavedChanges() const;

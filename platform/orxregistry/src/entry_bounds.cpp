@@ -1,0 +1,98 @@
+#include "entry_bounds.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstring>
+#include <limits>
+#include <string>
+
+namespace orx {
+namespace {
+
+using record::Content;
+using record::KeyRecord;
+using record::Part;
+using record::ValueRecord;
+
+constexpr float kInfinity = std::numeric_limits<float>::infinity();
+constexpr float kLargest = std::numeric_limits<float>::max();
+
+record::Name NameOf(const std::u16string& text) {
+  return {reinterpret_cast<const unsigned char*>(text.data()), text.size() * sizeof(char16_t)};
+}
+
+/// The only one of a name among the values or the keys of a part; none when there is no such, or
+/// one of them is not whole.
+template <class Record>
+Record FindOnly(Part part, Record (*take)(Part&), const std::u16string& name) {
+  Record only;
+  while (!part.shapes.empty()) {
+    const Record record = take(part);
+    if (!record) return {};
+    if (!(record.name() == NameOf(name))) continue;
+    if (only) return {};
+    only = record;
+  }
+  return only;
+}
+
+std::optional<std::size_t> PlaceOf(const EntryArea& area, const Content& content) {
+  const KeyRecord key = FindOnly(content.keys(), record::TakeKey, area.key);
+  if (!key) return std::nullopt;
+  const Part values = key.content().values();
+  for (const std::u16string& needed : area.needed) {
+    if (!FindOnly(values, record::TakeValue, needed)) return std::nullopt;
+  }
+  const ValueRecord found = FindOnly(values, record::TakeValue, area.value);
+  if (!found || found.value().elementSize != area.bytes) return std::nullopt;
+  return found.data().data() - content.data().data();
+}
+
+float Down(double value) {
+  if (value > kLargest) return kLargest;
+  if (value < -kLargest) return -kInfinity;
+  const auto nearest = static_cast<float>(value);
+  return nearest <= value ? nearest : std::nextafter(nearest, -kInfinity);
+}
+
+float Up(double value) { return -Down(-value); }
+
+/// An extent of 0 may stand for anything, and an edge that is no number, too.
+bool IsArea(const double (&area)[4]) {
+  return std::isfinite(area[0] + area[1]) && std::isfinite(area[2] + area[3]) && area[1] > 0.0 &&
+         area[3] > 0.0 && std::isfinite(area[1]) && std::isfinite(area[3]);
+}
+
+}  // namespace
+
+const Bounds kEverything{{-kInfinity, -kInfinity}, {kInfinity, kInfinity}};
+
+void Bounds::Include(const Bounds& other) {
+  for (int axis = 0; axis < 2; ++axis) {
+    low[axis] = std::min(low[axis], other.low[axis]);
+    high[axis] = std::max(high[axis], other.high[axis]);
+  }
+}
+
+AreaPlaces::AreaPlaces(const EntryAreas& areas, const Content& content) {
+  for (std::size_t i = 0; i < areas.size(); ++i) places_[i] = PlaceOf(areas[i], content);
+}
+
+EntryBounds AreaPlaces::BoundsIn(record::Bytes data) const {
+  EntryBounds bounds;
+  for (std::size_t i = 0; i < bounds.size(); ++i) {
+    bounds[i] = kEverything;
+    if (!places_[i]) continue;
+    double area[4];
+    std::memcpy(area, data.data() + *places_[i], sizeof area);
+    if (!IsArea(area)) continue;
+    for (int axis = 0; axis < 2; ++axis) {
+      const double edge = area[2 * axis];
+      bounds[i].low[axis] = Down(edge);
+      bounds[i].high[axis] = Up(edge + area[2 * axis + 1]);
+    }
+  }
+  return bounds;
+}
+
+}  // namespace orx

@@ -1,0 +1,40 @@
+#pragma once
+
+#include <array>
+#include <cstddef>
+#include <optional>
+
+#include "orxregistry/entry_areas.h"
+#include "record_format.h"
+
+namespace orx {
+
+/// A rectangle that holds an area, or several: its edges are rounded outward.
+struct Bounds {
+  float low[2];   ///< along the first axis and the second
+  float high[2];  ///< the same
+
+  void Include(const Bounds& other);
+};
+
+/// The bounds of each kind of area that entries have.
+using EntryBounds = std::array<Bounds, kMaxEntryAreas>;
+
+/// Bounds of an area that is not known: everything.
+extern const Bounds kEverything;
+
+/// Where the entries of one shape have their areas.
+class AreaPlaces {
+ public:
+  /// \param content of an entry of that shape
+  AreaPlaces(const EntryAreas& areas, const record::Content& content);
+
+  /// \param data of an entry of that shape
+  EntryBounds BoundsIn(record::Bytes data) const;
+
+ private:
+  /// By the areas' order; nothing for an area that such entries do not have, or not just once.
+  std::array<std::optional<std::size_t>, kMaxEntryAreas> places_;
+};
+
+}  // namespace orx
