@@ -6,8 +6,8 @@
 namespace orx {
 namespace {
 
-using record::Append;
 using record::Load;
+using record::Store;
 
 // A node: level, number of items, items.
 constexpr std::size_t kItemsAt = 2 * sizeof(std::uint32_t);
@@ -49,13 +49,17 @@ std::optional<IndexNode> ReadNode(record::Bytes content, std::size_t areas) {
 }
 
 record::Buffer MakeNode(const IndexNode& node, std::size_t areas) {
-  record::Buffer content;
-  content.reserve(NodeSize(node.items.size(), areas));
-  Append(content, node.level);
-  Append(content, static_cast<std::uint32_t>(node.items.size()));
+  record::Buffer content(NodeSize(node.items.size(), areas));
+  Store(content.data(), node.level);
+  Store(content.data() + sizeof node.level, static_cast<std::uint32_t>(node.items.size()));
+  unsigned char* at = content.data() + kItemsAt;
   for (const IndexItem& item : node.items) {
-    Append(content, item.at);
-    for (std::size_t i = 0; i < areas; ++i) Append(content, item.bounds[i]);
+    Store(at, item.at);
+    at += sizeof item.at;
+    for (std::size_t i = 0; i < areas; ++i) {
+      Store(at, item.bounds[i]);
+      at += sizeof(Bounds);
+    }
   }
   return content;
 }
