@@ -182,7 +182,12 @@ inline std::string PutTogether(const File& file) {
   return bytes;
 }
 
-inline Key TakeContent(std::string_view& shape, std::string_view& data, int depth = 0);
+/// A file that has no index yet, with small nodes from now on, so that a few entries fill some.
+inline std::string WithFanOut(std::uint32_t items, std::string_view bytes) {
+  File file = TakeApart(bytes);
+  file.fanOut = items;
+  return PutTogether(file);
+}
 
 inline Key TakeHead(std::string_view& bytes) {
   Key key;
@@ -194,7 +199,7 @@ inline Key TakeHead(std::string_view& bytes) {
 }
 
 /// A key without a name.
-inline Key TakeContent(std::string_view& shape, std::string_view& data, int depth) {
+inline Key TakeContent(std::string_view& shape, std::string_view& data, int depth = 0) {
   Key key;
   const auto valuesShape = TakeInteger<std::uint64_t>(shape);
   const auto keysShape = TakeInteger<std::uint64_t>(shape);

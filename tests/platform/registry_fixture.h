@@ -4,6 +4,8 @@
 #include <string>
 #include <string_view>
 
+#include "fuzz/record_tree.h"
+#include "orxregistry/area_walk.h"
 #include "orxregistry/in_file_key.h"
 #include "orxutils/path.h"
 #include "support/file_bytes.h"
@@ -79,11 +81,24 @@ struct RegistryFile {
   }
   std::wstring Name() const { return orx::ToName(path); }
   orx::TCSInFileKey Load() const { return {Name(), nullptr, nullptr, true, orx::kRegistryFlags}; }
-  /// Makes the file with a container that holds one value.
+  /// Makes the file with a container that holds one value. It has an index, of small nodes.
   void Create(const std::string& value = "first") const {
     orx::TCSInFileKey tree = New();
+    tree.IndexBy(Areas());
     AddEntry(tree, L"S_0", value);
     tree.Save(Name(), false, orx::kRegistryVersion);
+    SetBytes(velta_fuzz::WithFanOut(2, Bytes()));
+  }
+  static orx::EntryAreas Areas() { return {{u"where", u"area", 32, {}}}; }
+  /// The tree as Describe() has it, by the entries that the index leads to and those behind them.
+  std::string Walked() const {
+    orx::TAreaWalk walk(Name(), Areas(), 0, [](const orx::AreaBounds&) { return true; });
+    std::string entries;
+    for (auto entry = walk.Next(); !entry.IsNull(); entry = walk.Next()) {
+      const std::string described = " " + orx::Narrow(entry.GetName()) + Describe(entry);
+      if (entries.find(described) == entries.npos) entries += described;
+    }
+    return "(0 container(0" + entries + "))";
   }
   /// Adds an entry with one value to the container of a tree.
   static void AddEntry(const orx::TInFileKey& tree, const std::wstring& entry,

@@ -67,6 +67,7 @@ TEST(RegistryDamage, AtAnyPlaceIsDamageOrASaveThatNeverFinished) {
   const std::size_t secondEnd = file.Bytes().size();
   ASSERT_TRUE(file.Append(L"S_2", "value"));
   const std::string whole = file.Bytes();
+  const std::string third = Describe(file.Load());
   const auto check = [&](const std::string& bytes, bool isDamaged, const std::string& before) {
     file.SetBytes(bytes);
     TCSInFileKey tree = file.Load();
@@ -75,6 +76,10 @@ TEST(RegistryDamage, AtAnyPlaceIsDamageOrASaveThatNeverFinished) {
     if (!isDamaged || seen != "(0)") {
       EXPECT_EQ(seen, before);
     }
+    // What the index leads to may be whole where the rest is not.
+    const std::string walked = file.Walked();
+    const bool isRight = walked == seen || (isDamaged && (walked == third || seen == "(0)"));
+    EXPECT_TRUE(isRight) << walked << " " << seen;
     RegistryFile::AddEntry(tree, L"S_9", "next");
     EXPECT_EQ(tree.Save(false, orx::kRegistryVersion), !isDamaged);
     EXPECT_EQ(file.Bytes() == bytes, isDamaged);
@@ -162,7 +167,7 @@ TEST(RegistryFile, ASaveAppendsWhatIsNewAndNothingElse) {
   ASSERT_TRUE(file.Append(L"S_1", "second"));
   const std::string after = file.Bytes();
   EXPECT_TRUE(after.starts_with(before));
-  EXPECT_LT(after.size() - before.size(), 250U);
+  EXPECT_LT(after.size() - before.size(), 300U);
 
   EXPECT_TRUE(file.Append(L"S_1", "second"));
   EXPECT_EQ(file.Bytes(), after) << "the same value again is no change";

@@ -108,6 +108,7 @@ TEST_P(OutOfMemory, IsReportedAndLeavesNothingHalf) {
   const TemporaryDirectory directory;
   Fleet fleet((directory / "./").wstring());  // a name to be made whole
   ASSERT_TRUE(fleet.IngestBoth(0));
+  fleet.UseSmallNodes();
   int exceptions = 0;
   bool ranOut = true;
   for (std::uint32_t number = 1; ranOut && !HasFailure(); ++number) {

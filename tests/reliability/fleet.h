@@ -2,7 +2,9 @@
 
 #include <string>
 
+#include "fuzz/record_tree.h"
 #include "orxregistry/in_file_key.h"
+#include "support/file_bytes.h"
 #include "support/numbered_set.h"
 #include "velta/rtcm_data_support.h"
 #include "velta/rtcm_generator.h"
@@ -46,6 +48,13 @@ struct Fleet {
   }
   bool Merge(const std::wstring& source) const {
     return RTCMDataSupport::MergeRTCMDatumfiles(datums, source) == 0;
+  }
+
+  /// Has the files, of a set each, get an index of small nodes, so that a few sets fill some.
+  void UseSmallNodes() const {
+    for (const std::wstring& path : {datums, projections}) {
+      WriteBytes(path, velta_fuzz::WithFanOut(3, ReadBytes(path)));
+    }
   }
 
   /// The queries that do not find set 0, the first: none.

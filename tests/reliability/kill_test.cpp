@@ -78,7 +78,9 @@ const Role kRoles[] = {
 class KillMachine {
  public:
   explicit KillMachine(unsigned seed) : random_(seed) {
-    EXPECT_TRUE(Fleet(path_).IngestBoth(0));
+    Fleet fleet(path_);
+    EXPECT_TRUE(fleet.IngestBoth(0));
+    fleet.UseSmallNodes();
     for (const Role& role : kRoles) Start(role);
     Start(kRoles[0]);
   }

@@ -86,31 +86,34 @@ void FindSegments(Bytes bytes, FileContent& content) {
   if (damaged) content.error = kDamaged;
 }
 
+/// Of a file that cannot be read now. Without a stamp it counts as changed, so that it is read
+/// again.
+FileContent CannotBeOpened() {
+  FileContent content;
+  content.error = kCannotBeOpened;
+  return content;
+}
+
 /// Reads an open file from its start, as it is just now.
 FileContent ReadOnce(const os::File& file) {
-  FileContent content;
   const std::optional<os::FileStamp> stamp = file.Stamp();
-  if (!stamp) {
-    content.error = kCannotBeOpened;
-    return content;
-  }
+  if (!stamp) return CannotBeOpened();
+  FileContent content;
   content.stamp = *stamp;
   if (stamp->size > kReadUnasked) {
     // No more is read of what is no registry file, however large.
     unsigned char header[format::kMaxFileHeader];
     const auto headerSize = file.Read(0, header, sizeof header);
-    Bytes start(header, headerSize.value_or(0));
+    if (!headerSize) return CannotBeOpened();
+    Bytes start(header, *headerSize);
     if (!format::TakeFileHeader(start)) {
-      content.error = headerSize ? kNotARegistryFile : kCannotBeOpened;
+      content.error = kNotARegistryFile;
       return content;
     }
   }
   content.memory = os::Memory(stamp->size);
   const auto size = file.Read(0, content.memory.get(), stamp->size);
-  if (!size) {
-    content.error = kCannotBeOpened;
-    return content;
-  }
+  if (!size) return CannotBeOpened();
   FindSegments(Bytes(content.memory.get(), *size), content);
   return content;
 }
@@ -220,10 +223,7 @@ FileContent ReadRegistryFile(const os::File& file) {
 
 FileContent ReadRegistryFile(const std::filesystem::path& path) {
   const std::optional<os::File> file = os::File::OpenToRead(path);
-  if (file) return ReadRegistryFile(*file);
-  FileContent content;
-  content.error = kCannotBeOpened;
-  return content;
+  return file ? ReadRegistryFile(*file) : CannotBeOpened();
 }
 
 std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, const Buffer& bytes,

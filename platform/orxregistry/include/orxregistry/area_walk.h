@@ -40,6 +40,7 @@ class ORXREGISTRY_EXPORT TAreaWalk {
   /// some. \return null when there is none
   TGenericRegistryKey Container() const;
 
+  /// Where the index turns out not to be right the walk begins again, with all entries.
   /// \return the next entry, null when none is left
   TGenericRegistryKey Next();
 
