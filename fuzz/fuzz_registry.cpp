@@ -4,8 +4,9 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "fuzz/record_tree.h"
 #include "platform/registry_fixture.h"
-#include "record_tree.h"
+#include "support/query_outcomes.h"
 #include "velta/rtcm_data_support.h"
 #include "velta/rtcm_generator.h"
 
@@ -18,6 +19,7 @@ using orx::TCSInFileKey;
 using orx::cs::velta::RTCMDataSupport;
 using orx::cs::velta::RTCMGenerator;
 using velta_test::Describe;
+using velta_test::Position;
 using velta_test::RegistryFile;
 using velta_test::RootOf;
 
@@ -30,7 +32,7 @@ TCSInFileKey Load(const std::filesystem::path& path) {
 }
 
 /// What is listed is found, and what looks like an area gives a position to ask for.
-void Walk(const orx::TGenericRegistryKey& key, std::vector<std::pair<double, double>>& positions) {
+void Walk(const orx::TGenericRegistryKey& key, std::vector<Position>& positions) {
   for (const std::wstring& name : key.GetValueNames()) {
     Require(key.HasValue(name) != 0);
     velta_test::RawValue value;
@@ -38,7 +40,7 @@ void Walk(const orx::TGenericRegistryKey& key, std::vector<std::pair<double, dou
     if (positions.size() < 3 && key.GetValue(name, value, 0, true) &&
         value.GetByteSize() >= sizeof area) {
       std::memcpy(area, value.GetData(), sizeof area);
-      positions.emplace_back(area[0], area[2]);
+      positions.push_back({area[0], area[2]});
     }
   }
   for (orx::TGenRegKeyIterator walk(key); walk;) {
@@ -48,23 +50,43 @@ void Walk(const orx::TGenericRegistryKey& key, std::vector<std::pair<double, dou
   }
 }
 
-void Query(const std::wstring& path, const std::vector<std::pair<double, double>>& positions) {
-  const RTCMGenerator generator(1, path, path);
-  generator.getAllDatums();
-  generator.getRtcmProjMessage();
-  for (const auto& [north, east] : positions) {
-    generator.getRtcmDatumMessage(north, east, 0);
-    generator.get1023(north, east, 0);
-    generator.get1024(north, east, 0);
+void Query(const std::wstring& path, const std::vector<Position>& positions) {
+  RTCMGenerator(1, path, path).getAllDatums();
+  velta_test::Outcomes(path, positions);
+}
+
+/// A file that was written here has an index that leads to what is in it.
+void CompareIndex(const std::filesystem::path& path, const std::vector<Position>& positions) {
+  const std::string bytes = velta_test::ReadBytes(path);
+  const std::string outcomes = velta_test::Outcomes(path.wstring(), positions);
+  velta_test::WriteBytes(path, velta_test::WithoutIndex(bytes));
+  Require(velta_test::Outcomes(path.wstring(), positions) == outcomes);
+  velta_test::WriteBytes(path, bytes);
+}
+
+/// Adds copies of the first entry, a save each.
+void Grow(const std::filesystem::path& path) {
+  for (const std::wstring name : {L"copy", L"another"}) {
+    TCSInFileKey tree = Load(path);
+    const orx::TGenericRegistryKey container(orx::TGenRegKeyIterator(RootOf(tree))++);
+    const orx::TGenericRegistryKey entry(orx::TGenRegKeyIterator(container)++);
+    if (entry.IsNull()) return;
+    velta_test::Open(container, name).DeepCopy(entry);
+    Require(tree.Save(false, orx::kRegistryVersion));
   }
 }
 
 /// What was taken for good is good when it is written and read again; what was not is left alone.
-void Save(const RegistryFile& file, TCSInFileKey& tree, bool isGood) {
+void Save(const RegistryFile& file, TCSInFileKey& tree, bool isGood,
+          const std::vector<Position>& positions) {
   const std::filesystem::path copy = file.directory / "copy.dff";
   const std::string before = isGood ? Describe(tree) : file.Bytes();
   Require(tree.Save(copy.wstring(), false, orx::kRegistryVersion) == isGood);
   Require(!isGood || Describe(Load(copy)) == before);
+  if (isGood) {
+    Grow(copy);
+    CompareIndex(copy, positions);
+  }
   std::filesystem::remove(copy);
   velta_test::Open(RootOf(tree), L"added");
   Require(tree.Save(false, orx::kRegistryVersion) == isGood);
@@ -90,11 +112,11 @@ void Try(const std::string& bytes) {
   static const RegistryFile file;
   file.SetBytes(bytes);
   TCSInFileKey tree = file.Load();
-  std::vector<std::pair<double, double>> positions{{NAN, 0.15}};
+  std::vector<Position> positions{{NAN, 0.15}};
   Walk(RootOf(tree), positions);
   const bool isGood = tree.GetErrorState() == orx::kRegistryOk;
   Query(file.Name(), positions);
-  Save(file, tree, isGood);
+  Save(file, tree, isGood, positions);
   if (tree.GetErrorState() != orx::kNotARegistryFile) Merge(file, isGood);
 }
 

@@ -60,7 +60,6 @@ class PieceReader {
   std::uint64_t size_ = 0;
   record::Buffer start_;  ///< the first bytes of the file
   record::Buffer end_;    ///< the last
-  std::size_t nodeSize_ = 0;
   std::uint32_t fanOut_ = 0;
   std::size_t areas_ = 0;
 };
