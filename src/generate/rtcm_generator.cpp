@@ -9,12 +9,13 @@
 namespace orx::cs::velta {
 namespace {
 
-/// Those of the keys that may be datum entries.
+/// How many of the keys may be datum entries.
 std::size_t CountEntries(const TGenericRegistryKey& container) {
   std::size_t count = 0;
+  ShapeMemory memory;
   for (TGenRegKeyIterator walk(container); walk;) {
-    const TGenericRegistryKey entry(walk++);
-    if (entry.HasKey(layout::kStandardDatum) && entry.HasKey(layout::kDatumGrid.key)) ++count;
+    memory.GoTo(TGenericRegistryKey(walk++));
+    if (Has(StoredKey(memory).Sub(layout::kStandardDatum), layout::kMethod)) ++count;
   }
   return count;
 }
@@ -35,11 +36,11 @@ std::vector<DatumData, orx_dl_allocator<DatumData>> RTCMGenerator::getAllDatums(
   std::vector<DatumData, orx_dl_allocator<DatumData>> datums;
   const TGenericRegistryKey container = OpenContainer(datumFile_);
   datums.reserve(CountEntries(container));
+  ShapeMemory memory;
   for (TGenRegKeyIterator walk(container); walk;) {
+    memory.GoTo(TGenericRegistryKey(walk++));
     DatumData datum;
-    if (ReadDatum(container, TGenericRegistryKey(walk++), datum)) {
-      datums.push_back(std::move(datum));
-    }
+    if (ReadDatum(container, StoredKey(memory), datum)) datums.push_back(std::move(datum));
   }
   return datums;
 }

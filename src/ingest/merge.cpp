@@ -42,7 +42,7 @@ ResultCode MergeFiles(const SharedFiles& kind, const COrxStringT<wchar_t>& targe
   if (sourceContainer.IsNull()) return kind.trouble;
   // Damage inside a key shows only when the key is looked into: all of them before the target is
   // touched.
-  LookInto(sourceContainer);
+  sourceContainer.LookInto();
   if (source.GetErrorState() != kRegistryOk) return kind.trouble;
   Change change(*target);
   if (!change.IsAlone()) return kind.trouble;

@@ -6,6 +6,7 @@
 
 #include "orxregistry/registry_key.h"
 #include "store/simple_value.h"
+#include "store/stored_key.h"
 #include "store/typed_value.h"
 
 /// How the values of a key are written, tested and read.
@@ -40,49 +41,50 @@ bool Add(TGenericRegistryKey& key, const DoublesOf<count>& value, const double (
 
 /// A key that has none when there is no such sub-key.
 inline TGenericRegistryKey OpenExisting(const TGenericRegistryKey& parent, std::wstring_view name) {
-  if (!parent.HasKey(name)) return TGenericRegistryKey(TGenericRegistryKeyImpPtr());
-  return {parent, name, 0, true};
+  return {parent, name, 0, false};
 }
 
 template <class T>
-bool Has(const TGenericRegistryKey& key, const ValueOf<T>& value) {
-  return key.HasValue(value.name) != 0;
-}
-
-/// \return the stored value, `T()` when there is none of that kind
-template <class T>
-T Read(const TGenericRegistryKey& key, const ValueOf<T>& value) {
-  TBinValue<T> stored{T()};
-  return key.GetValue(value.name, stored, 0, false) ? stored.GetTypedValue() : T();
+bool Has(const StoredKey& key, const ValueOf<T>& value) {
+  return static_cast<bool>(key.Find(value.name));
 }
 
 /// Reads a value that must have the type code and the size of its kind.
-/// \return false when there is none; `to` is then as it was
+/// \return false when it has not; `to` is then as it was
 template <class T>
-bool Read(const TGenericRegistryKey& key, const ValueOf<T>& value, T& to) {
-  TBinValue<T> stored{T()};
-  if (!key.GetValue(value.name, stored, 0, false)) return false;
-  to = stored.GetTypedValue();
+bool Read(const StoredValue& stored, T& to) {
+  TBinValue<T> typed{T()};
+  if (!stored || typed.SetFromDescriptor(stored.descriptor, stored.data, false) != 0) return false;
+  to = typed.GetTypedValue();
   return true;
+}
+
+/// The same of a key's value.
+template <class T>
+bool Read(const StoredKey& key, const ValueOf<T>& value, T& to) {
+  return Read(key.Find(value.name), to);
+}
+
+/// Reads a value that must be there, of whatever kind.
+/// \return false when there is none; of another kind `to` is T()
+template <class T>
+bool ReadAny(const StoredKey& key, const ValueOf<T>& value, T& to) {
+  const StoredValue stored = key.Find(value.name);
+  if (!Read(stored, to)) to = T();
+  return static_cast<bool>(stored);
 }
 
 /// Reads a text that must have the dimension that values are written with.
 /// \return false when there is none; `to` is then as it was
-inline bool Read(const TGenericRegistryKey& key, const ValueOf<COrxStringT<wchar_t>>& value,
-                 COrxStringT<wchar_t>& to) {
-  const bool isText =
-      key.GetValueType(value.name) == kWideString && key.GetValueDim(value.name) == kValueDimension;
-  if (isText) to = GetRegValue<COrxStringT<wchar_t>>(key, value.name, {}, 0);
-  return isText;
-}
+bool Read(const StoredKey& key, const ValueOf<COrxStringT<wchar_t>>& value,
+          COrxStringT<wchar_t>& to);
 
 /// Reads a block of exactly so many doubles, whatever its type code.
 /// \return false when there is none of that size
-bool ReadDoubles(const TGenericRegistryKey& key, const wchar_t* name, double* to,
-                 std::size_t count);
+bool ReadDoubles(const StoredKey& key, const wchar_t* name, double* to, std::size_t count);
 
 template <std::size_t count>
-bool Read(const TGenericRegistryKey& key, const DoublesOf<count>& value, double (&to)[count]) {
+bool Read(const StoredKey& key, const DoublesOf<count>& value, double (&to)[count]) {
   return ReadDoubles(key, value.name, to, count);
 }
 

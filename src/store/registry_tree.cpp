@@ -11,11 +11,6 @@ TGenericRegistryKey ContainerOf(const TInKey& tree) {
   return FirstSubKey(TGenericRegistryKey(TGenericRegistryKeyPtr(tree)));
 }
 
-void LookInto(const TGenericRegistryKey& key) {
-  key.HasValue(L"");
-  for (TGenRegKeyIterator walk(key); walk;) LookInto(TGenericRegistryKey(walk++));
-}
-
 void ReadIfLost(TInFileKey& file) {
   if (file.GetErrorState() == kCannotBeOpened) file.Reload();
 }

@@ -15,9 +15,6 @@ TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key);
 /// The container key of a tree: the first under its root; null when there is none.
 TGenericRegistryKey ContainerOf(const TInKey& tree);
 
-/// Reads every key below a key, with its values: damage inside a key shows only then.
-void LookInto(const TGenericRegistryKey& key);
-
 /// A change of a shared file: either all of it is saved, or it is forgotten when this goes. What
 /// others have left unsaved in the tree is saved first, so that it is not forgotten with it.
 class Change {

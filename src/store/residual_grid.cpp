@@ -49,7 +49,7 @@ bool AddSettings(TGenericRegistryKey& key, const Setting<Stored, Held> (&setting
 
 /// \return false when a setting is missing or of another kind
 template <class Stored, class Held, std::size_t count>
-bool ReadSettings(const TGenericRegistryKey& key, const Setting<Stored, Held> (&settings)[count],
+bool ReadSettings(const StoredKey& key, const Setting<Stored, Held> (&settings)[count],
                   TableData& table) {
   return std::all_of(std::begin(settings), std::end(settings), [&](const auto& setting) {
     Stored stored = {};
@@ -92,12 +92,9 @@ ResultCode WriteResidualGrid(const TGenericRegistryKey& entry, const layout::Res
   return kSuccess;
 }
 
-bool ReadGridArea(const TGenericRegistryKey& gridKey, const layout::ResidualGrid& grid,
-                  StoredGrid& stored) {
-  if (!Has(gridKey, layout::kRows)) return false;
-  stored.rows = Read(gridKey, layout::kRows);
-  if (!Has(gridKey, layout::kColumns)) return false;
-  stored.columns = Read(gridKey, layout::kColumns);
+bool ReadGridArea(const StoredKey& gridKey, const layout::ResidualGrid& grid, StoredGrid& stored) {
+  if (!ReadAny(gridKey, layout::kRows, stored.rows)) return false;
+  if (!ReadAny(gridKey, layout::kColumns, stored.columns)) return false;
   double(&bounds)[6] = stored.table.bounds;
   if (!Read(gridKey, grid.boundaries, bounds)) return false;
   bounds[4] = StepOf(bounds[1], stored.rows);
@@ -105,7 +102,7 @@ bool ReadGridArea(const TGenericRegistryKey& gridKey, const layout::ResidualGrid
   return true;
 }
 
-bool ReadGridValues(const TGenericRegistryKey& gridKey, StoredGrid& stored) {
+bool ReadGridValues(const StoredKey& gridKey, StoredGrid& stored) {
   if (stored.rows < 1 || stored.columns < 1) return false;
   const std::int64_t points = std::int64_t{stored.rows} * stored.columns;
   if (points > kResidualGridPoints) return false;

@@ -32,12 +32,11 @@ inline projmath::TRectRgn AreaOf(const StoredGrid& stored) {
 
 /// Reads what a search needs: the counts and `bounds`.
 /// \return false when one of them is missing
-bool ReadGridArea(const TGenericRegistryKey& gridKey, const layout::ResidualGrid& grid,
-                  StoredGrid& stored);
+bool ReadGridArea(const StoredKey& gridKey, const layout::ResidualGrid& grid, StoredGrid& stored);
 
 /// Reads the rest.
 /// \return false when a value is missing, has another size or kind, or when there are fewer than 1
 ///     or more than 16 points
-bool ReadGridValues(const TGenericRegistryKey& gridKey, StoredGrid& stored);
+bool ReadGridValues(const StoredKey& gridKey, StoredGrid& stored);
 
 }  // namespace orx::cs::velta

@@ -16,7 +16,7 @@ namespace {
 constexpr std::size_t kHelmertParameters = 7;
 constexpr std::size_t kBadekasParameters = 10;
 
-bool ReadEllipsoid(const TGenericRegistryKey& standard, const DoublesOf<2>& value,
+bool ReadEllipsoid(const StoredKey& standard, const DoublesOf<2>& value,
                    projmath::Ellipsoid& ellipsoid) {
   double axes[2];
   if (!Read(standard, value, axes)) return false;
@@ -31,7 +31,7 @@ TGenericRegistryKey OpenContainer(const COrxStringT<wchar_t>& fileName) {
   return ContainerOf(TInFileKey(fileName, nullptr, nullptr, true, kRegistryFlags));
 }
 
-bool ReadValidityArea(const TGenericRegistryKey& standard, projmath::TRectRgn& area) {
+bool ReadValidityArea(const StoredKey& standard, projmath::TRectRgn& area) {
   double edges[4];
   if (!Read(standard, layout::kValidityArea, edges)) return false;
   area = {edges[0], edges[1] == 0.0 ? kWholeLatitude : edges[1], edges[2],
@@ -39,32 +39,32 @@ bool ReadValidityArea(const TGenericRegistryKey& standard, projmath::TRectRgn& a
   return true;
 }
 
-bool ReadTransformation(const TGenericRegistryKey& container, const TGenericRegistryKey& standard,
-                        DatumData& datum) {
+bool ReadTransformation(const StoredKey& container, const StoredKey& standard, DatumData& datum) {
   if (!ReadEllipsoid(standard, layout::kEllipsoid, datum.targetEllipsoid)) return false;
   if (!ReadEllipsoid(standard, layout::kSourceEllipsoid, datum.sourceEllipsoid)) return false;
   double parameters[13];
   if (!Read(standard, layout::kDatumParameters, parameters)) return false;
-  if (!Has(standard, layout::kMethod)) return false;
-  datum.computationIndicator = Read(standard, layout::kMethod).value;
+  BinaryType<unsigned int> method = {};
+  if (!ReadAny(standard, layout::kMethod, method)) return false;
+  datum.computationIndicator = method.value;
   const bool hasRotationPoint = datum.computationIndicator == kMolodenskiBadekas;
   std::copy_n(parameters, hasRotationPoint ? kBadekasParameters : kHelmertParameters,
               datum.parameters);
   signed char height = 0;
-  if (standard.GetValueDim(layout::kHeightIndicator.name) != kValueDimension) return false;
-  if (!Read(standard, layout::kHeightIndicator, height)) return false;
+  const StoredValue storedHeight = standard.Find(layout::kHeightIndicator.name);
+  if (storedHeight.descriptor.dimension != kValueDimension) return false;
+  if (!Read(storedHeight, height)) return false;
   datum.heightIndicator = static_cast<std::uint32_t>(height);
   return Read(standard, layout::kSourceDatumName, datum.sourceDatumName) &&
          Read(container, layout::kContainerDatum, datum.targetDatumName);
 }
 
-bool ReadDatum(const TGenericRegistryKey& container, const TGenericRegistryKey& entry,
-               DatumData& datum) {
-  const TGenericRegistryKey standard = OpenExisting(entry, layout::kStandardDatum);
+bool ReadDatum(const StoredKey& container, const StoredKey& entry, DatumData& datum) {
+  const StoredKey standard = entry.Sub(layout::kStandardDatum);
   projmath::TRectRgn area;
   if (!ReadValidityArea(standard, area)) return false;
   if (!ReadTransformation(container, standard, datum)) return false;
-  const TGenericRegistryKey gridKey = OpenExisting(entry, layout::kDatumGrid.key);
+  const StoredKey gridKey = entry.Sub(layout::kDatumGrid.key);
   StoredGrid grid;
   if (!ReadGridArea(gridKey, layout::kDatumGrid, grid)) return false;
   if (!ReadGridValues(gridKey, grid)) return false;

@@ -264,7 +264,7 @@ std::string ErrorStateText(std::uint32_t error, const std::string& reason) {
 FileState StateOf(const std::string& file) {
   orx::ForgetFileError();
   const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, orx::kRegistryFlags);
-  orx::cs::velta::LookInto(orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)));
+  orx::TGenericRegistryKey(orx::TGenericRegistryKeyPtr(tree)).LookInto();
   const std::uint32_t error = tree.GetErrorState();
   return {error, ErrorStateText(error, orx::KeptFileError())};
 }

@@ -122,6 +122,7 @@ NamedList<KeyTree::Key*>& KeyTree::TakeKeys(Key& key) {
     }
   }
   if (key.parent == root_ && &key == Container()) {
+    key.keys_->Reserve(content_.entries.size());
     for (const FileContent::Entry& entry : content_.entries) TakeKey(key, entry.key);
   }
   key.keysAreWhole_ = true;
@@ -152,6 +153,20 @@ ValueRecord KeyTree::FindValue(Key& key, LookupName& name) {
   const auto& values = TakeValues(key);
   const std::size_t place = values.Find(name);
   return place == values.items().size() ? ValueRecord() : values.items()[place];
+}
+
+const Content* KeyTree::ContentAsLoaded(const Key& key) const {
+  const bool isAsLoaded = isAsLoaded_ && key.depth_ >= kEntryDepth && key.HasOneLayer();
+  return isAsLoaded ? &key.first_.content : nullptr;
+}
+
+void KeyTree::LookInto(Key& key) {
+  if (const Content* const content = ContentAsLoaded(key)) {
+    if (!record::IsWhole(*content, record::kMaxDepth - key.depth_)) error = kDamaged;
+    return;
+  }
+  TakeValues(key);
+  for (Key* const sub : Keys(key)) LookInto(*sub);
 }
 
 KeyTree::Key* KeyTree::OpenKey(Key& key, const record::Name& name, std::uint8_t dimension) {
@@ -187,17 +202,15 @@ bool KeyTree::SetValue(Key& key, const record::Value& value) {
 void KeyTree::DeepCopy(Key& to, Key& from) {
   if (&to == &from) return;
   KeyTree& source = *from.tree;
-  const bool isInEntries = to.depth_ >= kEntryDepth && from.depth_ >= kEntryDepth;
-  if (isInEntries && &source != this && source.isAsLoaded_ && from.HasOneLayer() && to.IsBlank()) {
+  const Content* const content = source.ContentAsLoaded(from);
+  if (content && &source != this && to.depth_ >= kEntryDepth && to.IsBlank() &&
+      record::IsWhole(*content, record::kMaxDepth - to.depth_)) {
     // As a whole, and where it lies: this is how entries are copied when files are merged.
-    const Content content = from.first_.content;
-    if (record::IsWhole(content, record::kMaxDepth - to.depth_)) {
-      lenders_.insert(source.shared_from_this());
-      PendingChanges::OfKey& pending = MarkUnsaved(to);
-      AddLayer(to, content);
-      pending.copied = content;
-      return;
-    }
+    lenders_.insert(source.shared_from_this());
+    PendingChanges::OfKey& pending = MarkUnsaved(to);
+    AddLayer(to, *content);
+    pending.copied = *content;
+    return;
   }
   for (const ValueRecord value : source.Values(from)) SetValue(to, value.value());
   // By their places, as a target inside the source adds keys to it meanwhile.
@@ -235,6 +248,12 @@ void KeyTree::WriteUnsaved(SegmentWriter& to) {
     WriteUnsaved(tree, *root_);
     to.AddTree(tree);
   }
+  std::size_t copied = 0;
+  for (const Key* const entry : UnsavedEntries()) {
+    const auto& content = pending_.At(*entry).copied;
+    if (content) copied += format::EntrySize({0, entry->record_.head(), content->data()});
+  }
+  to.Reserve(copied);
   for (const Key* const entry : UnsavedEntries()) {
     const PendingChanges::OfKey& pending = pending_.At(*entry);
     if (pending.copied && pending.values.empty() && pending.keys.empty()) {
@@ -269,11 +288,11 @@ void KeyTree::WriteAll(SegmentWriter& to) {
   WriteAll(tree, *root_);
   to.AddTree(tree);
   if (!Container()) return;
+  to.Reserve(content_.end);
   for (Key* const entry : Keys(*Container())) {
-    const bool isAsItLies = isAsLoaded_ && entry->HasOneLayer() &&
-                            record::IsWhole(entry->first_.content, record::kMaxDepth - kEntryDepth);
-    if (isAsItLies) {
-      to.AddEntry(entry->record_.head(), entry->first_.content);
+    const Content* const lying = ContentAsLoaded(*entry);
+    if (lying && record::IsWhole(*lying, record::kMaxDepth - kEntryDepth)) {
+      to.AddEntry(entry->record_.head(), *lying);
       continue;
     }
     ContentBuffer content;

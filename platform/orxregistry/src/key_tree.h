@@ -109,6 +109,12 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   }
   record::ValueRecord FindValue(Key& key, LookupName& name);
 
+  /// What an entry, or a key in one, holds if that is one record in the tree's file; else null.
+  const record::Content* ContentAsLoaded(const Key& key) const;
+
+  /// Takes everything in a key apart, to find damage.
+  void LookInto(Key& key);
+
   /// \return the sub-key of that name, made when missing; null when it would be too deep or its
   ///     name is too long
   Key* OpenKey(Key& key, const record::Name& name, std::uint8_t dimension);

@@ -81,6 +81,13 @@ class NamedList {
     return place;
   }
 
+  /// Makes room for so many items.
+  void Reserve(std::size_t items) {
+    items_.reserve(items);
+    if (items > kLinear && !index_) MakeIndex();
+    if (index_) index_->reserve(items);
+  }
+
   void Append(Item item) {
     items_.push_back(item);
     try {

@@ -98,6 +98,16 @@ bool TGenericRegistryKey::GetValue(std::wstring_view name, bin_value& value, int
   return value.SetFromDescriptor(descriptor, stored.data, copy) == 0;
 }
 
+void TGenericRegistryKey::LookInto() const {
+  if (imp_) imp_->tree->LookInto(*imp_);
+}
+
+KeyBytes TGenericRegistryKey::GetBytes() const {
+  const record::Content* const content = imp_ ? imp_->tree->ContentAsLoaded(*imp_) : nullptr;
+  if (!content) return {};
+  return {content->shape().data(), content->data().data()};
+}
+
 std::vector<COrxStringT<wchar_t>> TGenericRegistryKey::GetValueNames() const {
   std::vector<COrxStringT<wchar_t>> names;
   if (!imp_) return names;

@@ -62,6 +62,8 @@ class SegmentWriter {
   /// \param at the place that it will have in the file
   SegmentWriter(FileGrowth& growth, record::Buffer& to, std::uint64_t at);
 
+  /// Makes room for so many bytes more.
+  void Reserve(std::size_t bytes) { to_.reserve(to_.size() + bytes); }
   /// Adds what the root holds, but for the entries. To be called before AddEntry().
   void AddTree(const record::ContentBuffer& content);
   void AddEntry(record::Bytes head, const record::Content& content);

@@ -48,6 +48,15 @@ ORXREGISTRY_EXPORT COrxStringT<wchar_t> GetRegValue(const TGenericRegistryKey& k
                                                     const COrxStringT<wchar_t>& fallback,
                                                     int index);
 
+/// The bytes of the values in a key and below it, where they lie together as they were loaded.
+struct KeyBytes {
+  /// The same for keys that hold values and sub-keys of the same names, kinds and sizes, so that a
+  /// value of one has the same place in its data as that of the other. Null: there are no such
+  /// bytes.
+  const void* shape = nullptr;
+  const unsigned char* data = nullptr;
+};
+
 /// A key: named values and named sub-keys, both in the order in which they were first added.
 /// Values and keys are looked up by their exact names. Reading takes keys apart as it goes, so
 /// one tree must not be used by two threads at once, not even to read.
@@ -99,6 +108,12 @@ class ORXREGISTRY_EXPORT TGenericRegistryKey {
   ///     which lives as long as the tree and every key of it
   /// \return true when the value exists and the adaptor took it
   bool GetValue(std::wstring_view name, bin_value& value, int index, bool copy) const;
+
+  /// Looks at everything in the key: damage shows only then, in the tree's error state.
+  void LookInto() const;
+
+  /// For an entry of a file, until the tree is changed.
+  KeyBytes GetBytes() const;
 
   /// The names of the values, for a look at a file whose content is not known beforehand.
   std::vector<COrxStringT<wchar_t>> GetValueNames() const;
