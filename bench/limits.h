@@ -2,7 +2,7 @@
 
 #include <cstddef>
 #include <filesystem>
-#include <memory>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -12,6 +12,9 @@ namespace velta_bench {
 /// Reads a file into new memory.
 /// \return number of bytes
 std::size_t ReadFile(const std::filesystem::path& path);
+
+/// Opens a file, asks for its size, reads six pieces of 4 KiB somewhere in it, and closes it.
+void ReadPieces(const std::filesystem::path& path, std::mt19937& random);
 
 /// Appends to a file and makes it durable, again and again.
 class DurableAppender {
@@ -29,8 +32,4 @@ class DurableAppender {
 
 /// Reads files and writes the bytes of all into a new one, durably.
 void JoinDurably(const std::vector<std::filesystem::path>& parts, const std::filesystem::path& to);
-
-/// The most memory that this process has had in use, in bytes.
-std::size_t PeakMemory();
-
 }  // namespace velta_bench
