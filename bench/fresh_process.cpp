@@ -3,11 +3,11 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <chrono>
 #include <fstream>
 #include <functional>
 #include <memory>
 
+#include "limits.h"
 #include "workload.h"
 
 namespace velta_bench {
@@ -71,11 +71,10 @@ FreshRun RunInFreshProcess(const std::string& work, const fs::path& file, std::u
 
 void WorkAsFreshProcess(const std::string& work, const fs::path& file, std::uint32_t number) {
   const std::function<bool()> call = Prepare(work, file, number);
-  const auto start = std::chrono::steady_clock::now();
-  const bool done = call();
-  const std::chrono::duration<double> took = std::chrono::steady_clock::now() - start;
+  bool done = false;
+  const double seconds = SecondsOf([&] { done = call(); });
   Require(done, work);
-  const FreshRun run{took.count(), PeakMemory()};
+  const FreshRun run{seconds, PeakMemory()};
   Require(write(STDOUT_FILENO, &run, sizeof run) == sizeof run, "telling the figures");
 }
 

@@ -5,6 +5,7 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <chrono>
 #include <memory>
 
 #include "workload.h"
@@ -38,6 +39,13 @@ void WriteAll(int file, const char* bytes, std::size_t size) {
 }
 
 }  // namespace
+
+double SecondsOf(const std::function<void()>& call) {
+  const auto start = std::chrono::steady_clock::now();
+  call();
+  const std::chrono::duration<double> took = std::chrono::steady_clock::now() - start;
+  return took.count();
+}
 
 std::size_t ReadFile(const fs::path& path) {
   std::size_t size = 0;

@@ -2,12 +2,16 @@
 
 #include <cstddef>
 #include <filesystem>
+#include <functional>
 #include <random>
 #include <string>
 #include <vector>
 
 /// What no file layer can go below: the same bytes, read or made durable, and nothing else.
 namespace velta_bench {
+
+/// What a call takes, in seconds.
+double SecondsOf(const std::function<void()>& call);
 
 /// Reads a file into new memory.
 /// \return number of bytes

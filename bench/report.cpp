@@ -92,7 +92,7 @@ void Report::ReportRuns(const std::vector<Run>& runs) {
 }
 
 void Report::Print() const {
-  constexpr const char* kFormat = "%-32s %8s  %12s %10s  %12s %6s %6s  %12s %6s %6s  %s%s\n";
+  constexpr const char* kFormat = "%-35s %7s  %12s %10s  %12s %6s %6s  %12s %6s %6s  %s%s\n";
   std::printf(kFormat, "work", "entries", "velta", "at most", "limit", "ratio", "goal", "SQLite",
               "ratio", "goal", "limit is to", "");
   for (const Row& row : rows_) {

@@ -2,7 +2,6 @@
 
 #include <cstring>
 #include <string>
-#include <utility>
 #include <vector>
 
 #include "orxutils/orx_string.h"
@@ -18,6 +17,13 @@ struct Row {
   double boundaries[6];
   double means[3];
   double residuals[48];
+};
+
+struct WholeRow {
+  std::string name;
+  std::string source;
+  int numbers[8];
+  Row row;
 };
 
 template <std::size_t count>
@@ -121,10 +127,11 @@ bool SqlitePeer::FindArea(const Position& position) {
 
 std::size_t SqlitePeer::ReadAll() {
   const Statement walk = Prepare("SELECT * FROM entry ORDER BY rowid");
-  std::vector<std::pair<std::string, Row>> rows;
+  std::vector<WholeRow> rows;
   while (sqlite3_step(walk.get()) == SQLITE_ROW) {
     sqlite3_stmt* const at = walk.get();
-    Row row;
+    WholeRow& whole = rows.emplace_back();
+    Row& row = whole.row;
     const auto take = [at](int column, auto& to) {
       std::memcpy(to, sqlite3_column_blob(at, column), sizeof to);
     };
@@ -134,7 +141,11 @@ std::size_t SqlitePeer::ReadAll() {
     take(9, row.boundaries);
     take(14, row.means);
     take(15, row.residuals);
-    rows.emplace_back(reinterpret_cast<const char*>(sqlite3_column_text(at, 0)), row);
+    whole.name = reinterpret_cast<const char*>(sqlite3_column_text(at, 0));
+    whole.source = reinterpret_cast<const char*>(sqlite3_column_text(at, 3));
+    int* number = whole.numbers;
+    for (const int column : {1, 2, 7, 8, 10, 11, 12, 13})
+      *number++ = sqlite3_column_int(at, column);
   }
   return rows.size();
 }
