@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <chrono>
 #include <memory>
+#include <random>
 
 #include "workload.h"
 
@@ -53,7 +54,8 @@ std::size_t ReadFile(const fs::path& path) {
   return size;
 }
 
-void ReadPieces(const fs::path& path, std::mt19937& random) {
+void ReadPieces(const fs::path& path) {
+  static std::mt19937 random;
   constexpr std::size_t kPieces = 6;
   constexpr std::size_t kPieceSize = 4096;
   const int file = open(path.c_str(), O_RDONLY | O_CLOEXEC);

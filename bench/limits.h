@@ -3,7 +3,6 @@
 #include <cstddef>
 #include <filesystem>
 #include <functional>
-#include <random>
 #include <string>
 #include <vector>
 
@@ -17,8 +16,9 @@ double SecondsOf(const std::function<void()>& call);
 /// \return number of bytes
 std::size_t ReadFile(const std::filesystem::path& path);
 
-/// Opens a file, asks for its size, reads six pieces of 4 KiB somewhere in it, and closes it.
-void ReadPieces(const std::filesystem::path& path, std::mt19937& random);
+/// Opens a file, asks for its size, reads six pieces of 4 KiB at other places each time, and closes
+/// it.
+void ReadPieces(const std::filesystem::path& path);
 
 /// Appends to a file and makes it durable, again and again.
 class DurableAppender {

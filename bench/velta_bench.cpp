@@ -7,7 +7,6 @@
 
 #include <cstdio>
 #include <functional>
-#include <random>
 #include <sstream>
 
 #include "fresh_process.h"
@@ -57,30 +56,35 @@ struct Files {
 
 using Benchmark = std::function<void(benchmark::State&)>;
 
+/// How often work is timed, and how often it is done each time.
+struct Rounds {
+  int count;
+  int iterations;
+};
+
 class Suite {
  public:
-  Suite(Report& report, bool quick) : report_(report), repetitions_(quick ? 3 : 5) {}
+  explicit Suite(Report& report) : report_(report) {}
 
-  void Add(const Row& row, int iterations, const Benchmark& work, const Benchmark& limit,
+  void Add(const Row& row, const Rounds& rounds, const Benchmark& work, const Benchmark& limit,
            const Benchmark& peer = nullptr) {
     report_.Add(row);
-    Register(row, Side::kVelta, iterations, work);
-    Register(row, Side::kLimit, iterations, limit);
-    Register(row, Side::kPeer, iterations, peer);
+    Register(row, Side::kVelta, rounds, work);
+    Register(row, Side::kLimit, rounds, limit);
+    Register(row, Side::kPeer, rounds, peer);
   }
 
  private:
-  void Register(const Row& row, Side side, int iterations, const Benchmark& work) const {
+  void Register(const Row& row, Side side, const Rounds& rounds, const Benchmark& work) const {
     if (!work) return;
     const std::string name = Report::NameOf(row.work, row.entries, side);
     benchmark::RegisterBenchmark(name.c_str(), work)
-        ->Iterations(iterations)
-        ->Repetitions(repetitions_)
+        ->Iterations(rounds.iterations)
+        ->Repetitions(rounds.count)
         ->UseRealTime();
   }
 
   Report& report_;
-  int repetitions_;
 };
 
 void MakeFile(const fs::path& datum, const fs::path& sqlite, std::uint32_t first,
@@ -110,7 +114,7 @@ std::string EntryBytes(const Files& files) {
   return std::string(fs::file_size(files.Datum()) / files.entries, 'x');
 }
 
-void AddIngestion(Suite& suite, const Files& files, int iterations) {
+void AddIngestion(Suite& suite, const Files& files, const Rounds& rounds) {
   const auto ingest = [files](benchmark::State& state, bool isNew) {
     velta::RTCMDataSupport support((files.directory / "").wstring().c_str(), nullptr);
     const MessageSet present(files.entries / 2);
@@ -133,17 +137,17 @@ void AddIngestion(Suite& suite, const Files& files, int iterations) {
     }
   };
   suite.Add(
-      {"ingest, new entry", files.entries, kDurableAppend, 1.5}, iterations,
+      {"ingest, new entry", files.entries, kDurableAppend, 1.5}, rounds,
       [=](benchmark::State& s) { ingest(s, true); }, append,
       [=](benchmark::State& s) { peer(s, true); });
   // A tenth of a new entry; what a new one costs is the limit here.
   suite.Add(
-      {"ingest, entry present", files.entries, "ingest a new entry", 0.1}, iterations,
+      {"ingest, entry present", files.entries, "ingest a new entry", 0.1}, rounds,
       [=](benchmark::State& s) { ingest(s, false); }, [=](benchmark::State& s) { ingest(s, true); },
       [=](benchmark::State& s) { peer(s, false); });
 }
 
-void AddQueries(Suite& suite, const Files& files, int iterations) {
+void AddQueries(Suite& suite, const Files& files, const Rounds& rounds) {
   constexpr double kGoal = 2.5;
   constexpr double kPeerGoal = 0.125;
   const struct {
@@ -159,15 +163,14 @@ void AddQueries(Suite& suite, const Files& files, int iterations) {
       suite.Add(
           {std::string(query.name) + ", " + place.name, files.entries, kSixPieces, kGoal,
            kPeerGoal},
-          iterations,
+          rounds,
           [=](benchmark::State& state) {
             for (auto _ : state) {
               Require(query.ask(generator, place.at) == place.isFound, query.name);
             }
           },
           [=](benchmark::State& state) {
-            std::mt19937 random;
-            for (auto _ : state) ReadPieces(files.Datum(), random);
+            for (auto _ : state) ReadPieces(files.Datum());
           },
           [=](benchmark::State& state) {
             for (auto _ : state) {
@@ -195,7 +198,7 @@ void AddGrowth(Report& report, std::uint32_t largest) {
   }
 }
 
-void AddListing(Suite& suite, const Files& files, int iterations) {
+void AddListing(Suite& suite, const Files& files, const Rounds& rounds) {
   constexpr double kGoal = 5.0;
   constexpr double kPeerGoal = 1.0;
   Row row{kAskForAll, files.entries, "read the file", std::nullopt, kPeerGoal};
@@ -203,7 +206,7 @@ void AddListing(Suite& suite, const Files& files, int iterations) {
   if (files.entries >= kLarge) row.goal = kGoal;
   const velta::RTCMGenerator generator = files.Generator();
   suite.Add(
-      row, iterations,
+      row, rounds,
       [=](benchmark::State& state) {
         for (auto _ : state) {
           Require(generator.getAllDatums().size() >= files.entries, kAskForAll);
@@ -220,12 +223,11 @@ void AddListing(Suite& suite, const Files& files, int iterations) {
       });
 }
 
-void AddMerging(Suite& suite, const Files& files, int iterations) {
+void AddMerging(Suite& suite, const Files& files, const Rounds& rounds) {
   const fs::path target = files.directory / "target.dff";
   const auto fresh = [target](const fs::path& from) { JoinDurably({from}, target); };
   suite.Add(
-      {"merge as many new entries", files.entries, "read both, write the result", 2.0, 1.0},
-      iterations,
+      {"merge as many new entries", files.entries, "read both, write the result", 2.0, 1.0}, rounds,
       [=](benchmark::State& state) {
         for (auto _ : state) {
           state.PauseTiming();
@@ -250,7 +252,7 @@ void AddMerging(Suite& suite, const Files& files, int iterations) {
       });
 }
 
-void AddDecoding(Suite& suite, std::size_t bytes) {
+void AddDecoding(Suite& suite, std::size_t bytes, int rounds) {
   std::string stream;
   for (std::uint32_t number = 0; stream.size() < bytes; ++number) {
     const MessageSet set(number);
@@ -259,7 +261,7 @@ void AddDecoding(Suite& suite, std::size_t bytes) {
   }
   const auto megabytes = static_cast<std::int64_t>(bytes / 1'000'000);
   suite.Add(
-      {"decode a stream, MB:", megabytes, "read it and check its CRCs", 3.0}, 1,
+      {"decode a stream, MB:", megabytes, "read it and check its CRCs", 3.0}, {rounds, 1},
       [stream](benchmark::State& state) {
         for (auto _ : state) {
           std::stringbuf in(stream);
@@ -375,7 +377,8 @@ struct Options {
 
 int Run(const Options& options) {
   Report report;
-  Suite suite(report, options.quick);
+  Suite suite(report);
+  const int rounds = options.quick ? 3 : 5;
   fs::remove_all(options.directory);
   std::vector<std::uint32_t> sizes = {10, kSmall};
   if (!options.quick) sizes.push_back(kLarge);
@@ -387,14 +390,15 @@ int Run(const Options& options) {
     AddBytes(report, files);
     AddMemory(report, files);
     AddFirstQuery(report, files);
-    AddQueries(suite, files, options.quick ? 50 : 200);
+    // Many short rounds: what else the machine does meets some of them.
+    AddQueries(suite, files, {5 * rounds, 20});
     if (isAskedOnly) continue;
-    AddListing(suite, files, isLarge ? 1 : 50);
-    AddMerging(suite, files, isLarge ? 1 : 5);
-    AddIngestion(suite, files, options.quick ? 20 : 100);
+    AddListing(suite, files, {rounds, isLarge ? 1 : 50});
+    AddMerging(suite, files, {rounds, isLarge ? 1 : 5});
+    AddIngestion(suite, files, {rounds, options.quick ? 20 : 100});
     AddFirstIngestion(report, files);
   }
-  AddDecoding(suite, options.quick ? 10'000'000 : 100'000'000);
+  AddDecoding(suite, options.quick ? 10'000'000 : 100'000'000, rounds);
   benchmark::RunSpecifiedBenchmarks(&report);
   if (sizes.back() > kSmall) AddGrowth(report, sizes.back());
   report.Print();
