@@ -109,9 +109,8 @@ void SqlitePeer::Ingest(const MessageSet& set) {
 
 bool SqlitePeer::FindArea(const Position& position) {
   const Statement walk = Prepare(
-      "SELECT entry.area FROM area JOIN entry ON entry.rowid = id WHERE south <= ?1 AND north >= "
-      "?1 "
-      "AND west <= ?2 AND east >= ?2 ORDER BY id");
+      "SELECT entry.area FROM area JOIN entry ON entry.rowid = id "
+      "WHERE south <= ?1 AND north >= ?1 AND west <= ?2 AND east >= ?2 ORDER BY id");
   sqlite3_bind_double(walk.get(), 1, position.latitude);
   sqlite3_bind_double(walk.get(), 2, position.longitude);
   while (sqlite3_step(walk.get()) == SQLITE_ROW) {
@@ -143,9 +142,8 @@ std::size_t SqlitePeer::ReadAll() {
     take(15, row.residuals);
     whole.name = reinterpret_cast<const char*>(sqlite3_column_text(at, 0));
     whole.source = reinterpret_cast<const char*>(sqlite3_column_text(at, 3));
-    int* number = whole.numbers;
-    for (const int column : {1, 2, 7, 8, 10, 11, 12, 13})
-      *number++ = sqlite3_column_int(at, column);
+    int* to = whole.numbers;
+    for (const int column : {1, 2, 7, 8, 10, 11, 12, 13}) *to++ = sqlite3_column_int(at, column);
   }
   return rows.size();
 }
