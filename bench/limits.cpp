@@ -1,8 +1,13 @@
 #include "limits.h"
 
 #include <fcntl.h>
-#include <sys/resource.h>
+#include <sys/stat.h>
 #include <unistd.h>
+
+#include <algorithm>
+#include <chrono>
+#include <memory>
+#include <random>
 
 #include "workload.h"
 
@@ -36,10 +41,34 @@ void WriteAll(int file, const char* bytes, std::size_t size) {
 
 }  // namespace
 
+double SecondsOf(const std::function<void()>& call) {
+  const auto start = std::chrono::steady_clock::now();
+  call();
+  const std::chrono::duration<double> took = std::chrono::steady_clock::now() - start;
+  return took.count();
+}
+
 std::size_t ReadFile(const fs::path& path) {
   std::size_t size = 0;
   ReadAll(path, size);
   return size;
+}
+
+void ReadPieces(const fs::path& path) {
+  static std::mt19937 random;
+  constexpr std::size_t kPieces = 6;
+  constexpr std::size_t kPieceSize = 4096;
+  const int file = open(path.c_str(), O_RDONLY | O_CLOEXEC);
+  struct stat status = {};
+  Require(file >= 0 && fstat(file, &status) == 0, "opening " + path.string());
+  char piece[kPieceSize];
+  const std::size_t size = std::min(static_cast<std::size_t>(status.st_size), kPieceSize);
+  const std::size_t places = static_cast<std::size_t>(status.st_size) - size + 1;
+  for (std::size_t i = 0; i < kPieces; ++i) {
+    const auto place = static_cast<off_t>(random() % places);
+    Require(pread(file, piece, size, place) == static_cast<ssize_t>(size), "reading a piece");
+  }
+  close(file);
 }
 
 DurableAppender::DurableAppender(const fs::path& path)
@@ -64,13 +93,6 @@ void JoinDurably(const std::vector<fs::path>& parts, const fs::path& to) {
   }
   Require(fdatasync(file) == 0, "flushing");
   close(file);
-}
-
-std::size_t PeakMemory() {
-  constexpr std::size_t kKibibyte = 1024;
-  rusage usage = {};
-  getrusage(RUSAGE_SELF, &usage);
-  return static_cast<std::size_t>(usage.ru_maxrss) * kKibibyte;
 }
 
 }  // namespace velta_bench

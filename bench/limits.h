@@ -2,16 +2,23 @@
 
 #include <cstddef>
 #include <filesystem>
-#include <memory>
+#include <functional>
 #include <string>
 #include <vector>
 
 /// What no file layer can go below: the same bytes, read or made durable, and nothing else.
 namespace velta_bench {
 
+/// What a call takes, in seconds.
+double SecondsOf(const std::function<void()>& call);
+
 /// Reads a file into new memory.
 /// \return number of bytes
 std::size_t ReadFile(const std::filesystem::path& path);
+
+/// Opens a file, asks for its size, reads six pieces of 4 KiB at other places each time, and closes
+/// it.
+void ReadPieces(const std::filesystem::path& path);
 
 /// Appends to a file and makes it durable, again and again.
 class DurableAppender {
@@ -29,8 +36,4 @@ class DurableAppender {
 
 /// Reads files and writes the bytes of all into a new one, durably.
 void JoinDurably(const std::vector<std::filesystem::path>& parts, const std::filesystem::path& to);
-
-/// The most memory that this process has had in use, in bytes.
-std::size_t PeakMemory();
-
 }  // namespace velta_bench

@@ -1,6 +1,7 @@
 #include "report.h"
 
 #include <algorithm>
+#include <cmath>
 #include <cstdio>
 #include <fstream>
 #include <nlohmann/json.hpp>
@@ -20,9 +21,18 @@ double* FieldOf(Row& row, Side side) {
   return nullptr;
 }
 
-std::string Milliseconds(double seconds) {
-  char text[32];
-  std::snprintf(text, sizeof text, seconds > 0 ? "%.3f ms" : "", seconds * 1e3);
+/// Nothing for 0.
+std::string Amount(double value, Unit unit) {
+  constexpr double kLargeBytes = 1e5;
+  char text[32] = "";
+  if (value == 0) return text;
+  if (unit == Unit::kSeconds) {
+    std::snprintf(text, sizeof text, "%.4f ms", value * 1e3);
+  } else if (std::abs(value) < kLargeBytes) {
+    std::snprintf(text, sizeof text, "%.0f bytes", value);
+  } else {
+    std::snprintf(text, sizeof text, "%.3f MB", value * 1e-6);
+  }
   return text;
 }
 
@@ -32,9 +42,28 @@ std::string Times(double of, double by) {
   return text;
 }
 
-bool IsTime(const Row& row) { return row.limit != kFileSize; }
+std::string Goal(const std::optional<double>& goal) {
+  char text[32] = "";
+  if (goal) std::snprintf(text, sizeof text, "%.4g", *goal);
+  return text;
+}
+
+bool IsAbove(double of, double by, const std::optional<double>& goal) {
+  return goal && by > 0 && of / by > *goal;
+}
+
+bool IsMissed(const Row& row) {
+  return IsAbove(row.velta, row.beside, row.goal) || IsAbove(row.velta, row.peer, row.peerGoal) ||
+         IsAbove(row.velta, 1.0, row.most);
+}
 
 }  // namespace
+
+double MedianOf(std::vector<double> values) {
+  const auto middle = values.begin() + static_cast<std::ptrdiff_t>(values.size() / 2);
+  std::nth_element(values.begin(), middle, values.end());
+  return *middle;
+}
 
 void Report::Add(const Row& row) {
   const auto last = std::find_if(rows_.rbegin(), rows_.rend(),
@@ -53,10 +82,7 @@ void Report::ReportRuns(const std::vector<Run>& runs) {
     seconds.push_back(run.real_accumulated_time / static_cast<double>(run.iterations));
   }
   if (seconds.empty()) return;
-  std::nth_element(seconds.begin(),
-                   seconds.begin() + static_cast<std::ptrdiff_t>(seconds.size() / 2),
-                   seconds.end());
-  const double median = seconds[seconds.size() / 2];
+  const double median = MedianOf(seconds);
   const std::string& name = runs.front().run_name.function_name;
   for (Row& row : rows_) {
     for (const Side side : {Side::kVelta, Side::kLimit, Side::kPeer}) {
@@ -66,35 +92,40 @@ void Report::ReportRuns(const std::vector<Run>& runs) {
 }
 
 void Report::Print() const {
-  std::printf("%-26s %8s  %12s  %12s  %7s %6s  %12s %6s  %s\n", "work", "entries", "velta", "limit",
-              "ratio", "goal", "SQLite", "ratio", "limit is to");
+  constexpr const char* kFormat = "%-35s %7s  %12s %10s  %12s %6s %6s  %12s %6s %6s  %s%s\n";
+  std::printf(kFormat, "work", "entries", "velta", "at most", "limit", "ratio", "goal", "SQLite",
+              "ratio", "goal", "limit is to", "");
   for (const Row& row : rows_) {
-    char goal[16] = "";
-    if (row.goal) std::snprintf(goal, sizeof goal, "%.2f", *row.goal);
-    const std::string velta = IsTime(row) ? Milliseconds(row.velta) : "";
-    const std::string limit = IsTime(row) ? Milliseconds(row.beside) : "";
-    const std::string ratio = Times(row.velta, row.beside);
-    const bool missed = row.goal && row.beside > 0 && row.velta / row.beside > *row.goal;
-    std::printf("%-26s %8lld  %12s  %12s  %7s %6s  %12s %6s  %s%s\n", row.work.c_str(),
-                static_cast<long long>(row.entries), velta.c_str(), limit.c_str(), ratio.c_str(),
-                goal, Milliseconds(row.peer).c_str(), Times(row.velta, row.peer).c_str(),
-                row.limit.c_str(), missed ? "  MISSED" : "");
+    std::printf(kFormat, row.work.c_str(), std::to_string(row.entries).c_str(),
+                Amount(row.velta, row.unit).c_str(),
+                Amount(row.most.value_or(0.0), row.unit).c_str(),
+                Amount(row.beside, row.unit).c_str(), Times(row.velta, row.beside).c_str(),
+                Goal(row.goal).c_str(), Amount(row.peer, row.unit).c_str(),
+                Times(row.velta, row.peer).c_str(), Goal(row.peerGoal).c_str(), row.limit.c_str(),
+                IsMissed(row) ? "  MISSED" : "");
   }
 }
 
 void Report::WriteJson(const std::string& path) const {
   nlohmann::ordered_json rows = nlohmann::ordered_json::array();
   for (const Row& row : rows_) {
-    nlohmann::ordered_json entry = {{"work", row.work},   {"entries", row.entries},
-                                    {"limit", row.limit}, {"unit", IsTime(row) ? "s" : "bytes"},
-                                    {"velta", row.velta}, {"beside", row.beside}};
+    nlohmann::ordered_json entry = {{"work", row.work},
+                                    {"entries", row.entries},
+                                    {"unit", row.unit == Unit::kSeconds ? "s" : "bytes"},
+                                    {"velta", row.velta}};
+    if (row.most) entry["most"] = *row.most;
+    if (row.beside > 0) {
+      entry["limit"] = row.limit;
+      entry["beside"] = row.beside;
+      entry["ratio"] = row.velta / row.beside;
+    }
     if (row.goal) entry["goal"] = *row.goal;
-    if (row.beside > 0) entry["ratio"] = row.velta / row.beside;
-    if (row.goal && row.beside > 0) entry["missed"] = row.velta / row.beside > *row.goal;
     if (row.peer > 0) {
       entry["sqlite"] = row.peer;
       entry["ratioToSqlite"] = row.velta / row.peer;
     }
+    if (row.peerGoal) entry["goalToSqlite"] = *row.peerGoal;
+    if (row.most || row.goal || row.peerGoal) entry["missed"] = IsMissed(row);
     rows.push_back(entry);
   }
   std::ofstream(path) << rows.dump(2) << "\n";

@@ -13,19 +13,24 @@ namespace velta_bench {
 /// Whose time a benchmark measures.
 enum class Side { kVelta, kLimit, kPeer };
 
-/// The limit of work that is measured in bytes, not in seconds.
-inline constexpr const char* kFileSize = "the file's size";
+enum class Unit { kSeconds, kBytes };
 
 /// A row of the report: a piece of work at a number of entries.
 struct Row {
-  std::string work;
+  std::string work = {};
   std::int64_t entries = 0;
-  std::string limit;           ///< what is measured beside it; empty: a note of its own
-  std::optional<double> goal;  ///< the most times the limit that the work may take
-  double velta = 0.0;          ///< seconds; of memory, bytes
-  double beside = 0.0;         ///< the same of the limit
-  double peer = 0.0;           ///< seconds of the peer; 0: none
+  std::string limit = {};                     ///< what is measured beside it; empty: nothing
+  std::optional<double> goal = std::nullopt;  ///< the most times the limit that the work may take
+  std::optional<double> peerGoal = std::nullopt;  ///< the most times the peer's
+  std::optional<double> most = std::nullopt;      ///< the most that it may take by itself
+  Unit unit = Unit::kSeconds;
+  double velta = 0.0;
+  double beside = 0.0;  ///< the same of the limit
+  double peer = 0.0;    ///< of the peer; 0: none
 };
+
+/// The one in the middle of some values.
+double MedianOf(std::vector<double> values);
 
 /// Collects the rows of a run.
 class Report : public benchmark::BenchmarkReporter {
@@ -43,7 +48,7 @@ class Report : public benchmark::BenchmarkReporter {
   void Print() const;
   void WriteJson(const std::string& path) const;
 
-  std::vector<Row>& rows() { return rows_; }
+  const std::vector<Row>& rows() const { return rows_; }
 
  private:
   std::vector<Row> rows_;

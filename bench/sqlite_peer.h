@@ -8,25 +8,28 @@
 
 #include "workload.h"
 
-/// The same records in an SQLite file: a row an entry, a transaction a set, synchronous FULL.
+/// The same records in an SQLite file: a row an entry, its area in an R*Tree, a transaction a set,
+/// synchronous FULL, which is the default.
 namespace velta_bench {
 
 class SqlitePeer {
  public:
-  /// Opens the file, made with its table when it does not exist.
   explicit SqlitePeer(const std::filesystem::path& path);
+
+  /// Makes the tables in a new file.
+  void MakeTables();
 
   void Begin() { Run("BEGIN"); }
   void Commit() { Run("COMMIT"); }
   /// Adds the set's entry unless one of its name is there.
   void Ingest(const MessageSet& set);
-  /// Walks the entries to the first whose area holds the position.
+  /// Looks for the first entry whose area holds the position.
   /// \return false when there is none
   bool FindArea(const Position& position);
   /// Walks the entries and reads all of each.
   /// \return number of entries
   std::size_t ReadAll();
-  /// Copies the rows of another file in one transaction.
+  /// Copies the rows of another file, all new, in one transaction.
   void Merge(const std::filesystem::path& source);
 
  private:
@@ -43,6 +46,7 @@ class SqlitePeer {
 
   std::unique_ptr<sqlite3, Close> database_;
   Statement insert_;
+  Statement insertArea_;
 };
 
 }  // namespace velta_bench

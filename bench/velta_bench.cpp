@@ -1,16 +1,15 @@
 // What the library's work costs, each piece beside its limit in the same run.
 //
-//     velta_bench [--quick] [--json FILE] [--dir DIRECTORY]
+//     velta_bench [--quick] [--million] [--json FILE] [--dir DIRECTORY]
 
 #include <benchmark/benchmark.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
 #include <cstdio>
-#include <cstring>
 #include <functional>
 #include <sstream>
 
+#include "fresh_process.h"
 #include "limits.h"
 #include "report.h"
 #include "rtcm3/codec.h"
@@ -27,6 +26,19 @@ namespace fs = std::filesystem;
 namespace velta = orx::cs::velta;
 namespace rtcm3 = orx::cs::velta::rtcm3;
 
+constexpr std::uint32_t kLarge = 100'000;
+/// What lies behind the last full node of the index is read by every query. Here it is 40 entries,
+/// as it is at 1000, so that the two can be compared; at 1'000'000 it would be none.
+constexpr std::uint32_t kMillion = 1'000'040;
+/// The size that growth is counted from.
+constexpr std::uint32_t kSmall = 1000;
+
+/// The limit of a query for a position.
+constexpr const char* kSixPieces = "open, fstat, read 6 x 4 KiB";
+
+/// The limit of an ingestion.
+constexpr const char* kDurableAppend = "append the same bytes durably";
+
 /// A number that no file of the run holds yet.
 std::uint32_t nextNumber = 0;
 
@@ -40,54 +52,69 @@ struct Files {
   fs::path Sqlite() const { return directory / "peer.sqlite"; }
   fs::path OtherSqlite() const { return directory / "other.sqlite"; }
   velta::RTCMGenerator Generator() const { return {1, Datum().wstring(), L""}; }
-  Position Last() const { return MiddleOf(MessageSet(entries - 1)); }
 };
 
 using Benchmark = std::function<void(benchmark::State&)>;
 
+/// How often work is timed, and how often it is done each time.
+struct Rounds {
+  int count;
+  int iterations;
+};
+
 class Suite {
  public:
-  Suite(Report& report, bool quick) : report_(report), repetitions_(quick ? 3 : 5) {}
+  explicit Suite(Report& report) : report_(report) {}
 
-  void Add(const Row& row, int iterations, const Benchmark& work, const Benchmark& limit,
+  void Add(const Row& row, const Rounds& rounds, const Benchmark& work, const Benchmark& limit,
            const Benchmark& peer = nullptr) {
     report_.Add(row);
-    Register(row, Side::kVelta, iterations, work);
-    Register(row, Side::kLimit, iterations, limit);
-    Register(row, Side::kPeer, iterations, peer);
+    Register(row, Side::kVelta, rounds, work);
+    Register(row, Side::kLimit, rounds, limit);
+    Register(row, Side::kPeer, rounds, peer);
   }
 
  private:
-  void Register(const Row& row, Side side, int iterations, const Benchmark& work) const {
+  void Register(const Row& row, Side side, const Rounds& rounds, const Benchmark& work) const {
     if (!work) return;
     const std::string name = Report::NameOf(row.work, row.entries, side);
     benchmark::RegisterBenchmark(name.c_str(), work)
-        ->Iterations(iterations)
-        ->Repetitions(repetitions_)
+        ->Iterations(rounds.iterations)
+        ->Repetitions(rounds.count)
         ->UseRealTime();
   }
 
   Report& report_;
-  int repetitions_;
 };
 
-Files MakeFiles(const fs::path& directory, std::uint32_t entries) {
+void MakeFile(const fs::path& datum, const fs::path& sqlite, std::uint32_t first,
+              std::uint32_t entries) {
+  MakeDatumFile(datum, first, entries);
+  SqlitePeer peer(sqlite);
+  peer.MakeTables();
+  peer.Begin();
+  for (std::uint32_t i = 0; i < entries; ++i) peer.Ingest(MessageSet(first + i));
+  peer.Commit();
+}
+
+/// \param hasOther as many other entries are needed, to be merged
+Files MakeFiles(const fs::path& directory, std::uint32_t entries, bool hasOther) {
   const Files files{directory / std::to_string(entries), entries};
   fs::create_directories(files.directory);
-  MakeDatumFile(files.Datum(), 0, entries);
-  MakeDatumFile(files.Other(), entries, entries);
-  for (const auto& [path, first] :
-       {std::pair(files.Sqlite(), 0U), std::pair(files.OtherSqlite(), entries)}) {
-    SqlitePeer peer(path);
-    peer.Begin();
-    for (std::uint32_t i = 0; i < entries; ++i) peer.Ingest(MessageSet(first + i));
-    peer.Commit();
-  }
+  MakeFile(files.Datum(), files.Sqlite(), 0, entries);
+  if (hasOther) MakeFile(files.Other(), files.OtherSqlite(), entries, entries);
   nextNumber = std::max(nextNumber, 2 * entries);
+  // What is flushed later should not wait for these.
+  sync();
   return files;
 }
 
-void AddIngestion(Suite& suite, const Files& files, int iterations) {
+/// As many bytes as an entry has.
+std::string EntryBytes(const Files& files) {
+  return std::string(fs::file_size(files.Datum()) / files.entries, 'x');
+}
+
+void AddIngestion(Suite& suite, const Files& files, const Rounds& rounds) {
   const auto ingest = [files](benchmark::State& state, bool isNew) {
     velta::RTCMDataSupport support((files.directory / "").wstring().c_str(), nullptr);
     const MessageSet present(files.entries / 2);
@@ -97,10 +124,8 @@ void AddIngestion(Suite& suite, const Files& files, int iterations) {
       Require(support.ParseDatumMessages(set.datum, &set.grid) == 0, "ingesting a set");
     }
   };
-  const std::size_t entryBytes = fs::file_size(files.Datum()) / files.entries;
-  const auto append = [files, entryBytes](benchmark::State& state) {
+  const auto append = [files, bytes = EntryBytes(files)](benchmark::State& state) {
     DurableAppender appender(files.directory / "appended");
-    const std::string bytes(entryBytes, 'x');
     for (auto _ : state) appender.Append(bytes);
   };
   const auto peer = [files](benchmark::State& state, bool isNew) {
@@ -112,53 +137,84 @@ void AddIngestion(Suite& suite, const Files& files, int iterations) {
     }
   };
   suite.Add(
-      {"ingest, new entry", files.entries, "append the same bytes durably", 1.5}, iterations,
+      {"ingest, new entry", files.entries, kDurableAppend, 1.5}, rounds,
       [=](benchmark::State& s) { ingest(s, true); }, append,
       [=](benchmark::State& s) { peer(s, true); });
   // A tenth of a new entry; what a new one costs is the limit here.
   suite.Add(
-      {"ingest, entry present", files.entries, "ingest a new entry", 0.1}, iterations,
+      {"ingest, entry present", files.entries, "ingest a new entry", 0.1}, rounds,
       [=](benchmark::State& s) { ingest(s, false); }, [=](benchmark::State& s) { ingest(s, true); },
       [=](benchmark::State& s) { peer(s, false); });
 }
 
-void AddQueries(Suite& suite, const Files& files, int iterations) {
-  const auto read = [path = files.Datum()](benchmark::State& state) {
-    for (auto _ : state) benchmark::DoNotOptimize(ReadFile(path));
-  };
-  const auto find = [files](benchmark::State& state) {
-    for (auto _ : state) {
-      SqlitePeer database(files.Sqlite());
-      Require(database.FindArea(files.Last()), "finding an area");
+void AddQueries(Suite& suite, const Files& files, const Rounds& rounds) {
+  constexpr double kGoal = 2.5;
+  constexpr double kPeerGoal = 0.125;
+  const struct {
+    const char* name;
+    Position at;
+    bool isFound;
+  } places[] = {{"last", MiddleOf(MessageSet(files.entries - 1)), true},
+                {"middle", MiddleOf(MessageSet(files.entries / 2)), true},
+                {"none", GapBehind(files.entries / 2 | 1), false}};
+  const velta::RTCMGenerator generator = files.Generator();
+  for (const Query& query : kQueries) {
+    for (const auto& place : places) {
+      suite.Add(
+          {std::string(query.name) + ", " + place.name, files.entries, kSixPieces, kGoal,
+           kPeerGoal},
+          rounds,
+          [=](benchmark::State& state) {
+            for (auto _ : state) {
+              Require(query.ask(generator, place.at) == place.isFound, query.name);
+            }
+          },
+          [=](benchmark::State& state) {
+            for (auto _ : state) ReadPieces(files.Datum());
+          },
+          [=](benchmark::State& state) {
+            for (auto _ : state) {
+              SqlitePeer database(files.Sqlite());
+              Require(database.FindArea(place.at) == place.isFound, "finding an area");
+            }
+          });
     }
-  };
-  const Position at = files.Last();
+  }
+}
+
+/// How much longer the queries take in the largest file.
+void AddGrowth(Report& report, std::uint32_t largest) {
+  constexpr double kGoal = 1.6;
+  const std::vector<Row> rows = report.rows();
+  for (const Row& small : rows) {
+    if (small.limit != kSixPieces || small.entries != kSmall) continue;
+    for (const Row& large : rows) {
+      if (large.work != small.work || large.entries != largest) continue;
+      Row row{small.work + ", growth", largest, "the same at 1000", kGoal};
+      row.velta = large.velta;
+      row.beside = small.velta;
+      report.Add(row);
+    }
+  }
+}
+
+void AddListing(Suite& suite, const Files& files, const Rounds& rounds) {
+  constexpr double kGoal = 5.0;
+  constexpr double kPeerGoal = 1.0;
+  Row row{kAskForAll, files.entries, "read the file", std::nullopt, kPeerGoal};
+  // A small file stays in the processor's cache, where reading it is next to nothing.
+  if (files.entries >= kLarge) row.goal = kGoal;
   const velta::RTCMGenerator generator = files.Generator();
   suite.Add(
-      {"getRtcmDatumMessage, last", files.entries, "read the file", 2.0}, iterations,
+      row, rounds,
       [=](benchmark::State& state) {
         for (auto _ : state) {
-          Require(generator.getRtcmDatumMessage(at.latitude, at.longitude, 0) != nullptr,
-                  "getRtcmDatumMessage");
+          Require(generator.getAllDatums().size() >= files.entries, kAskForAll);
         }
       },
-      read, find);
-  suite.Add(
-      {"get1023, last", files.entries, "read the file", 2.0}, iterations,
       [=](benchmark::State& state) {
-        for (auto _ : state) {
-          Require(generator.get1023(at.latitude, at.longitude, 0) != nullptr, "get1023");
-        }
+        for (auto _ : state) benchmark::DoNotOptimize(ReadFile(files.Datum()));
       },
-      read, find);
-  suite.Add(
-      {"getAllDatums", files.entries, "read the file", 5.0}, iterations,
-      [=](benchmark::State& state) {
-        for (auto _ : state) {
-          Require(generator.getAllDatums().size() >= files.entries, "getAllDatums");
-        }
-      },
-      read,
       [=](benchmark::State& state) {
         for (auto _ : state) {
           SqlitePeer database(files.Sqlite());
@@ -167,11 +223,11 @@ void AddQueries(Suite& suite, const Files& files, int iterations) {
       });
 }
 
-void AddMerging(Suite& suite, const Files& files, int iterations) {
+void AddMerging(Suite& suite, const Files& files, const Rounds& rounds) {
   const fs::path target = files.directory / "target.dff";
   const auto fresh = [target](const fs::path& from) { JoinDurably({from}, target); };
   suite.Add(
-      {"merge as many new entries", files.entries, "read both, write the result", 2.0}, iterations,
+      {"merge as many new entries", files.entries, "read both, write the result", 2.0, 1.0}, rounds,
       [=](benchmark::State& state) {
         for (auto _ : state) {
           state.PauseTiming();
@@ -196,7 +252,7 @@ void AddMerging(Suite& suite, const Files& files, int iterations) {
       });
 }
 
-void AddDecoding(Suite& suite, std::size_t bytes) {
+void AddDecoding(Suite& suite, std::size_t bytes, int rounds) {
   std::string stream;
   for (std::uint32_t number = 0; stream.size() < bytes; ++number) {
     const MessageSet set(number);
@@ -205,7 +261,7 @@ void AddDecoding(Suite& suite, std::size_t bytes) {
   }
   const auto megabytes = static_cast<std::int64_t>(bytes / 1'000'000);
   suite.Add(
-      {"decode a stream, MB:", megabytes, "read it and check its CRCs", 3.0}, 1,
+      {"decode a stream, MB:", megabytes, "read it and check its CRCs", 3.0}, {rounds, 1},
       [stream](benchmark::State& state) {
         for (auto _ : state) {
           std::stringbuf in(stream);
@@ -230,64 +286,124 @@ void AddDecoding(Suite& suite, std::size_t bytes) {
       });
 }
 
-/// Runs a query in a process of its own.
-/// \return the most memory that it had, bytes
-std::size_t PeakOf(const std::function<void()>& query) {
-  int ends[2];
-  Require(pipe(ends) == 0, "making a pipe");
-  const pid_t child = fork();
-  if (child == 0) {
-    query();
-    const std::size_t peak = PeakMemory();
-    _exit(write(ends[1], &peak, sizeof peak) == sizeof peak ? 0 : 1);
-  }
-  std::size_t peak = 0;
-  Require(read(ends[0], &peak, sizeof peak) == sizeof peak, "asking a child for its memory");
-  close(ends[0]);
-  close(ends[1]);
-  waitpid(child, nullptr, 0);
-  return peak;
+/// Bytes of an entry in a file that got one in each save.
+void AddBytes(Report& report, const Files& files) {
+  constexpr double kMost = 1000.0;
+  Row row{"bytes of an entry", files.entries, "its values alone", std::nullopt,
+          std::nullopt,        kMost,         Unit::kBytes};
+  row.velta = static_cast<double>(fs::file_size(files.Datum())) / files.entries;
+  row.beside = static_cast<double>(ValueBytes(files.Datum()));
+  report.Add(row);
 }
 
-/// Peak memory of the queries, less that of a process which does nothing, as a part of the file.
+/// How many fresh processes a figure is the median of.
+constexpr int kProcesses = 7;
+
+/// The medians of some processes.
+/// \param numberOf called for each process
+FreshRun MedianRun(const std::string& work, const fs::path& file,
+                   const std::function<std::uint32_t()>& numberOf) {
+  std::vector<double> seconds;
+  std::vector<double> peaks;
+  for (int i = 0; i < kProcesses; ++i) {
+    const FreshRun run = RunInFreshProcess(work, file, numberOf());
+    seconds.push_back(run.seconds);
+    peaks.push_back(run.peak);
+  }
+  return {MedianOf(seconds), MedianOf(peaks)};
+}
+
+/// Peak memory of the queries, less that of a process which asks nothing.
 void AddMemory(Report& report, const Files& files) {
-  const std::size_t nothing = PeakOf([] {});
-  const Position at = files.Last();
-  const std::pair<const char*, std::function<void()>> queries[] = {
-      {"memory, datum message",
-       [=] { files.Generator().getRtcmDatumMessage(at.latitude, at.longitude, 0); }},
-      {"memory, get1023", [=] { files.Generator().get1023(at.latitude, at.longitude, 0); }},
-      {"memory, getAllDatums", [=] { files.Generator().getAllDatums(); }},
-  };
-  for (const auto& [name, query] : queries) {
-    Row row{name, files.entries, kFileSize, 2.5};
-    row.velta = static_cast<double>(PeakOf(query) - nothing);
-    row.beside = static_cast<double>(fs::file_size(files.Datum()));
-    // A constant of the process is most of what a small file costs.
-    if (files.entries < 1000) row.goal.reset();
+  constexpr double kMost = 1e6;
+  constexpr double kGoal = 2.5;
+  const auto last = [&] { return files.entries - 1; };
+  const double nothing = MedianRun(kDoNothing, files.Datum(), last).peak;
+  const auto add = [&](const std::string& work, Row row) {
+    row.work = "memory, " + work;
+    row.entries = files.entries;
+    row.unit = Unit::kBytes;
+    row.velta = MedianRun(work, files.Datum(), last).peak - nothing;
     report.Add(row);
-  }
+  };
+  Row row;
+  row.most = kMost;
+  for (const Query& query : kQueries) add(query.name, row);
+  if (files.entries > kLarge) return;
+  row = Row();
+  row.limit = "the file's size";
+  row.beside = static_cast<double>(fs::file_size(files.Datum()));
+  // A constant of the process is most of what a small file costs.
+  if (files.entries == kLarge) row.goal = kGoal;
+  add(kAskForAll, row);
 }
 
-int Run(bool quick, const std::string& json, const fs::path& directory) {
-  Report report;
-  Suite suite(report, quick);
-  fs::remove_all(directory);
-  std::vector<std::uint32_t> sizes = {10, 1000};
-  if (!quick) sizes.push_back(100'000);
-  for (const std::uint32_t entries : sizes) {
-    const Files files = MakeFiles(directory, entries);
-    const bool large = entries >= 100'000;
-    AddMemory(report, files);
-    AddQueries(suite, files, large ? 1 : 50);
-    AddMerging(suite, files, large ? 1 : 5);
-    AddIngestion(suite, files, quick ? 20 : 100);
+void AddFirstQuery(Report& report, const Files& files) {
+  const auto last = [&] { return files.entries - 1; };
+  Row row{"first getRtcmDatumMessage", files.entries};
+  row.velta = MedianRun(kQueries[0].name, files.Datum(), last).seconds;
+  report.Add(row);
+}
+
+void AddFirstIngestion(Report& report, const Files& files) {
+  constexpr double kMost = 1e-3;
+  // The others measure the file as it was made.
+  const fs::path file = files.directory / "first" / kDatumFile;
+  fs::create_directory(file.parent_path());
+  fs::copy_file(files.Datum(), file);
+  sync();
+  Row present{"first ingestion, entry present", files.entries};
+  if (files.entries == kLarge) present.most = kMost;
+  present.velta = MedianRun(kIngest, file, [&] { return files.entries / 2; }).seconds;
+  report.Add(present);
+  Row added{"first ingestion, new entry", files.entries, kDurableAppend};
+  const std::string bytes = EntryBytes(files);
+  std::vector<double> appends;
+  for (int i = 0; i < kProcesses; ++i) {
+    appends.push_back(
+        SecondsOf([&] { DurableAppender(files.directory / "appended").Append(bytes); }));
   }
-  AddDecoding(suite, quick ? 10'000'000 : 100'000'000);
+  added.beside = MedianOf(appends);
+  added.velta = MedianRun(kIngest, file, [] { return nextNumber++; }).seconds;
+  report.Add(added);
+}
+
+struct Options {
+  bool quick = false;
+  bool million = false;
+  std::string json;
+  fs::path directory = "velta-bench-files";
+};
+
+int Run(const Options& options) {
+  Report report;
+  Suite suite(report);
+  const int rounds = options.quick ? 3 : 5;
+  fs::remove_all(options.directory);
+  std::vector<std::uint32_t> sizes = {10, kSmall};
+  if (!options.quick) sizes.push_back(kLarge);
+  if (options.million) sizes.push_back(kMillion);
+  for (const std::uint32_t entries : sizes) {
+    const bool isAskedOnly = entries > kLarge;
+    const bool isLarge = entries >= kLarge;
+    const Files files = MakeFiles(options.directory, entries, !isAskedOnly);
+    AddBytes(report, files);
+    AddMemory(report, files);
+    AddFirstQuery(report, files);
+    // Many short rounds: what else the machine does meets some of them.
+    AddQueries(suite, files, {5 * rounds, 20});
+    if (isAskedOnly) continue;
+    AddListing(suite, files, {rounds, isLarge ? 1 : 50});
+    AddMerging(suite, files, {rounds, isLarge ? 1 : 5});
+    AddIngestion(suite, files, {rounds, options.quick ? 20 : 100});
+    AddFirstIngestion(report, files);
+  }
+  AddDecoding(suite, options.quick ? 10'000'000 : 100'000'000, rounds);
   benchmark::RunSpecifiedBenchmarks(&report);
+  if (sizes.back() > kSmall) AddGrowth(report, sizes.back());
   report.Print();
-  if (!json.empty()) report.WriteJson(json);
-  fs::remove_all(directory);
+  if (!options.json.empty()) report.WriteJson(options.json);
+  fs::remove_all(options.directory);
   return 0;
 }
 
@@ -295,22 +411,29 @@ int Run(bool quick, const std::string& json, const fs::path& directory) {
 }  // namespace velta_bench
 
 int main(int argc, char** argv) {
-  bool quick = false;
-  std::string json;
-  std::filesystem::path directory = "velta-bench-files";
+  constexpr int kFreshArguments = 5;
+  if (argc == kFreshArguments && argv[1] == std::string(velta_bench::kFreshOption)) {
+    const auto number = static_cast<std::uint32_t>(std::stoul(argv[4]));
+    velta_bench::WorkAsFreshProcess(argv[2], argv[3], number);
+    return 0;
+  }
+  velta_bench::Options options;
   benchmark::Initialize(&argc, argv);
   for (int i = 1; i < argc; ++i) {
     const std::string option = argv[i];
     if (option == "--quick") {
-      quick = true;
+      options.quick = true;
+    } else if (option == "--million") {
+      options.million = true;
     } else if (option == "--json" && i + 1 < argc) {
-      json = argv[++i];
+      options.json = argv[++i];
     } else if (option == "--dir" && i + 1 < argc) {
-      directory = argv[++i];
+      options.directory = argv[++i];
     } else {
-      std::fprintf(stderr, "usage: velta_bench [--quick] [--json FILE] [--dir DIRECTORY]\n");
+      std::fprintf(stderr,
+                   "usage: velta_bench [--quick] [--million] [--json FILE] [--dir DIRECTORY]\n");
       return 2;
     }
   }
-  return velta_bench::Run(quick, json, directory);
+  return velta_bench::Run(options);
 }

@@ -9,7 +9,7 @@ namespace velta_test {
 
 /// A datum message and its residual grid, another pair for each number: one datum, and the cells of
 /// its grid in rows, as a network service sends them to rovers on the road. Every cell has an area
-/// of validity of its own.
+/// of validity of its own. There is room between the cells, so that positions in none exist.
 struct NumberedSet {
   explicit NumberedSet(std::uint32_t number, const std::string& datumName = "ROVERS") {
     constexpr std::int32_t kCellsInARow = 1000;
@@ -21,7 +21,7 @@ struct NumberedSet {
     const auto cell = static_cast<std::int32_t>(number);
     grid.phi0 = kSouth + cell / kCellsInARow * kCell;
     grid.lambda0 = kWest + cell % kCellsInARow * kCell;
-    grid.dPhi = grid.dLambda = 30;
+    grid.dPhi = grid.dLambda = 29;
     grid.horShiftIndicator = true;
     for (int i = 0; i < orx::cs::velta::kResidualGridPoints; ++i) {
       grid.residualPhi[i] = i * 3 - cell % 7;
