@@ -45,7 +45,9 @@ bool MayHold(const AreaBounds& bounds, double latitude, double longitude) {
   const double extent = high[1] - low[1];
   if (!(extent < kFullTurn - slack)) return true;
   const double half = extent * 0.5;
-  return std::abs(std::remainder(longitude - (low[1] + half), kFullTurn)) <= half + slack;
+  double fromMiddle = longitude - (low[1] + half);
+  if (std::abs(fromMiddle) > kHalfTurn) fromMiddle = std::remainder(fromMiddle, kFullTurn);
+  return std::abs(fromMiddle) <= half + slack;
 }
 
 }  // namespace

@@ -262,6 +262,36 @@ TEST(RegistryFile, ALostFileIsNotASuccess) {
   EXPECT_NE(Describe(file.Load()).find("S_1"), std::string::npos);
 }
 
+TEST(RegistryFile, ThatWasPutInThePlaceOfAnotherGetsWhatIsSavedWhereItBelongs) {
+  const RegistryFile file;
+  file.Create();
+  const std::string old = file.Bytes();
+  const auto save = [&](orx::TInFileKey& other) {
+    file.SetBytes(old);
+    TCSInFileKey tree = file.Load();
+    RegistryFile::AddEntry(tree, L"S_1", "saved");
+    std::filesystem::remove(file.path);
+    EXPECT_TRUE(other.Save(file.Name(), false, orx::kRegistryVersion));
+    EXPECT_TRUE(tree.Save(false, orx::kRegistryVersion));
+    return Describe(file.Load());
+  };
+  const std::string saved = "container(0 S_1(0 value=1:1:saved))";
+  TCSInFileKey empty = RegistryFile::New();
+  EXPECT_EQ(save(empty), "(0 " + saved + ")");
+  TCSInFileKey other = RegistryFile::New();
+  Open(Open(RootOf(other), L"first"), L"S_1");
+  EXPECT_EQ(save(other), "(0 first(0 S_1(0)) " + saved + ")");
+}
+
+TEST(RegistryFile, IsNotIndexedByAreasThatItsHeaderCannotHold) {
+  TCSInFileKey tree = RegistryFile::New();
+  const orx::EntryArea area{u"key", u"value", 32, {}};
+  EXPECT_TRUE(tree.IndexBy({area, area}));
+  EXPECT_FALSE(tree.IndexBy({area, area, area}));
+  EXPECT_FALSE(tree.IndexBy({{u"key", u"value", 24, {}}})) << "less than four doubles";
+  EXPECT_FALSE(tree.IndexBy({{std::u16string(3000, u'k'), u"value", 32, {}}}));
+}
+
 TEST(RegistryKey, IsCopiedAsItIsAlsoIntoItself) {
   const TCSInFileKey tree = RegistryFile::New(), other = RegistryFile::New();
   RegistryFile::AddEntry(tree, L"S_1", "first");

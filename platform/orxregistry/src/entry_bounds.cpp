@@ -36,18 +36,6 @@ Record FindOnly(Part part, Record (*take)(Part&), const std::u16string& name) {
   return only;
 }
 
-std::optional<std::size_t> PlaceOf(const EntryArea& area, const Content& content) {
-  const KeyRecord key = FindOnly(content.keys(), record::TakeKey, area.key);
-  if (!key) return std::nullopt;
-  const Part values = key.content().values();
-  for (const std::u16string& needed : area.needed) {
-    if (!FindOnly(values, record::TakeValue, needed)) return std::nullopt;
-  }
-  const ValueRecord found = FindOnly(values, record::TakeValue, area.value);
-  if (!found || found.value().elementSize != area.bytes) return std::nullopt;
-  return found.data().data() - content.data().data();
-}
-
 float Down(double value) {
   if (value > kLargest) return kLargest;
   if (value < -kLargest) return -kInfinity;
@@ -75,13 +63,35 @@ void Bounds::Include(const Bounds& other) {
 }
 
 AreaPlaces::AreaPlaces(const EntryAreas& areas, const Content& content) {
-  for (std::size_t i = 0; i < areas.size(); ++i) places_[i] = PlaceOf(areas[i], content);
+  for (std::size_t i = 0; i < areas.size(); ++i) Place(areas[i], i, content);
+}
+
+void AreaPlaces::Place(const EntryArea& area, std::size_t number, const Content& content) {
+  const KeyRecord key = FindOnly(content.keys(), record::TakeKey, area.key);
+  if (!key) return;
+  Part values = key.content().values();
+  for (const std::u16string& needed : area.needed) {
+    if (!FindOnly(values, record::TakeValue, needed)) return;
+  }
+  const ValueRecord found = FindOnly(values, record::TakeValue, area.value);
+  if (!found || found.value().elementSize != area.bytes) return;
+  const auto placeOf = [&](ValueRecord value) {
+    return static_cast<std::size_t>(value.data().data() - content.data().data());
+  };
+  places_[number] = placeOf(found);
+  while (!values.shapes.empty()) {
+    const ValueRecord value = record::TakeValue(values);
+    if (value.value().elementSize == 0) texts_.push_back({placeOf(value), value.data().size()});
+  }
 }
 
 EntryBounds AreaPlaces::BoundsIn(record::Bytes data) const {
   EntryBounds bounds;
-  for (std::size_t i = 0; i < bounds.size(); ++i) {
-    bounds[i] = kEverything;
+  bounds.fill(kEverything);
+  const bool isWhole = std::all_of(texts_.begin(), texts_.end(), [&](const Text& text) {
+    return record::IsTerminatedText(data.data() + text.place, text.bytes);
+  });
+  for (std::size_t i = 0; isWhole && i < bounds.size(); ++i) {
     if (!places_[i]) continue;
     double area[4];
     std::memcpy(area, data.data() + *places_[i], sizeof area);

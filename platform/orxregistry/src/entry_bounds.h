@@ -3,6 +3,7 @@
 #include <array>
 #include <cstddef>
 #include <optional>
+#include <vector>
 
 #include "orxregistry/entry_areas.h"
 #include "record_format.h"
@@ -33,8 +34,16 @@ class AreaPlaces {
   EntryBounds BoundsIn(record::Bytes data) const;
 
  private:
+  struct Text {
+    std::size_t place;
+    std::size_t bytes;
+  };
+
+  void Place(const EntryArea& area, std::size_t number, const record::Content& content);
+
   /// By the areas' order; nothing for an area that such entries do not have, or not just once.
   std::array<std::optional<std::size_t>, kMaxEntryAreas> places_;
+  std::vector<Text> texts_;  ///< beside the areas; where one is damaged they may not be found
 };
 
 }  // namespace orx

@@ -99,7 +99,26 @@ bool TakeArea(Bytes& bytes, EntryArea& area) {
                      [&](std::u16string& name) { return TakeName(bytes, name); });
 }
 
+Buffer MakeAreas(const EntryAreas& areas) {
+  Buffer bytes;
+  for (const EntryArea& area : areas) AppendArea(bytes, area);
+  return bytes;
+}
+
+bool ReadAreas(Bytes bytes, EntryAreas& areas) {
+  while (!bytes.empty()) {
+    if (areas.size() == kMaxEntryAreas || !TakeArea(bytes, areas.emplace_back())) return false;
+  }
+  return true;
+}
+
 }  // namespace
+
+bool AreRight(const EntryAreas& areas) {
+  const Buffer bytes = MakeAreas(areas);
+  EntryAreas read;
+  return bytes.size() <= kMaxText && ReadAreas({bytes.data(), bytes.size()}, read) && read == areas;
+}
 
 std::optional<FileHeader> TakeFileHeader(Bytes& bytes) {
   if (bytes.size() < kDescriptionAt + kChecksum) return std::nullopt;
@@ -118,9 +137,8 @@ std::optional<FileHeader> TakeFileHeader(Bytes& bytes) {
   header.fanOut = Load<std::uint32_t>(bytes.data() + kFanOutAt);
   if (header.fanOut < kLeastFanOut || header.fanOut > kMostFanOut) return std::nullopt;
   header.description = TextOf(bytes.substr(kDescriptionAt, description));
-  for (Bytes rest = bytes.substr(kDescriptionAt + description, areas); !rest.empty();) {
-    if (header.areas.size() == kMaxEntryAreas) return std::nullopt;
-    if (!TakeArea(rest, header.areas.emplace_back())) return std::nullopt;
+  if (!ReadAreas(bytes.substr(kDescriptionAt + description, areas), header.areas)) {
+    return std::nullopt;
   }
   bytes.remove_prefix(checked + kChecksum);
   return header;
@@ -129,8 +147,7 @@ std::optional<FileHeader> TakeFileHeader(Bytes& bytes) {
 void AppendFileHeader(Buffer& to, const FileHeader& header) {
   const std::size_t start = to.size();
   const Bytes description = BytesOf(header.description).substr(0, kMaxText);
-  Buffer areas;
-  for (const EntryArea& area : header.areas) AppendArea(areas, area);
+  const Buffer areas = MakeAreas(header.areas);
   to.insert(to.end(), kMagic, kMagic + sizeof kMagic);
   Append(to, std::uint32_t{kRegistryVersion});
   Append(to, static_cast<std::uint32_t>(description.size()));

@@ -21,10 +21,13 @@ using record::Bytes;
 struct FileHeader {
   std::u16string description;
   EntryAreas areas;
-  std::uint32_t fanOut = 64;  ///< items of a node of the index
+  std::uint32_t fanOut = 16;  ///< items of a node of the index
 };
 
 inline constexpr std::size_t kMaxFileHeader = std::size_t{1} << 14U;
+
+/// True when a file's header can hold the areas.
+bool AreRight(const EntryAreas& areas);
 
 /// Takes the header off the front of a file; nothing when there is none, or one of a newer version.
 std::optional<FileHeader> TakeFileHeader(Bytes& bytes);

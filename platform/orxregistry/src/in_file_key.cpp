@@ -67,7 +67,11 @@ bool TInFileKey::Save(const COrxStringT<wchar_t>& fileName, bool /*flag*/,
   return SaveNewFile(*path, *tree_).has_value();
 }
 
-void TInFileKey::IndexBy(const EntryAreas& areas) { tree_->header.areas = areas; }
+bool TInFileKey::IndexBy(const EntryAreas& areas) {
+  if (!format::AreRight(areas)) return false;
+  tree_->header().areas = areas;
+  return true;
+}
 
 bool TInFileKey::HasUnsavedChanges() const { return tree_->HasUnsaved(); }
 

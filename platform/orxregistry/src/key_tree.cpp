@@ -54,12 +54,11 @@ ValueRecord VisitedValues::Find(LookupName& name) {
 
 KeyTree::KeyTree(const std::u16string& description)
     : root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {
-  header.description = description;
+  content_.header.description = description;
 }
 
 KeyTree::KeyTree(FileContent content)
     : error(content.error),
-      header(content.header),
       position{content.stamp, content.end, content.superseded, false, {}},
       content_(std::move(content)),
       root_(Make<Key>(*this, nullptr, MakeRecord(record::Name(), 0))) {
@@ -225,59 +224,64 @@ PendingChanges::OfKey& KeyTree::MarkUnsaved(const Key& key) {
   return pending_.Of(key);
 }
 
-bool KeyTree::AddsEntriesOnly() {
+const KeyTree::Key* KeyTree::FindContainer(const FileContent& file) {
+  if (!file.container) return Container();
+  const record::Name name = file.container.name();
+  return FindKey(*root_, name);
+}
+
+bool KeyTree::AddsEntriesOnly(const Key& container) const {
   const PendingChanges::OfKey& ofRoot = pending_.At(*root_);
-  const Key* const container = Container();
-  if (!ofRoot.values.empty() || ofRoot.keys != std::vector<const Key*>{container}) return false;
-  const PendingChanges::OfKey& pending = pending_.At(*container);
+  if (!ofRoot.values.empty() || ofRoot.keys != std::vector<const Key*>{&container}) return false;
+  const PendingChanges::OfKey& pending = pending_.At(container);
   return !pending.isNew && pending.values.empty() &&
          std::all_of(pending.keys.begin(), pending.keys.end(),
                      [this](const Key* entry) { return pending_.At(*entry).isNew; });
 }
 
-const std::vector<const KeyTree::Key*>& KeyTree::UnsavedEntries() {
+const std::vector<const KeyTree::Key*>& KeyTree::UnsavedIn(const Key& key) const {
   static const std::vector<const Key*> none;
-  const Key* const container = Container();
-  const PendingChanges::OfKey* const pending = container ? pending_.Find(*container) : nullptr;
+  const PendingChanges::OfKey* const pending = pending_.Find(key);
   return pending ? pending->keys : none;
 }
 
-void KeyTree::WriteUnsaved(SegmentWriter& to) {
-  if (!AddsEntriesOnly()) {
-    ContentBuffer tree;
-    WriteUnsaved(tree, *root_);
-    to.AddTree(tree);
-  }
+void KeyTree::WriteUnsavedTree(SegmentWriter& to, const Key* container) {
+  ContentBuffer tree;
+  WriteUnsaved(tree, *root_, container);
+  to.AddTree(tree);
+}
+
+void KeyTree::WriteUnsavedEntries(SegmentWriter& to, const Key& container) {
   std::size_t copied = 0;
-  for (const Key* const entry : UnsavedEntries()) {
+  for (const Key* const entry : UnsavedIn(container)) {
     const auto& content = pending_.At(*entry).copied;
     if (content) copied += format::EntrySize({0, entry->record_.head(), content->data()});
   }
   to.Reserve(copied);
-  for (const Key* const entry : UnsavedEntries()) {
+  for (const Key* const entry : UnsavedIn(container)) {
     const PendingChanges::OfKey& pending = pending_.At(*entry);
     if (pending.copied && pending.values.empty() && pending.keys.empty()) {
       to.AddEntry(entry->record_.head(), *pending.copied);
       continue;
     }
     ContentBuffer content;
-    WriteUnsaved(content, *entry);
+    WriteUnsaved(content, *entry, nullptr);
     to.AddEntry(entry->record_.head(), record::ContentOf(content));
   }
 }
 
 /// Writes what is not saved of a key; of the container, without its entries.
-void KeyTree::WriteUnsaved(ContentBuffer& to, const Key& key) {
+void KeyTree::WriteUnsaved(ContentBuffer& to, const Key& key, const Key* container) {
   ContentWriter writer(to);
   const PendingChanges::OfKey& pending = pending_.At(key);
   if (pending.copied) writer.Append(pending.copied->values());
   for (const std::size_t place : pending.values) writer.Append(key.values_->items()[place]);
   writer.EndValues();
   if (pending.copied) writer.Append(pending.copied->keys());
-  if (&key != Container()) {
+  if (&key != container) {
     for (const Key* const sub : pending.keys) {
       record::AppendBytes(to.shape, sub->record_.head());
-      WriteUnsaved(to, *sub);
+      WriteUnsaved(to, *sub, container);
     }
   }
   writer.Close();

@@ -128,13 +128,24 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   bool HasUnsaved() const { return pending_.Any(); }
   /// Bytes of saved values that unsaved ones replace.
   std::uint64_t superseded() const { return pending_.superseded(); }
-  /// True when all that is not saved are new sub-keys of the first key below the root, which are
-  /// the tree's entries.
-  bool AddsEntriesOnly();
-  /// The entries of which something is not saved.
-  const std::vector<const Key*>& UnsavedEntries();
-  /// Writes what is not saved; something is.
-  void WriteUnsaved(SegmentWriter& to);
+  /// The first key below the root, whose sub-keys are the tree's entries; null when there is none.
+  Key* Container();
+  /// The key whose sub-keys are the entries of a file: that of the same name as its first below the
+  /// root, or the tree's own when the file has none.
+  /// \return null when the tree has no such key
+  const Key* FindContainer(const FileContent& file);
+
+  // What is not saved, of which there is something. The container is the key whose sub-keys are the
+  // entries of the file.
+
+  /// True when it is new sub-keys of the container and nothing else.
+  bool AddsEntriesOnly(const Key& container) const;
+  /// The sub-keys of a key of which something is not saved.
+  const std::vector<const Key*>& UnsavedIn(const Key& key) const;
+  /// Writes all but the entries.
+  void WriteUnsavedTree(SegmentWriter& to, const Key* container);
+  void WriteUnsavedEntries(SegmentWriter& to, const Key& container);
+
   void WriteAll(SegmentWriter& to);
   void MarkSaved() { pending_.Clear(); }
   /// Makes a key that is not among the sub-keys of the one above it.
@@ -145,10 +156,11 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
 
   /// What the tree was loaded from.
   FileContent& content() { return content_; }
+  /// That of the tree's file.
+  format::FileHeader& header() { return content_.header; }
 
   RegistryError error = kRegistryOk;
-  format::FileHeader header;  ///< of the tree's file
-  FilePosition position;      ///< where it was last seen to end
+  FilePosition position;  ///< where it was last seen to end
 
  private:
   template <class T, class... Arguments>
@@ -160,12 +172,10 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   record::KeyRecord MakeRecord(const record::Name& name, std::uint8_t dimension);
   void AddLayer(Key& key, const record::Content& content);
   void TakeKey(Key& above, const record::KeyRecord& found);
-  /// The first key below the root; null when there is none.
-  Key* Container();
   NamedList<record::ValueRecord>& TakeValues(Key& key);
   NamedList<Key*>& TakeKeys(Key& key);
   PendingChanges::OfKey& MarkUnsaved(const Key& key);
-  void WriteUnsaved(record::ContentBuffer& to, const Key& key);
+  void WriteUnsaved(record::ContentBuffer& to, const Key& key, const Key* container);
   void WriteAll(record::ContentBuffer& to, Key& key);
 
   FileContent content_;

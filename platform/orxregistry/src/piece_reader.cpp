@@ -66,7 +66,9 @@ std::optional<FileContent> PieceReader::ReadAround() {
   const auto trailer = ReadPiece(size_ - format::kTrailer, PieceKind::kTrailer, format::kTrailer);
   if (!trailer) return std::nullopt;
   content.trailer = format::ReadTrailer(trailer->piece.content);
-  if (content.trailer.rootAt == 0 || content.trailer.reach == 0) return std::nullopt;
+  if (content.trailer.rootAt == 0 || content.trailer.rootAt >= content.trailer.reach) {
+    return std::nullopt;
+  }
   if (!ReadStart(content) || !ReadTail(content)) return std::nullopt;
   return content;
 }
@@ -94,9 +96,13 @@ bool PieceReader::ReadStart(FileContent& content) {
   record::Part keys = root->keys();
   const record::KeyRecord container = record::TakeKey(keys);
   if (!container || !container.content().keys().shapes.empty()) return false;
+  while (!keys.shapes.empty()) {
+    const record::KeyRecord other = record::TakeKey(keys);
+    if (!other || other.name() == container.name()) return false;
+  }
   content.moreMemory.push_back(std::move(tree->memory));
   content.trees.push_back(*root);
-  content.hasContainer = true;
+  content.container = container;
   return true;
 }
 
@@ -142,7 +148,7 @@ std::optional<PieceReader::Entry> PieceReader::ReadEntry(std::uint64_t at,
                                                          FileContent& around) const {
   std::optional<Read> read = ReadPiece(at, PieceKind::kEntry, kExpectedEntry);
   const auto entry = read ? format::ReadEntry(read->piece.content) : std::nullopt;
-  if (!entry) return std::nullopt;
+  if (!entry || entry->shapeAt >= at) return std::nullopt;
   if (!around.ShapeAt(entry->shapeAt) && !ReadShape(entry->shapeAt, around)) return std::nullopt;
   const auto key = format::MakeEntry(*entry, at, *around.ShapeAt(entry->shapeAt));
   if (!key) return std::nullopt;

@@ -19,15 +19,14 @@ using record::Bytes;
 constexpr std::uint64_t kReadUnasked = 1U << 16U;
 
 /// Takes a piece of a segment over.
-/// \param hasContainer there is a key below the root whose sub-keys entries could be
 /// \return false when the piece is not right
-bool TakePiece(const format::Piece& piece, bool& hasContainer, FileContent& content,
-               const FindShape& findShape) {
+bool TakePiece(const format::Piece& piece, FileContent& content, const FindShape& findShape) {
   switch (piece.kind) {
     case PieceKind::kTree: {
       const std::optional<record::Content> tree = record::SplitContent(piece.content);
       if (!tree) return false;
-      hasContainer = hasContainer || !tree->keys().shapes.empty();
+      record::Part keys = tree->keys();
+      if (!content.container) content.container = record::TakeKey(keys);
       content.trees.push_back(*tree);
       return true;
     }
@@ -36,7 +35,7 @@ bool TakePiece(const format::Piece& piece, bool& hasContainer, FileContent& cont
       return true;
     case PieceKind::kEntry: {
       const std::optional<format::Entry> entry = format::ReadEntry(piece.content);
-      if (!entry || !hasContainer) return false;
+      if (!entry || entry->shapeAt >= piece.at || !content.container) return false;
       const Bytes* shape = content.ShapeAt(entry->shapeAt);
       if (!shape && findShape(entry->shapeAt)) shape = content.ShapeAt(entry->shapeAt);
       const auto key = shape ? format::MakeEntry(*entry, piece.at, *shape) : record::KeyRecord();
@@ -74,15 +73,15 @@ void FindSegments(Bytes bytes, FileContent& content) {
     return;
   }
   content.header = *std::move(header);
-  const std::size_t start = bytes.size() - rest.size();
-  content.end = start;
+  content.start = bytes.size() - rest.size();
+  content.end = content.start;
   while (const std::size_t size =
              AddSegment(bytes.substr(content.end), content.end, content, &FindNoShape)) {
     content.end += size;
   }
   // A file gets its name only with its first segment in it, so one without was cut off later.
-  const bool damaged =
-      content.end == start || (content.end < bytes.size() && HasSegmentBehind(bytes, content.end));
+  const bool damaged = content.end == content.start ||
+                       (content.end < bytes.size() && HasSegmentBehind(bytes, content.end));
   if (damaged) content.error = kDamaged;
 }
 
@@ -127,9 +126,9 @@ struct NewFile {
 /// \return nothing when the tree turns out to be damaged
 std::optional<NewFile> MakeFile(KeyTree& tree) {
   Buffer bytes;
-  format::AppendFileHeader(bytes, tree.header);
+  format::AppendFileHeader(bytes, tree.header());
   const std::uint64_t start = bytes.size();
-  NewFile file{std::move(bytes), FileGrowth(tree.header, start)};
+  NewFile file{std::move(bytes), FileGrowth(tree.header(), start)};
   SegmentWriter writer(file.growth, file.bytes, start);
   tree.WriteAll(writer);
   if (tree.error != kRegistryOk) return std::nullopt;
@@ -140,8 +139,9 @@ std::optional<NewFile> MakeFile(KeyTree& tree) {
 /// The content of a file and one more segment, written anew without what is superseded.
 std::optional<NewFile> Compact(FileContent content, Buffer segment) {
   const Buffer& added = content.moreMemory.emplace_back(std::move(segment));
-  if (AddSegment({added.data(), added.size()}, content.end, content, &FindNoShape) == 0)
+  if (AddSegment({added.data(), added.size()}, content.end, content, &FindNoShape) == 0) {
     return std::nullopt;
+  }
   KeyTree merged(std::move(content));
   return MakeFile(merged);
 }
@@ -197,18 +197,20 @@ std::size_t AddSegment(Bytes bytes, std::uint64_t at, FileContent& content,
                        const FindShape& findShape) {
   const std::size_t trees = content.trees.size();
   const std::size_t entries = content.entries.size();
-  bool hasContainer = content.hasContainer;
+  const record::KeyRecord container = content.container;
+  const format::Trailer trailer = content.trailer;
   format::SegmentHeader header;
   const std::size_t size = format::TakeSegment(bytes, at, header, [&](const format::Piece& piece) {
-    return TakePiece(piece, hasContainer, content, findShape);
+    return TakePiece(piece, content, findShape);
   });
-  if (size == 0) {
+  if (size == 0 || content.trailer.segmentAt != at) {
+    content.container = container;
+    content.trailer = trailer;
     content.trees.resize(trees);
     content.entries.resize(entries);
     content.shapes.erase(content.shapes.lower_bound(at), content.shapes.end());
     return 0;
   }
-  content.hasContainer = hasContainer;
   content.superseded = header.superseded;
   return size;
 }
@@ -274,6 +276,7 @@ AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
   growth.swap(tree.position.growth);
   FilePosition at = tree.position;
   at.growth.swap(growth);
+  const bool isFirst = !at.growth;
   std::optional<FileContent> others;
   const AppendResult result = CatchUp(*file, tree, at, others);
   if (result == AppendResult::kFailed) return result;
@@ -281,12 +284,16 @@ AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
     if (result == AppendResult::kAppended) tree.position = std::move(at);
     return result;
   }
+  // What others have put in the place of the file may have its entries in another key, or in none.
+  const KeyTree::Key* const container = others ? tree.FindContainer(*others) : tree.Container();
   const bool addsOnly =
-      tree.AddsEntriesOnly() && !(others && HoldsAnyOf(*others, tree.UnsavedEntries()));
-  const bool losesIndex = at.growth->HasIndex() && !addsOnly;
+      container && tree.AddsEntriesOnly(*container) &&
+      !(others && (!others->container || HoldsAnyOf(*others, tree.UnsavedIn(*container))));
+  const bool losesIndex = at.growth->HasAreas() && (at.growth->HasIndex() ? !addsOnly : isFirst);
   Buffer segment;
   SegmentWriter writer(*at.growth, segment, at.end);
-  tree.WriteUnsaved(writer);
+  if (!addsOnly) tree.WriteUnsavedTree(writer, container);
+  if (container) tree.WriteUnsavedEntries(writer, *container);
   at.superseded += tree.superseded();
   writer.Finish(at.superseded, addsOnly);
   if (losesIndex || at.superseded > (at.end + segment.size()) / 2) {

@@ -37,7 +37,8 @@ struct FileContent {
   std::vector<record::Content> trees;  ///< what the root holds, but for the entries, in order
   std::vector<Entry> entries;          ///< sub-keys of the first key below the root, in order
   std::map<std::uint64_t, record::Bytes> shapes;  ///< by their places
-  bool hasContainer = false;                      ///< there is a key below the root
+  record::KeyRecord container;                    ///< the first key below the root, if there is one
+  std::uint64_t start = 0;                        ///< where the first segment is
   format::Trailer trailer;                        ///< of the last whole segment
   std::uint64_t end = 0;                          ///< where the last whole segment ends
   std::uint64_t superseded = 0;                   ///< bytes of values that later segments replace
@@ -89,8 +90,9 @@ enum class AppendResult {
 };
 
 /// Appends what is not saved of a tree to its file durably. The file is written afresh instead,
-/// where that can be done, when more than half of it is superseded, or when a file with areas would
-/// lose its index because what is saved is more than new entries.
+/// where that can be done, when more than half of it is superseded, when it would lose its index
+/// because what is saved is more than new entries, and when it has lost it and is saved to for the
+/// first time.
 AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree);
 
 }  // namespace orx

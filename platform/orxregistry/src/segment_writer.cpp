@@ -27,13 +27,14 @@ std::size_t FileGrowth::Hash::operator()(const std::string& shape) const {
 FileGrowth::FileGrowth(const format::FileHeader& header, std::uint64_t start)
     : areas_(header.areas), edge_(header.fanOut), reach_(areas_.empty() ? 0 : start) {}
 
-FileGrowth::FileGrowth(const FileContent& content)
-    : FileGrowth(content.header, content.trailer.reach) {
+FileGrowth::FileGrowth(const FileContent& content) : FileGrowth(content.header, content.start) {
   for (const auto& [at, shape] : content.shapes) {
     Put(shape, at, format::kPieceHeader + shape.size());
   }
+  if (content.trailer.reach == 0) reach_ = 0;
   if (!HasIndex()) return;
   rootAt_ = content.trailer.rootAt;
+  if (rootAt_ != 0) reach_ = content.trailer.reach;
   const auto read = [&](std::uint64_t at) -> std::optional<IndexNode> {
     if (at >= content.end) return std::nullopt;
     Bytes bytes(content.memory.get() + at, content.end - at);

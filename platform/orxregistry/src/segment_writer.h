@@ -68,8 +68,8 @@ class SegmentWriter {
   void AddTree(const record::ContentBuffer& content);
   void AddEntry(record::Bytes head, const record::Content& content);
   /// \param superseded as in format::SegmentHeader
-  /// \param addsEntriesOnly false: it holds something else, or the file is not new and lacks what
-  ///     the segment's entries are laid over, so that the file has no index from now on
+  /// \param addsEntriesOnly false: it holds something else, or an entry that the file has already,
+  ///     so that the file has no index from now on
   void Finish(std::uint64_t superseded, bool addsEntriesOnly);
 
  private:

@@ -91,8 +91,9 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
 
   /// Has the files that this tree is written to find their entries by areas. For a tree without a
   /// file.
-  /// \param areas at most kMaxEntryAreas
-  void IndexBy(const EntryAreas& areas);
+  /// \param areas at most kMaxEntryAreas, all their names together of at most 2000 characters
+  /// \return false when they are more, or make no sense; the tree is then as it was
+  bool IndexBy(const EntryAreas& areas);
 
   /// True when the tree has changes that no save has made durable.
   bool HasUnsavedChanges() const;
