@@ -47,10 +47,11 @@ boost::shared_ptr<RtcmBasicTransformMessage> MakeMessage(const projmath::TRectRg
 boost::shared_ptr<RtcmBasicTransformMessage> RTCMGenerator::getRtcmDatumMessage(
     double latitude, double longitude, double /*height*/) const {
   TAreaWalk walk = EntriesAround(datumFile_, kSearchedValidity, latitude, longitude);
-  TGenericRegistryKey standard(nullptr);  // of the entry that is looked at
+  ShapeMemory memory;
+  const StoredKey standard(memory, layout::kStandardDatum);  // of the entry that is looked at
   projmath::TRectRgn area;
   const auto areaOf = [&](const TGenericRegistryKey& entry, projmath::TRectRgn& its) {
-    standard = OpenExisting(entry, layout::kStandardDatum);
+    memory.GoTo(entry);
     if (!ReadValidityArea(standard, its)) return false;
     area = its;
     return true;

@@ -23,10 +23,11 @@ template <class Message>
 boost::shared_ptr<Message> FindGrid(const COrxStringT<wchar_t>& fileName, const GridKind& kind,
                                     double north, double east, std::int32_t systemId) {
   TAreaWalk walk = EntriesAround(fileName, kind.area, north, east);
-  TGenericRegistryKey gridKey(nullptr);  // of the entry that is looked at
+  ShapeMemory memory;
+  const StoredKey gridKey(memory, kind.layout.key);  // of the entry that is looked at
   StoredGrid grid;
   const auto areaOf = [&](const TGenericRegistryKey& entry, projmath::TRectRgn& area) {
-    gridKey = OpenExisting(entry, kind.layout.key);
+    memory.GoTo(entry);
     if (!ReadGridArea(gridKey, kind.layout, grid)) return false;
     area = AreaOf(grid);
     return true;
