@@ -7,6 +7,7 @@
 #include <utility>
 #include <vector>
 
+#include "file_save.h"
 #include "named_list.h"
 #include "orxregistry/in_file_key.h"
 #include "orxregistry/registry_key.h"

@@ -5,19 +5,15 @@
 #include <functional>
 #include <list>
 #include <map>
-#include <optional>
 #include <vector>
 
 #include "file_format.h"
 #include "orxregistry/in_file_key.h"
 #include "os_file.h"
 #include "record_format.h"
-#include "segment_writer.h"
 
-/// A registry file as a whole: read, written anew, appended to.
+/// Reading a registry file as a whole.
 namespace orx {
-
-class KeyTree;
 
 /// A file read into memory and what was found in it.
 struct FileContent {
@@ -57,42 +53,9 @@ using FindShape = std::function<bool(std::uint64_t at)>;
 
 /// Takes a segment apart that lies in the content's memory.
 /// \param at its place in the file
-/// \param findShape called for a shape that the content does not have
+/// \param findShape called for a shape that the content does not have; empty: none is to be had
 /// \return its size; 0 when it is not whole, and the content is as it was
 std::size_t AddSegment(record::Bytes bytes, std::uint64_t at, FileContent& content,
-                       const FindShape& findShape);
-
-/// What a tree knows of its file: where the next segment goes, and how.
-struct FilePosition {
-  os::FileStamp stamp;
-  std::uint64_t end = 0;
-  std::uint64_t superseded = 0;
-  bool isNameDurable = false;  ///< false: who named the file may not have flushed its directory
-  std::optional<FileGrowth> growth;  ///< nothing: to be had from the file
-};
-
-/// Writes a file beside its place, makes it durable and gives it its name.
-/// \param replaced the file whose place it takes and whose owner and mode it gets, locked; null:
-///     fails when there is a file of that name
-/// \return the stamp of the file; nothing when it did not come to be
-std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path,
-                                         const record::Buffer& bytes, const os::File* replaced);
-
-/// Writes all of a tree to a new file.
-/// \return where its next segment goes; nothing when it did not come to be
-std::optional<FilePosition> SaveNewFile(const std::filesystem::path& path, KeyTree& tree);
-
-/// How an append ended.
-enum class AppendResult {
-  kFailed,       ///< nothing durable was lost; whether the new part is in the file is open
-  kAppended,     ///< durable; the tree's position is that of the new end
-  kBehindOthers  ///< durable, behind segments that somebody else appended since that position
-};
-
-/// Appends what is not saved of a tree to its file durably. The file is written afresh instead,
-/// where that can be done, when more than half of it is superseded, when it would lose its index
-/// because what is saved is more than new entries, and when it has lost it and is saved to for the
-/// first time.
-AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree);
+                       const FindShape& findShape = {});
 
 }  // namespace orx
