@@ -27,7 +27,7 @@ namespace velta = orx::cs::velta;
 namespace rtcm3 = orx::cs::velta::rtcm3;
 
 constexpr std::uint32_t kLarge = 100'000;
-/// What lies behind the last full node of the index is read by every query. Here it is 40 entries,
+/// What lies behind the last full node of the index is read by every query. Here it is 8 entries,
 /// as it is at 1000, so that the two can be compared; at 1'000'000 it would be none.
 constexpr std::uint32_t kMillion = 1'000'040;
 /// The size that growth is counted from.
