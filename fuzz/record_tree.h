@@ -368,7 +368,8 @@ class Spoiler {
       const Content spoiled = ContentOf(root);
       piece.content = spoiled.shape + spoiled.data;
     } else if (const Piece* const shape = ShapeOf(segment, piece)) {
-      std::string_view entry = std::string_view(piece.content).substr(8);
+      std::string_view entry = piece.content;
+      Take(entry, 8);
       const Key head = TakeHead(entry);
       std::string_view shapeBytes = shape->content;
       Key key = TakeContent(shapeBytes, entry);
