@@ -30,14 +30,15 @@ class ORXREGISTRY_EXPORT TAreaWalk {
   /// \param fileName the file; one that cannot be read has no entries
   /// \param areas those that its entries should have
   /// \param area which of them `mayHold` is asked about
+  /// \param mayHold asked about each item of the index that is come upon
   TAreaWalk(const COrxStringT<wchar_t>& fileName, const EntryAreas& areas, std::size_t area,
             MayHold mayHold);
   TAreaWalk(const TAreaWalk&) = delete;
   TAreaWalk& operator=(const TAreaWalk&) = delete;
   ~TAreaWalk();
 
-  /// The key that the entries are sub-keys of, with its values; of its sub-keys there are only
-  /// some. \return null when there is none
+  /// The key that the entries are sub-keys of, with its values; not all of its sub-keys are there.
+  /// \return null when there is none
   TGenericRegistryKey Container() const;
 
   /// Where the index turns out not to be right the walk begins again, with all entries.

@@ -14,6 +14,7 @@ struct EntryArea {
   std::uint32_t bytes = 0;             ///< the value's size, at least four doubles
   std::vector<std::u16string> needed;  ///< values without which the sub-key says nothing
 
+  /// True when all of both is the same.
   friend bool operator==(const EntryArea& a, const EntryArea& b) {
     return a.key == b.key && a.value == b.value && a.bytes == b.bytes && a.needed == b.needed;
   }
@@ -23,6 +24,7 @@ struct EntryArea {
 /// reading the others: at most kMaxEntryAreas. A file keeps them in its header.
 using EntryAreas = std::vector<EntryArea>;
 
+/// So many areas a file's entries can have.
 inline constexpr std::size_t kMaxEntryAreas = 2;
 
 }  // namespace orx

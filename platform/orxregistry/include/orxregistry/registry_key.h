@@ -54,7 +54,7 @@ struct KeyBytes {
   /// value of one has the same place in its data as that of the other. Null: there are no such
   /// bytes.
   const void* shape = nullptr;
-  const unsigned char* data = nullptr;
+  const unsigned char* data = nullptr;  ///< as long as the key's tree lives
 };
 
 /// A key: named values and named sub-keys, both in the order in which they were first added.
