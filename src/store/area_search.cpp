@@ -14,17 +14,20 @@ constexpr double kFullTurn = 2.0 * std::numbers::pi;
 constexpr double kHalfTurn = std::numbers::pi;
 
 EntryArea ValidityArea() {
+  constexpr bool kZeroIsTheWholeRange = true;
   return {ToUtf16(layout::kStandardDatum),
           ToUtf16(layout::kValidityArea.name),
           layout::kValidityArea.kBytes,
-          {}};
+          {},
+          kZeroIsTheWholeRange};
 }
 
 EntryArea GridArea(const layout::ResidualGrid& grid) {
   return {ToUtf16(grid.key),
           ToUtf16(grid.boundaries.name),
           grid.boundaries.kBytes,
-          {ToUtf16(layout::kRows.name), ToUtf16(layout::kColumns.name)}};
+          {ToUtf16(layout::kRows.name), ToUtf16(layout::kColumns.name)},
+          false};
 }
 
 /// More than all rounding errors, of TRectRgn::Inside() and of this, of numbers up to this sum.

@@ -1,8 +1,5 @@
 #include "store/stored_key.h"
 
-#include <algorithm>
-#include <cstring>
-
 #include "store/key_values.h"
 
 namespace orx::cs::velta {
@@ -27,12 +24,6 @@ class Borrowed : public bin_value {
   StoredValue value;
 };
 
-bool IsUnterminated(const StoredValue& text, const unsigned char* data) {
-  char16_t last = u'\0';
-  std::memcpy(&last, data + text.bytes - sizeof last, sizeof last);
-  return last != u'\0';
-}
-
 }  // namespace
 
 StoredValue FindValue(const TGenericRegistryKey& key, const wchar_t* name) {
@@ -45,14 +36,9 @@ StoredValue FindValue(const TGenericRegistryKey& key, const wchar_t* name) {
 
 void ShapeMemory::GoTo(const TGenericRegistryKey& entry) {
   const KeyBytes bytes = entry.GetBytes();
-  // A text without its end is damage, and what is behind it is not there.
-  const bool isDamaged = std::any_of(known_.begin(), known_.end(), [&](const Known& known) {
-    return known.value.descriptor.size == 0 && bytes.shape == bytes_.shape &&
-           IsUnterminated(known.value, bytes.data + known.place);
-  });
-  if (!bytes.shape || bytes.shape != bytes_.shape || isDamaged) known_.clear();
+  if (!bytes.shape || bytes.shape != bytes_.shape) known_.clear();
   entry_ = entry;
-  bytes_ = isDamaged ? KeyBytes() : bytes;
+  bytes_ = bytes;
   next_ = 0;
 }
 

@@ -89,7 +89,7 @@ struct RegistryFile {
     tree.Save(Name(), false, orx::kRegistryVersion);
     SetBytes(velta_fuzz::WithFanOut(2, Bytes()));
   }
-  static orx::EntryAreas Areas() { return {{u"where", u"area", 32, {}}}; }
+  static orx::EntryAreas Areas() { return {{u"where", u"area", 32, {}, false}}; }
   /// The tree as Describe() has it, by the entries that the index leads to and those behind them.
   std::string Walked() const {
     orx::TAreaWalk walk(Name(), Areas(), 0, [](const orx::AreaBounds&) { return true; });

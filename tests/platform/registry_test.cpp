@@ -285,11 +285,11 @@ TEST(RegistryFile, ThatWasPutInThePlaceOfAnotherGetsWhatIsSavedWhereItBelongs) {
 
 TEST(RegistryFile, IsNotIndexedByAreasThatItsHeaderCannotHold) {
   TCSInFileKey tree = RegistryFile::New();
-  const orx::EntryArea area{u"key", u"value", 32, {}};
+  const orx::EntryArea area{u"key", u"value", 32, {}, false};
   EXPECT_TRUE(tree.IndexBy({area, area}));
   EXPECT_FALSE(tree.IndexBy({area, area, area}));
-  EXPECT_FALSE(tree.IndexBy({{u"key", u"value", 24, {}}})) << "less than four doubles";
-  EXPECT_FALSE(tree.IndexBy({{std::u16string(3000, u'k'), u"value", 32, {}}}));
+  EXPECT_FALSE(tree.IndexBy({{u"key", u"value", 24, {}, false}})) << "less than four doubles";
+  EXPECT_FALSE(tree.IndexBy({{std::u16string(3000, u'k'), u"value", 32, {}, false}}));
 }
 
 TEST(RegistryKey, IsCopiedAsItIsAlsoIntoItself) {

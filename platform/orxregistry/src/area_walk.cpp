@@ -29,22 +29,21 @@ class TAreaWalk::Walk {
 
   TGenericRegistryKey Container() const {
     if (!tree_) return TGenericRegistryKey(nullptr);
-    const auto& keys = tree_->Keys(tree_->root());
-    return Share(keys.empty() ? nullptr : keys.front());
+    return Share(tree_->Container());
   }
 
   TGenericRegistryKey Next() {
     while (!nodes_.empty()) {
-      At& at = nodes_.back();
-      if (at.next == at.items.size()) {
+      WalkedNode& node = nodes_.back();
+      if (node.next == node.items.size()) {
         nodes_.pop_back();
         continue;
       }
-      const IndexItem& item = at.items[at.next++];
+      const IndexItem& item = node.items[node.next++];
       if (!MayHold(item)) continue;
       // In a file as it is written, what comes later lies behind, and in front of what leads to it.
-      const bool isInOrder = item.at >= floors_[at.level] && item.at < at.place;
-      if (at.level == 0) {
+      const bool isInOrder = item.at >= floors_[node.level] && item.at < node.place;
+      if (node.level == 0) {
         const TGenericRegistryKey entry = isInOrder ? Read(item.at) : TGenericRegistryKey(nullptr);
         if (!entry.IsNull()) return entry;
         ReadWhole();
@@ -58,7 +57,7 @@ class TAreaWalk::Walk {
 
  private:
   /// A node that is walked.
-  struct At {
+  struct WalkedNode {
     std::uint32_t level;
     std::uint64_t place;
     std::vector<IndexItem> items;
@@ -105,18 +104,19 @@ class TAreaWalk::Walk {
     std::optional<PieceReader::Entry> entry = reader_->ReadEntry(place, tree_->content());
     if (!entry) return TGenericRegistryKey(nullptr);
     floors_[0] = entry->end;
-    KeyTree::Key& container = *tree_->Keys(tree_->root()).front();
-    return Share(&tree_->MakeLoose(container, entry->key, std::move(entry->memory)));
+    return Share(&tree_->MakeLoose(*tree_->Container(), entry->key, std::move(entry->memory)));
   }
 
   const std::size_t area_;
   const TAreaWalk::MayHold mayHold_;
   std::optional<PieceReader> reader_;
-  std::vector<At> nodes_;  ///< from the root to where the walk is; none: it has left the index
+  std::vector<WalkedNode>
+      nodes_;  ///< from the root to where the walk is; none: it has left the index
   /// By level, where what comes next there must lie behind; in front of the nodes' the entries'.
   std::vector<std::uint64_t> floors_;
   std::shared_ptr<KeyTree> tree_;
-  std::optional<TGenRegKeyIterator> rest_;
+  std::optional<TGenRegKeyIterator>
+      rest_;  ///< what is behind the index; all, where that is not used
 };
 
 TAreaWalk::TAreaWalk(const COrxStringT<wchar_t>& fileName, const EntryAreas& areas,

@@ -45,10 +45,15 @@ float Down(double value) {
 
 float Up(double value) { return -Down(-value); }
 
-/// An extent of 0 may stand for anything, and an edge that is no number, too.
-bool IsArea(const double (&area)[4]) {
-  return std::isfinite(area[0] + area[1]) && std::isfinite(area[2] + area[3]) && area[1] > 0.0 &&
-         area[3] > 0.0 && std::isfinite(area[1]) && std::isfinite(area[3]);
+/// False for edges that are no numbers, and for extents that hold nothing or may mean something
+/// else.
+bool IsArea(const double (&area)[4], bool isZeroUnknown) {
+  for (int axis = 0; axis < 2; ++axis) {
+    const double extent = area[2 * axis + 1];
+    if (!std::isfinite(area[2 * axis] + extent) || !std::isfinite(extent)) return false;
+    if (extent < 0.0 || (extent == 0.0 && isZeroUnknown)) return false;
+  }
+  return true;
 }
 
 }  // namespace
@@ -63,10 +68,14 @@ void Bounds::Include(const Bounds& other) {
 }
 
 AreaPlaces::AreaPlaces(const EntryAreas& areas, const Content& content) {
-  for (std::size_t i = 0; i < areas.size(); ++i) Place(areas[i], i, content);
+  for (std::size_t i = 0; i < areas.size(); ++i) FindPlace(areas[i], i, content);
 }
 
-void AreaPlaces::Place(const EntryArea& area, std::size_t number, const Content& content) {
+bool AreaPlaces::HasAny() const {
+  return std::any_of(places_.begin(), places_.end(), [](const auto& place) { return !!place; });
+}
+
+void AreaPlaces::FindPlace(const EntryArea& area, std::size_t number, const Content& content) {
   const KeyRecord key = FindOnly(content.keys(), record::TakeKey, area.key);
   if (!key) return;
   Part values = key.content().values();
@@ -78,7 +87,7 @@ void AreaPlaces::Place(const EntryArea& area, std::size_t number, const Content&
   const auto placeOf = [&](ValueRecord value) {
     return static_cast<std::size_t>(value.data().data() - content.data().data());
   };
-  places_[number] = placeOf(found);
+  places_[number] = {placeOf(found), area.isZeroUnknown};
   while (!values.shapes.empty()) {
     const ValueRecord value = record::TakeValue(values);
     if (value.value().elementSize == 0) texts_.push_back({placeOf(value), value.data().size()});
@@ -94,8 +103,8 @@ EntryBounds AreaPlaces::BoundsIn(record::Bytes data) const {
   for (std::size_t i = 0; isWhole && i < bounds.size(); ++i) {
     if (!places_[i]) continue;
     double area[4];
-    std::memcpy(area, data.data() + *places_[i], sizeof area);
-    if (!IsArea(area)) continue;
+    std::memcpy(area, data.data() + places_[i]->place, sizeof area);
+    if (!IsArea(area, places_[i]->isZeroUnknown)) continue;
     for (int axis = 0; axis < 2; ++axis) {
       const double edge = area[2 * axis];
       bounds[i].low[axis] = Down(edge);

@@ -30,19 +30,26 @@ class AreaPlaces {
   /// \param content of an entry of that shape
   AreaPlaces(const EntryAreas& areas, const record::Content& content);
 
+  /// False when such entries have none of the areas, or that one was damaged.
+  bool HasAny() const;
+
   /// \param data of an entry of that shape
   EntryBounds BoundsIn(record::Bytes data) const;
 
  private:
+  struct Place {
+    std::size_t place;
+    bool isZeroUnknown;
+  };
   struct Text {
     std::size_t place;
     std::size_t bytes;
   };
 
-  void Place(const EntryArea& area, std::size_t number, const record::Content& content);
+  void FindPlace(const EntryArea& area, std::size_t number, const record::Content& content);
 
   /// By the areas' order; nothing for an area that such entries do not have, or not just once.
-  std::array<std::optional<std::size_t>, kMaxEntryAreas> places_;
+  std::array<std::optional<Place>, kMaxEntryAreas> places_;
   std::vector<Text> texts_;  ///< beside the areas; where one is damaged they may not be found
 };
 

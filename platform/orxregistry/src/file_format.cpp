@@ -58,7 +58,9 @@ std::u16string TextOf(Bytes bytes) {
   return text;
 }
 
-// An area: its size, the number of names, the names, each with the number of its units in front.
+// An area: its size, the number of needed names, flags, the names, each with the number of its
+// units in front.
+constexpr std::uint8_t kZeroIsUnknown = 1;
 
 void AppendName(Buffer& to, const std::u16string& name) {
   Append(to, static_cast<std::uint16_t>(name.size()));
@@ -67,7 +69,8 @@ void AppendName(Buffer& to, const std::u16string& name) {
 
 void AppendArea(Buffer& to, const EntryArea& area) {
   Append(to, area.bytes);
-  Append(to, static_cast<std::uint16_t>(area.needed.size()));
+  Append(to, static_cast<std::uint8_t>(area.needed.size()));
+  Append(to, area.isZeroUnknown ? kZeroIsUnknown : std::uint8_t{0});
   AppendName(to, area.key);
   AppendName(to, area.value);
   for (const std::u16string& name : area.needed) AppendName(to, name);
@@ -90,9 +93,11 @@ bool TakeName(Bytes& bytes, std::u16string& name) {
 }
 
 bool TakeArea(Bytes& bytes, EntryArea& area) {
-  std::uint16_t needed = 0;
+  std::uint8_t needed = 0;
+  std::uint8_t flags = 0;
   if (!Take(bytes, area.bytes) || area.bytes < 4 * sizeof(double)) return false;
-  if (!Take(bytes, needed) || needed > bytes.size()) return false;
+  if (!Take(bytes, needed) || !Take(bytes, flags) || flags > kZeroIsUnknown) return false;
+  area.isZeroUnknown = flags == kZeroIsUnknown;
   area.needed.resize(needed);
   if (!TakeName(bytes, area.key) || !TakeName(bytes, area.value)) return false;
   return std::all_of(area.needed.begin(), area.needed.end(),

@@ -35,9 +35,8 @@ std::optional<NewFile> MakeFile(KeyTree& tree) {
 }
 
 /// The content of a file and one more segment, written anew without what is superseded.
-std::optional<NewFile> Compact(FileContent content, Buffer segment) {
-  const Buffer& added = content.moreMemory.emplace_back(std::move(segment));
-  if (AddSegment({added.data(), added.size()}, content.end, content) == 0) {
+std::optional<NewFile> Compact(FileContent content, const Buffer& segment) {
+  if (AddSegment({segment.data(), segment.size()}, content.end, content) == 0) {
     return std::nullopt;
   }
   KeyTree merged(std::move(content));
@@ -52,7 +51,7 @@ AppendResult CatchUp(const os::File& file, KeyTree& tree, FilePosition& position
   const std::optional<os::FileStamp> stamp = file.Stamp();
   if (!stamp) return AppendResult::kFailed;
   if (*stamp == position.stamp && position.growth) return AppendResult::kAppended;
-  if (*stamp == position.stamp && position.end == tree.content().end) {
+  if (*stamp == tree.content().stamp) {
     position.growth.emplace(tree.content());
     return AppendResult::kAppended;
   }
@@ -76,6 +75,7 @@ bool HoldsAnyOf(const FileContent& content, const std::vector<const KeyTree::Key
 
 /// The segment with what is not saved of a tree.
 /// \param others what others have put into the file
+/// \param at where it goes; it is told what that supersedes, and grows as by the segment
 Buffer MakeSegment(KeyTree& tree, const std::optional<FileContent>& others, FilePosition& at) {
   // A file in the place of another may have its entries in another key, or in none.
   const KeyTree::Key* const container = others ? tree.FindContainer(*others) : tree.Container();
@@ -127,9 +127,6 @@ bool Append(os::File& file, const std::filesystem::path& path, const Buffer& seg
 /// \param replaced the file whose place it takes and whose owner and mode it gets, locked; null:
 ///     fails when there is a file of that name
 /// \return the stamp of the file; nothing when it did not come to be
-std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path,
-                                         const record::Buffer& bytes, const os::File* replaced);
-
 std::optional<os::FileStamp> PublishFile(const std::filesystem::path& path, const Buffer& bytes,
                                          const os::File* replaced) {
   // Something that is no left-over may have the name; then the next is tried.
@@ -191,10 +188,13 @@ AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree) {
   const bool lacksIndex = at.growth->HasAreas() && !at.growth->HasIndex();
   const bool isMostlySuperseded = at.superseded > (at.end + segment.size()) / 2;
   if (isMostlySuperseded || (lacksIndex && (hadIndex || isFirst))) {
-    std::optional<NewFile> whole = Compact(ReadRegistryFile(*file), segment);
-    if (!whole) return AppendResult::kFailed;
-    if (const auto stamp = PublishFile(path, whole->bytes, &*file)) {
-      tree.position = {*stamp, whole->bytes.size(), 0, true, std::move(whole->growth)};
+    // What is damaged inside is not written anew.
+    const std::optional<NewFile> whole =
+        Compact(others ? *std::move(others) : ReadRegistryFile(*file), segment);
+    if (!whole && isMostlySuperseded) return AppendResult::kFailed;
+    const auto stamp = whole ? PublishFile(path, whole->bytes, &*file) : std::nullopt;
+    if (stamp) {
+      tree.position = {*stamp, whole->bytes.size(), 0, true, whole->growth};
       return result;
     }
     // An append needs less room, and fewer rights. But the new file may have the name already.

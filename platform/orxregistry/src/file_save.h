@@ -33,9 +33,9 @@ enum class AppendResult {
 };
 
 /// Appends what is not saved of a tree to its file durably. The file is written afresh instead,
-/// where that can be done, when more than half of it is superseded, when it would lose its index
-/// because what is saved is more than new entries, and when it has lost it and is saved to for the
-/// first time.
+/// where that can be done, when more than half of it is superseded, when its index would end
+/// because what is saved is more than new entries, and when it has none and this is the first save
+/// since the tree was read.
 AppendResult AppendUnsaved(const std::filesystem::path& name, KeyTree& tree);
 
 }  // namespace orx

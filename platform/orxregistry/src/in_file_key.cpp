@@ -68,7 +68,7 @@ bool TInFileKey::Save(const COrxStringT<wchar_t>& fileName, bool /*flag*/,
 }
 
 bool TInFileKey::IndexBy(const EntryAreas& areas) {
-  if (!format::AreRight(areas)) return false;
+  if (tree_->position.end != 0 || !format::AreRight(areas)) return false;
   tree_->header().areas = areas;
   return true;
 }

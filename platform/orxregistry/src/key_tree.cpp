@@ -161,7 +161,7 @@ const Content* KeyTree::ContentAsLoaded(const Key& key) const {
 
 void KeyTree::LookInto(Key& key) {
   if (const Content* const content = ContentAsLoaded(key)) {
-    if (!record::IsWhole(*content, record::kMaxDepth - key.depth_)) error = kDamaged;
+    if (!IsWhole(*content, key)) error = kDamaged;
     return;
   }
   TakeValues(key);
@@ -173,7 +173,12 @@ KeyTree::Key* KeyTree::OpenKey(Key& key, const record::Name& name, std::uint8_t 
   if (key.depth_ == record::kMaxDepth || name.bytes > kMaxNameBytes) return nullptr;
   auto* const made = Make<Key>(*this, &key, MakeRecord(name, dimension));
   MarkUnsaved(*made).isNew = true;
-  TakeKeys(key).Append(made);
+  try {
+    TakeKeys(key).Append(made);
+  } catch (...) {
+    pending_.Forget(*made);
+    throw;
+  }
   return made;
 }
 
@@ -203,7 +208,7 @@ void KeyTree::DeepCopy(Key& to, Key& from) {
   KeyTree& source = *from.tree;
   const Content* const content = source.ContentAsLoaded(from);
   if (content && &source != this && to.depth_ >= kEntryDepth && to.IsBlank() &&
-      record::IsWhole(*content, record::kMaxDepth - to.depth_)) {
+      source.IsWhole(*content, from) && to.depth_ <= from.depth_) {
     // As a whole, and where it lies: this is how entries are copied when files are merged.
     lenders_.insert(source.shared_from_this());
     PendingChanges::OfKey& pending = MarkUnsaved(to);
@@ -225,7 +230,7 @@ PendingChanges::OfKey& KeyTree::MarkUnsaved(const Key& key) {
 }
 
 const KeyTree::Key* KeyTree::FindContainer(const FileContent& file) {
-  if (!file.container) return Container();
+  if (!file.container) return nullptr;
   const record::Name name = file.container.name();
   return FindKey(*root_, name);
 }
@@ -295,7 +300,7 @@ void KeyTree::WriteAll(SegmentWriter& to) {
   to.Reserve(content_.end);
   for (Key* const entry : Keys(*Container())) {
     const Content* const lying = ContentAsLoaded(*entry);
-    if (lying && record::IsWhole(*lying, record::kMaxDepth - kEntryDepth)) {
+    if (lying && IsWhole(*lying, *entry)) {
       to.AddEntry(entry->record_.head(), *lying);
       continue;
     }

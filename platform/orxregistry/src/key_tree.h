@@ -113,6 +113,11 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   /// What an entry, or a key in one, holds if that is one record in the tree's file; else null.
   const record::Content* ContentAsLoaded(const Key& key) const;
 
+  /// True when what a key of the tree holds is whole, and not too deep.
+  bool IsWhole(const record::Content& content, const Key& key) {
+    return wholeShape_.IsWhole(content, record::kMaxDepth - key.depth_);
+  }
+
   /// Takes everything in a key apart, to find damage.
   void LookInto(Key& key);
 
@@ -184,6 +189,7 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   std::pmr::monotonic_buffer_resource memory_;
   Key* root_;
   VisitedValues visited_;
+  record::WholeShape wholeShape_;
   bool isAsLoaded_ = true;  ///< nothing was changed since it was loaded
   PendingChanges pending_;
 };

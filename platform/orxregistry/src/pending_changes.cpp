@@ -31,6 +31,11 @@ PendingChanges::OfKey& PendingChanges::Of(const Key& key) {
   return pending;
 }
 
+void PendingChanges::Forget(const Key& key) {
+  keys_.at(key.parent).keys.pop_back();
+  keys_.erase(&key);
+}
+
 void PendingChanges::Clear() {
   keys_.clear();
   superseded_ = 0;

@@ -49,6 +49,8 @@ class PendingChanges {
 
   void CountSuperseded(std::size_t bytes) { superseded_ += bytes; }
 
+  /// Forgets a key below the root, of which something has just become pending.
+  void Forget(const Key& key);
   void Clear();
 
  private:

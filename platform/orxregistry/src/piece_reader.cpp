@@ -47,6 +47,7 @@ std::optional<PieceReader::Read> PieceReader::ReadPiece(std::uint64_t at, PieceK
   const std::uint64_t size = format::PieceSize(BytesOf(*bytes));
   if (size > bytes->size()) bytes = ReadBytes(at, size);
   if (!bytes) return std::nullopt;
+  bytes->resize(size);
   Bytes rest = BytesOf(*bytes);
   const std::optional<format::Piece> piece = format::TakePiece(rest, at);
   if (!piece || piece->kind != kind) return std::nullopt;
@@ -108,7 +109,7 @@ bool PieceReader::ReadStart(FileContent& content) {
 
 /// Reads the segments behind the reach of the index. The last segment is always looked at, as what
 /// it says of the file may have been written before the rest of it; of a large one this is not so.
-bool PieceReader::ReadTail(FileContent& content) const {
+bool PieceReader::ReadTail(FileContent& content) {
   const auto& [segmentAt, rootAt, reach] = content.trailer;
   if (segmentAt >= size_ || reach > size_) return false;
   const bool isLarge = size_ - segmentAt > format::kCheckedWithItsTrailer;
@@ -128,11 +129,13 @@ bool PieceReader::ReadTail(FileContent& content) const {
   return true;
 }
 
-bool PieceReader::ReadShape(std::uint64_t at, FileContent& content) const {
+bool PieceReader::ReadShape(std::uint64_t at, FileContent& content) {
   std::optional<Read> shape = ReadPiece(at, PieceKind::kShape, kExpectedShape);
   if (!shape) return false;
-  content.shapes.emplace(at, shape->piece.content);
+  shapeBytes_ += shape->piece.content.size();
+  if (shapeBytes_ > size_) return false;
   content.moreMemory.push_back(std::move(shape->memory));
+  content.shapes.emplace(at, shape->piece.content);
   return true;
 }
 
@@ -144,8 +147,7 @@ std::optional<PieceReader::Node> PieceReader::ReadNode(std::uint64_t at) const {
   return Node{*std::move(node), at + format::kPieceHeader + read->piece.content.size()};
 }
 
-std::optional<PieceReader::Entry> PieceReader::ReadEntry(std::uint64_t at,
-                                                         FileContent& around) const {
+std::optional<PieceReader::Entry> PieceReader::ReadEntry(std::uint64_t at, FileContent& around) {
   std::optional<Read> read = ReadPiece(at, PieceKind::kEntry, kExpectedEntry);
   const auto entry = read ? format::ReadEntry(read->piece.content) : std::nullopt;
   if (!entry || entry->shapeAt >= at) return std::nullopt;

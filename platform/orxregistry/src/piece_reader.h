@@ -38,7 +38,7 @@ class PieceReader {
     std::uint64_t end = 0;
   };
   /// \param around what ReadAround() gave; it gets the entry's shape
-  std::optional<Entry> ReadEntry(std::uint64_t at, FileContent& around) const;
+  std::optional<Entry> ReadEntry(std::uint64_t at, FileContent& around);
 
  private:
   /// A checked piece and what its content lies in.
@@ -53,13 +53,14 @@ class PieceReader {
   std::optional<Read> ReadPiece(std::uint64_t at, format::PieceKind kind,
                                 std::size_t expected) const;
   bool ReadStart(FileContent& content);
-  bool ReadTail(FileContent& content) const;
-  bool ReadShape(std::uint64_t at, FileContent& content) const;
+  bool ReadTail(FileContent& content);
+  bool ReadShape(std::uint64_t at, FileContent& content);
 
   os::File file_;
   std::uint64_t size_ = 0;
-  record::Buffer start_;  ///< the first bytes of the file
-  record::Buffer end_;    ///< the last
+  std::uint64_t shapeBytes_ = 0;  ///< of the shapes that were read; in a sound file they lie apart
+  record::Buffer start_;          ///< the first bytes of the file
+  record::Buffer end_;            ///< the last
   std::uint32_t fanOut_ = 0;
   std::size_t areas_ = 0;
 };

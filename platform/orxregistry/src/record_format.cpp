@@ -38,14 +38,33 @@ Bytes WriteHead(unsigned char* to, std::uint8_t dimension, const Name& name) {
   return {to, HeadSize(name)};
 }
 
-bool IsWhole(const Content& content, int depth) {
+bool WholeShape::IsWhole(const Content& content, int depth) {
+  const unsigned char* const data = content.data().data();
+  if (content.shape().data() == shape_ && depth >= depth_) {
+    return std::all_of(texts_.begin(), texts_.end(), [data](const Text& text) {
+      return IsTerminatedText(data + text.place, text.bytes);
+    });
+  }
+  shape_ = nullptr;
+  texts_.clear();
+  if (!LookInto(content, depth, data)) return false;
+  shape_ = content.shape().data();
+  depth_ = depth;
+  return true;
+}
+
+bool WholeShape::LookInto(const Content& content, int depth, const unsigned char* data) {
   if (depth < 0) return false;
   for (Part values = content.values(); !values.shapes.empty();) {
-    if (!TakeValue(values)) return false;
+    const ValueRecord found = TakeValue(values);
+    if (!found) return false;
+    const Value value = found.value();
+    if (value.elementSize != 0) continue;
+    texts_.push_back({static_cast<std::size_t>(value.data - data), value.dataSize});
   }
   for (Part keys = content.keys(); !keys.shapes.empty();) {
     const KeyRecord sub = TakeKey(keys);
-    if (!sub || !IsWhole(sub.content(), depth - 1)) return false;
+    if (!sub || !LookInto(sub.content(), depth - 1, data)) return false;
   }
   return true;
 }

@@ -287,8 +287,26 @@ inline std::size_t HeadSize(const Name& name) { return kKeyHeader + name.bytes; 
 /// \param to room for HeadSize() bytes
 Bytes WriteHead(unsigned char* to, std::uint8_t dimension, const Name& name);
 
-/// True when everything that a key holds is whole, no more than `depth` levels deep.
-bool IsWhole(const Content& content, int depth);
+/// Tells whether everything that a key holds is whole. Of many keys in turn most have one shape, of
+/// which only the texts are looked at then.
+class WholeShape {
+ public:
+  /// \param content in memory that lives as long as this
+  /// \param depth so many levels deep at most
+  bool IsWhole(const Content& content, int depth);
+
+ private:
+  struct Text {
+    std::size_t place;
+    std::size_t bytes;
+  };
+
+  bool LookInto(const Content& content, int depth, const unsigned char* data);
+
+  const unsigned char* shape_ = nullptr;  ///< that of the last one which was whole
+  int depth_ = 0;                         ///< the same
+  std::vector<Text> texts_;               ///< in its data
+};
 
 inline void AppendBytes(Buffer& to, Bytes bytes) {
   to.insert(to.end(), bytes.begin(), bytes.end());

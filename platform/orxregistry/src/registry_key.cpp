@@ -104,7 +104,7 @@ void TGenericRegistryKey::LookInto() const {
 
 KeyBytes TGenericRegistryKey::GetBytes() const {
   const record::Content* const content = imp_ ? imp_->tree->ContentAsLoaded(*imp_) : nullptr;
-  if (!content) return {};
+  if (!content || !imp_->tree->IsWhole(*content, *imp_)) return {};
   return {content->shape().data(), content->data().data()};
 }
 

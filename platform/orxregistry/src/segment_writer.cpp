@@ -64,7 +64,8 @@ FileGrowth::Shapes::value_type* FileGrowth::Put(Bytes shape, std::uint64_t at, s
 }
 
 EntryBounds FileGrowth::BoundsOf(Shape& shape, const record::Content& content) const {
-  if (!shape.places) shape.places.emplace(areas_, content);
+  // An entry that is damaged does not tell where others of its shape have their areas.
+  if (!shape.places || !shape.places->HasAny()) shape.places.emplace(areas_, content);
   return shape.places->BoundsIn(content.data());
 }
 

@@ -69,7 +69,7 @@ class SegmentWriter {
   void AddEntry(record::Bytes head, const record::Content& content);
   /// \param superseded as in format::SegmentHeader
   /// \param addsEntriesOnly false: it holds something else, or an entry that the file has already,
-  ///     so that the file has no index from now on
+  ///     so that the file has no index until it is written afresh
   void Finish(std::uint64_t superseded, bool addsEntriesOnly);
 
  private:

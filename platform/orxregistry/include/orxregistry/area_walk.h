@@ -29,7 +29,7 @@ class ORXREGISTRY_EXPORT TAreaWalk {
 
   /// \param fileName the file; one that cannot be read has no entries
   /// \param areas those that its entries should have
-  /// \param area which of them `mayHold` is asked about
+  /// \param area which of them `mayHold` is asked about, below their number
   /// \param mayHold asked about each item of the index that is come upon
   TAreaWalk(const COrxStringT<wchar_t>& fileName, const EntryAreas& areas, std::size_t area,
             MayHold mayHold);

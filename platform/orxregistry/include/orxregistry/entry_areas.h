@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -13,10 +14,12 @@ struct EntryArea {
   std::u16string value;                ///< the value in it
   std::uint32_t bytes = 0;             ///< the value's size, at least four doubles
   std::vector<std::u16string> needed;  ///< values without which the sub-key says nothing
+  bool isZeroUnknown = false;          ///< an extent of 0 stands for something else
 
   /// True when all of both is the same.
   friend bool operator==(const EntryArea& a, const EntryArea& b) {
-    return a.key == b.key && a.value == b.value && a.bytes == b.bytes && a.needed == b.needed;
+    return a.key == b.key && a.value == b.value && a.bytes == b.bytes &&
+           a.isZeroUnknown == b.isZeroUnknown && a.needed == b.needed;
   }
 };
 

@@ -74,10 +74,11 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
              const void* stringLookup, bool openExisting, unsigned flags);
   ~TInFileKey() override;
 
-  /// Appends what changed since the last save to the tree's own file, which is made for a new tree,
-  /// or writes the file afresh when more than half of it is superseded. Durable when it returns
-  /// true. When it returns false, what was durable stays loadable and the tree keeps its changes
-  /// for another try; KeptFileError() tells what the system said.
+  /// Appends what changed since the last save to the tree's own file, which is made for a new tree.
+  /// The file is written afresh when more than half of it is superseded, and when its index would
+  /// end, as what changed is more than new entries. Durable when it returns true. When it returns
+  /// false, what was durable stays loadable and the tree keeps its changes for another try;
+  /// KeptFileError() tells what the system said.
   /// \param flag no meaning here
   /// \param registryVersion kRegistryVersion
   bool Save(bool flag, unsigned registryVersion);
@@ -89,10 +90,10 @@ class ORXREGISTRY_EXPORT TInFileKey : public TInKey {
   /// \param registryVersion kRegistryVersion
   bool Save(const COrxStringT<wchar_t>& fileName, bool flag, unsigned registryVersion);
 
-  /// Has the files that this tree is written to find their entries by areas. For a tree without a
-  /// file.
-  /// \param areas at most kMaxEntryAreas, all their names together of at most 2000 characters
-  /// \return false when they are more, or make no sense; the tree is then as it was
+  /// Has the files that this tree is written to find their entries by areas.
+  /// \return false when the tree has a file, or the areas are more than kMaxEntryAreas, make no
+  /// sense
+  ///     or have names of more than 4000 bytes together; the tree is then as it was
   bool IndexBy(const EntryAreas& areas);
 
   /// True when the tree has changes that no save has made durable.

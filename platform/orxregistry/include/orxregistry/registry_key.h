@@ -112,7 +112,8 @@ class ORXREGISTRY_EXPORT TGenericRegistryKey {
   /// Looks at everything in the key: damage shows only then, in the tree's error state.
   void LookInto() const;
 
-  /// For an entry of a file, until the tree is changed.
+  /// For an entry of a file that is whole and one record there; none for any other key, and once
+  /// the tree has been changed.
   KeyBytes GetBytes() const;
 
   /// The names of the values, for a look at a file whose content is not known beforehand.
