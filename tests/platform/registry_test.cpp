@@ -269,13 +269,14 @@ TEST(RegistryFile, ThatWasPutInThePlaceOfAnotherGetsWhatIsSavedWhereItBelongs) {
   const auto save = [&](orx::TInFileKey& other) {
     file.SetBytes(old);
     TCSInFileKey tree = file.Load();
+    Open(RootOf(tree), L"second").AddValue(L"value", RawValue::Block("x"), 1, true);
     RegistryFile::AddEntry(tree, L"S_1", "saved");
     std::filesystem::remove(file.path);
     EXPECT_TRUE(other.Save(file.Name(), false, orx::kRegistryVersion));
     EXPECT_TRUE(tree.Save(false, orx::kRegistryVersion));
     return Describe(file.Load());
   };
-  const std::string saved = "container(0 S_1(0 value=1:1:saved))";
+  const std::string saved = "second(0 value=1:1:x) container(0 S_1(0 value=1:1:saved))";
   TCSInFileKey empty = RegistryFile::New();
   EXPECT_EQ(save(empty), "(0 " + saved + ")");
   TCSInFileKey other = RegistryFile::New();
