@@ -80,9 +80,7 @@ Buffer MakeSegment(KeyTree& tree, const std::optional<FileContent>& others, File
   // A file in the place of another may have its entries in another key, or in none.
   const KeyTree::Key* const container = others ? tree.FindContainer(*others) : tree.Container();
   bool addsOnly = container && tree.AddsEntriesOnly(*container);
-  if (addsOnly && others) {
-    addsOnly = others->container && !HoldsAnyOf(*others, tree.UnsavedIn(*container));
-  }
+  if (addsOnly && others) addsOnly = !HoldsAnyOf(*others, tree.UnsavedIn(*container));
   Buffer segment;
   SegmentWriter writer(*at.growth, segment, at.end);
   if (!addsOnly) tree.WriteUnsavedTree(writer, container);

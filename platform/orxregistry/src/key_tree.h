@@ -81,11 +81,11 @@ class VisitedValues {
 ///
 /// What always holds: A key is what its layers make when they are laid over one another in their
 /// order, the entries of the file behind those of the first key below the root, and nothing is ever
-/// taken out of it. Records lie in the file's bytes, in `memory_`, or in
-/// the trees of `lenders_`, and stay there as long as the tree does. A list of values or of
-/// sub-keys is either not there, or growing while its layers are taken apart, or whole; only a
-/// whole one gets what is new, and the places in it do not move. Whatever is not in the file is
-/// pending, with all keys above it. A tree with an error is only read.
+/// taken out of it. Records lie in the file's bytes, in `memory_`, or in the trees of `lenders_`,
+/// and stay there as long as the tree does. A list of values or of sub-keys is either not there, or
+/// growing while its layers are taken apart, or whole; only a whole one gets what is new, and the
+/// places in it do not move. Whatever is not in the file is pending, with all keys above it. A tree
+/// with an error is only read.
 class KeyTree : public std::enable_shared_from_this<KeyTree> {
  public:
   using Key = TGenericRegistryKeyImp;
@@ -97,6 +97,8 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   KeyTree& operator=(const KeyTree&) = delete;
 
   Key& root() { return *root_; }
+  /// The first key below the root, whose sub-keys are the tree's entries; null when there is none.
+  Key* Container();
   /// The sub-keys of a key, in their order.
   const std::pmr::vector<Key*>& Keys(Key& key) { return TakeKeys(key).items(); }
   const std::pmr::vector<record::ValueRecord>& Values(Key& key) { return TakeValues(key).items(); }
@@ -129,16 +131,18 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
   bool SetValue(Key& key, const record::Value& value);
   /// Lays a key of this or another tree over a key of this one.
   void DeepCopy(Key& to, Key& from);
+  /// True when some of the tree lies in the memory of trees that it was copied from.
+  bool HasBorrowed() const { return !lenders_.empty(); }
+  /// Makes a key that is not among the sub-keys of the one above it.
+  /// \param memory in which the record lies
+  Key& MakeLoose(Key& above, record::KeyRecord record, record::Buffer memory);
 
   /// True from the first change until MarkSaved().
   bool HasUnsaved() const { return pending_.Any(); }
   /// Bytes of saved values that unsaved ones replace.
   std::uint64_t superseded() const { return pending_.superseded(); }
-  /// The first key below the root, whose sub-keys are the tree's entries; null when there is none.
-  Key* Container();
-  /// The key whose sub-keys are the entries of a file: that of the same name as its first below the
-  /// root, or the tree's own when the file has none.
-  /// \return null when the tree has no such key
+  /// The key whose sub-keys are the entries of a file: that of the name of its first below the
+  /// root. \return null when the file or the tree has no such key
   const Key* FindContainer(const FileContent& file);
 
   // What is not saved, of which there is something. The container is the key whose sub-keys are the
@@ -154,11 +158,6 @@ class KeyTree : public std::enable_shared_from_this<KeyTree> {
 
   void WriteAll(SegmentWriter& to);
   void MarkSaved() { pending_.Clear(); }
-  /// Makes a key that is not among the sub-keys of the one above it.
-  /// \param memory in which the record lies
-  Key& MakeLoose(Key& above, record::KeyRecord record, record::Buffer memory);
-  /// True when some of the tree lies in the memory of trees that it was copied from.
-  bool HasBorrowed() const { return !lenders_.empty(); }
 
   /// What the tree was loaded from.
   FileContent& content() { return content_; }
