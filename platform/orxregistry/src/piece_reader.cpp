@@ -11,7 +11,8 @@ using record::Buffer;
 using record::Bytes;
 
 constexpr std::size_t kBlock = 4096;
-/// Enough for most pieces of their kind.
+/// Enough for most pieces of their kind; a tree without entries is small.
+constexpr std::size_t kExpectedTree = 1024;
 constexpr std::size_t kExpectedEntry = 1024;
 constexpr std::size_t kExpectedShape = 2048;
 
@@ -91,7 +92,7 @@ bool PieceReader::ReadStart(FileContent& content) {
   fanOut_ = content.header.fanOut;
   areas_ = content.header.areas.size();
   const std::uint64_t segmentAt = start_.size() - rest.size();
-  auto tree = ReadPiece(segmentAt + format::kSegmentHeader, PieceKind::kTree, kBlock);
+  auto tree = ReadPiece(segmentAt + format::kSegmentHeader, PieceKind::kTree, kExpectedTree);
   const auto root = tree ? record::SplitContent(tree->piece.content) : std::nullopt;
   if (!root) return false;
   record::Part keys = root->keys();
