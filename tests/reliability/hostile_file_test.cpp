@@ -10,8 +10,10 @@
 #include <unistd.h>
 #endif
 
+#include <cmath>
 #include <functional>
 
+#include "fleet.h"
 #include "fuzz/record_tree.h"
 #include "platform/registry_fixture.h"
 #include "velta/rtcm_generator.h"
@@ -134,6 +136,113 @@ TEST_P(HostileFile, IsAnsweredInBoundedTimeAndMemory) {
   const auto allowed = memory * static_cast<double>(size) + kMaxExtraMemory;
   if (kMemoryIsOurs) {
     EXPECT_LT(used, allowed) << "bytes";
+  }
+}
+
+/// A file whose index leads to entries each of which has a shape of its own, as large as it may be:
+/// a shape ends where its entry begins, so each contains those behind it and the entries up to its
+/// own.
+class NestedShapes {
+ public:
+  explicit NestedShapes(std::size_t entries) {
+    velta_fuzz::File start{{}, AreasOfDatums(), 1024, {SegmentOf(Key{0, "", {}, {{}}})}};
+    start.segments[0].pieces.resize(1);
+    bytes_ = PutTogether(start);
+    const std::uint64_t segmentAt = velta_fuzz::TakeApart(bytes_).segments[0].at;
+    const std::uint64_t shapes = bytes_.size();
+    bytes_.append(entries * kShape, '\0');
+    std::vector<std::uint64_t> places;
+    for (std::size_t i = 0; i < entries; ++i) {
+      places.push_back(AddPiece(velta_fuzz::EntryOf(shapes + i * kShape, kEntry)));
+    }
+    for (std::size_t i = entries; i-- > 0;) PutShape(shapes + i * kShape, places[i]);
+    const std::uint64_t root = AddNode(places);
+    velta_fuzz::Piece trailer{velta_fuzz::kTrailer, {}, 0};
+    for (const std::uint64_t place : {segmentAt, root, bytes_.size() + 40}) {
+      velta_fuzz::Append(trailer.content, place);
+    }
+    AddPiece(trailer);
+  }
+
+  const std::string& bytes() const { return bytes_; }
+
+ private:
+  static std::string AreasOfDatums() {
+    const TemporaryDirectory directory;
+    Fleet fleet((directory / "").wstring());
+    fleet.Ingest(0);
+    return velta_fuzz::TakeApart(ReadBytes(fleet.datums)).areas;
+  }
+
+  std::uint64_t AddPiece(const velta_fuzz::Piece& piece) {
+    const std::uint64_t at = bytes_.size();
+    std::string checked;
+    velta_fuzz::Append(checked, std::uint64_t{piece.content.size()} << 8 | piece.kind);
+    checked += piece.content;
+    velta_fuzz::Append(bytes_, velta_fuzz::Checksum(checked, at));
+    bytes_ += checked;
+    return at;
+  }
+
+  /// A shape like that of the entries, but for one more sub-key that takes the rest.
+  void PutShape(std::uint64_t at, std::uint64_t end) {
+    std::string start;
+    velta_fuzz::Append(start, (end - at - 16) << 8 | velta_fuzz::kShape);
+    for (const std::uint64_t size : {std::uint64_t{0}, end - at - 48, std::uint64_t{0}}) {
+      velta_fuzz::Append(start, size);
+    }
+    velta_fuzz::Append(start, std::uint64_t{kArea.size()});
+    start += velta_fuzz::HeadOf(kEntry.keys[0]) + ContentOf(kEntry.keys[0]).shape;
+    bytes_.replace(at + 8, start.size(), start);
+    std::string checksum;
+    const std::string_view checked = std::string_view(bytes_).substr(at + 8, end - at - 8);
+    velta_fuzz::Append(checksum, velta_fuzz::Checksum(checked, at));
+    bytes_.replace(at, checksum.size(), checksum);
+  }
+
+  std::uint64_t AddNode(const std::vector<std::uint64_t>& places) {
+    constexpr float kAll[] = {-INFINITY, -INFINITY, INFINITY, INFINITY};
+    velta_fuzz::Piece node{velta_fuzz::kNode, {}, 0};
+    velta_fuzz::Append(node.content, std::uint32_t{0});
+    velta_fuzz::Append(node.content, static_cast<std::uint32_t>(places.size()));
+    for (const std::uint64_t place : places) {
+      velta_fuzz::Append(node.content, place);
+      for (int area = 0; area < 2; ++area) {
+        for (const float edge : kAll) velta_fuzz::Append(node.content, edge);
+      }
+    }
+    return AddPiece(node);
+  }
+
+  static std::string Area() {
+    std::string area;
+    for (const double number : {50.0, 1.0, 50.0, 1.0}) velta_fuzz::Append(area, number);
+    return area;
+  }
+
+  static inline const std::string kArea = Area();  ///< that holds no position
+  static inline const Key kEntry{
+      0,
+      Units(u"e"),
+      {},
+      {{0, Units(u"StandardDatum"), {{32, 1, 1, Units(u"BoundariesStandardDatum"), kArea}}, {}}}};
+  static inline const std::size_t kShape =
+      48 + velta_fuzz::HeadOf(kEntry.keys[0]).size() + ContentOf(kEntry.keys[0]).shape.size();
+
+  std::string bytes_;
+};
+
+TEST(HostileIndex, OfShapesInOneAnotherTakesMemoryByTheFilesSize) {
+  const RegistryFile file;
+  file.SetBytes(NestedShapes(1024).bytes());
+  const auto query = [&] {
+    const orx::cs::velta::RTCMGenerator generator(1, file.Name(), file.Name());
+    EXPECT_FALSE(generator.getRtcmDatumMessage(0.9, 0.15, 0));
+  };
+  const double idle = PeakMemory([] {});
+  const double used = PeakMemory(query) - idle;
+  if (kMemoryIsOurs) {
+    EXPECT_LT(used, kMaxExtraMemory) << "bytes";
   }
 }
 
