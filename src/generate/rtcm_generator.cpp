@@ -9,13 +9,16 @@
 namespace orx::cs::velta {
 namespace {
 
-/// How many of the keys may be datum entries.
+/// How many of the keys may be datum entries: those with the largest value that all have, so that
+/// no small file makes room for many.
 std::size_t CountEntries(const TGenericRegistryKey& container) {
   std::size_t count = 0;
   ShapeMemory memory;
   for (TGenRegKeyIterator walk(container); walk;) {
     memory.GoTo(TGenericRegistryKey(walk++));
-    if (Has(StoredKey(memory).Sub(layout::kStandardDatum), layout::kMethod)) ++count;
+    const StoredKey standard(memory, layout::kStandardDatum);
+    const StoredValue parameters = standard.Find(layout::kDatumParameters.name);
+    if (parameters.bytes == layout::kDatumParameters.kBytes) ++count;
   }
   return count;
 }

@@ -44,11 +44,6 @@ inline TGenericRegistryKey OpenExisting(const TGenericRegistryKey& parent, std::
   return {parent, name, 0, false};
 }
 
-template <class T>
-bool Has(const StoredKey& key, const ValueOf<T>& value) {
-  return static_cast<bool>(key.Find(value.name));
-}
-
 /// Reads a value that must have the type code and the size of its kind.
 /// \return false when it has not; `to` is then as it was
 template <class T>

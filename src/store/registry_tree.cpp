@@ -2,13 +2,9 @@
 
 namespace orx::cs::velta {
 
-TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key) {
-  TGenRegKeyIterator walk(key);
-  return TGenericRegistryKey(walk++);
-}
-
 TGenericRegistryKey ContainerOf(const TInKey& tree) {
-  return FirstSubKey(TGenericRegistryKey(TGenericRegistryKeyPtr(tree)));
+  TGenRegKeyIterator walk{TGenericRegistryKey(TGenericRegistryKeyPtr(tree))};
+  return TGenericRegistryKey(walk++);
 }
 
 void ReadIfLost(TInFileKey& file) {

@@ -9,9 +9,6 @@ namespace orx::cs::velta {
 /// What new trees are described by.
 inline constexpr const wchar_t* kTreeDescription = L"Sylbri RTCM System";
 
-/// The first sub-key, null when there is none.
-TGenericRegistryKey FirstSubKey(const TGenericRegistryKey& key);
-
 /// The container key of a tree: the first under its root; null when there is none.
 TGenericRegistryKey ContainerOf(const TInKey& tree);
 

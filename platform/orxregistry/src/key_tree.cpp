@@ -7,7 +7,6 @@
 namespace orx {
 namespace {
 
-using record::Bytes;
 using record::Content;
 using record::ContentBuffer;
 using record::ContentWriter;

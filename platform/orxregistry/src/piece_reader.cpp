@@ -1,7 +1,6 @@
 #include "piece_reader.h"
 
 #include <algorithm>
-#include <cstring>
 
 namespace orx {
 namespace {
