@@ -26,6 +26,7 @@ void AddMerge(CLI::App& program, Action& action);
 void AddDecode(CLI::App& program, Action& action);
 void AddEncode(CLI::App& program, Action& action);
 void AddDump(CLI::App& program, Action& action);
+void AddTransform(CLI::App& program, Action& action);
 
 /// Tells the user on standard error what failed.
 void ReportFailure(std::string_view what);

@@ -2,7 +2,6 @@
 #include <CLI/Config.hpp>
 #include <CLI/Formatter.hpp>
 #include <memory>
-#include <streambuf>
 #include <string>
 
 #include "angle.h"
@@ -10,6 +9,7 @@
 #include "field_units.h"
 #include "files.h"
 #include "interrupt.h"
+#include "lines.h"
 #include "rtcm3/codec.h"
 #include "rtcm3/json_lines.h"
 #include "rtcm3/message_reader.h"
@@ -64,31 +64,6 @@ int DecodeStream(const Conversion& files) {
   return finish();
 }
 
-/// Reads a line without its end, but no more of it than a message's line can have and one byte.
-/// \return false at the end of the input
-bool ReadLine(std::streambuf& in, std::string& line) {
-  using Traits = std::streambuf::traits_type;
-  line.clear();
-  while (line.size() <= rtcm3::kMaxJsonLine) {
-    const Traits::int_type next = in.sbumpc();
-    if (Traits::eq_int_type(next, Traits::eof())) return !line.empty();
-    const char c = Traits::to_char_type(next);
-    if (c == '\n') return true;
-    line += c;
-  }
-  return true;
-}
-
-/// Passes over what is left of a line.
-void SkipLine(std::streambuf& in) {
-  using Traits = std::streambuf::traits_type;
-  const auto isEnd = [](Traits::int_type next) {
-    return Traits::eq_int_type(next, Traits::eof()) || Traits::to_char_type(next) == '\n';
-  };
-  while (!isEnd(in.sbumpc())) {
-  }
-}
-
 int EncodeLines(const Conversion& files) {
   Input in(files.from);
   Output out(files.to, OutputKind::kFrames, {files.from});
@@ -100,7 +75,7 @@ int EncodeLines(const Conversion& files) {
   };
   FinishWhenInterrupted(finish);
   std::string line;
-  for (std::size_t number = 1; ReadLine(in.buffer(), line); ++number) {
+  for (std::size_t number = 1; ReadLine(in.buffer(), line, rtcm3::kMaxJsonLine); ++number) {
     if (line.find_first_not_of(" \t\r") == std::string::npos) continue;
     try {
       rtcm3::Encode(rtcm3::ParseJsonLine(line), out.pending());

@@ -58,7 +58,7 @@ int Run(std::vector<std::string> arguments) {
   program.require_subcommand(1);
   Action action;
   for (const auto add :
-       {AddIngest, AddList, AddGenerate, AddMerge, AddDecode, AddEncode, AddDump}) {
+       {AddIngest, AddList, AddGenerate, AddTransform, AddMerge, AddDecode, AddEncode, AddDump}) {
     add(program, action);
   }
   if (arguments.size() > 1) RequireCommand(program, arguments[1]);

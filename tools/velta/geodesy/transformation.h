@@ -1,0 +1,84 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "geodesy/area_index.h"
+#include "geodesy/definition.h"
+#include "geodesy/proj_operation.h"
+#include "geodesy/readings.h"
+#include "geodesy/residuals.h"
+
+namespace velta_tool {
+
+/// A position in both systems.
+struct Transformed {
+  Coordinates source;                ///< latitude, longitude, ellipsoidal height
+  Coordinates target;                ///< likewise, with the residuals; the height as `plane` has it
+  std::optional<Coordinates> plane;  ///< northing, easting; nothing without a projection
+  const DatumArea* area = nullptr;
+  const ResidualGrid* grid = nullptr;       ///< null where none covers the position
+  const ResidualGrid* planeGrid = nullptr;  ///< likewise
+};
+
+/// What was left out of the positions that were transformed.
+struct LeftOut {
+  std::uint64_t grids = 0;    ///< positions that no residual grid covers, though there are some
+  std::uint64_t heights = 0;  ///< physical heights that are ellipsoidal, for want of a residual
+};
+
+/// Applies a definition to positions. The first area and the first grid that hold a position are
+/// used, as the library finds them.
+class Transformation {
+ public:
+  explicit Transformation(Definition definition);
+
+  /// \param source latitude, longitude, ellipsoidal height of the source system
+  /// \throws NotTransformable when no area holds the position, and for what cannot be applied
+  Transformed Forward(const Coordinates& source);
+
+  /// \param target northing, easting and height, without a projection latitude, longitude and
+  /// height \throws NotTransformable as above, and when the iteration does not end
+  Transformed Inverse(const Coordinates& target);
+
+  const Definition& definition() const { return definition_; }
+  const LeftOut& leftOut() const { return leftOut_; }
+  /// What the positions so far rest on.
+  const Readings& readings() const { return readings_; }
+
+ private:
+  /// The operations of a shift.
+  struct Operations {
+    ProjOperation datum;
+    std::optional<ProjOperation> projection;
+  };
+  /// They are made when they are needed first; what PROJ refuses is kept as the reason.
+  struct Prepared {
+    std::optional<Operations> operations;
+    std::string refused;
+  };
+
+  const Operations& OperationsOf(const DatumArea& area);
+  const DatumArea& AreaAt(const Coordinates& source, double margin) const;
+  /// The area that holds, but for the shift, a position of the target.
+  const DatumArea& AreaNear(const Coordinates& target);
+  Transformed Apply(const Coordinates& source, double margin);
+  Coordinates Back(const Coordinates& aim, const DatumArea& area);
+  void Note(const Transformed& position);
+  void NoteGrid(const ResidualGrid& grid);
+
+  Definition definition_;
+  AreaIndex areas_;
+  AreaIndex grids_;
+  AreaIndex planeGrids_;
+  ProjContext context_;
+  std::vector<Prepared> prepared_;  ///< by the shifts' indices
+  LeftOut leftOut_;
+  Readings readings_;
+};
+
+}  // namespace velta_tool
