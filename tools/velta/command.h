@@ -27,6 +27,7 @@ void AddDecode(CLI::App& program, Action& action);
 void AddEncode(CLI::App& program, Action& action);
 void AddDump(CLI::App& program, Action& action);
 void AddTransform(CLI::App& program, Action& action);
+void AddExport(CLI::App& program, Action& action);
 
 /// Tells the user on standard error what failed.
 void ReportFailure(std::string_view what);

@@ -57,8 +57,8 @@ int Run(std::vector<std::string> arguments) {
   program.set_version_flag("--version", "velta " VELTA_VERSION);
   program.require_subcommand(1);
   Action action;
-  for (const auto add :
-       {AddIngest, AddList, AddGenerate, AddTransform, AddMerge, AddDecode, AddEncode, AddDump}) {
+  for (const auto add : {AddIngest, AddList, AddGenerate, AddTransform, AddExport, AddMerge,
+                         AddDecode, AddEncode, AddDump}) {
     add(program, action);
   }
   if (arguments.size() > 1) RequireCommand(program, arguments[1]);

@@ -31,8 +31,11 @@ double Flattening(const std::array<double, 2>& axes) { return (axes[0] - axes[1]
 }  // namespace
 
 std::string ProjNumber(double number) {
+  constexpr int kDigits = 15;
   std::array<char, 32> digits;
-  return {digits.data(), std::to_chars(digits.begin(), digits.end(), number).ptr};
+  const auto result =
+      std::to_chars(digits.begin(), digits.end(), number, std::chars_format::general, kDigits);
+  return {digits.data(), result.ptr};
 }
 
 std::string DatumSteps(const DatumShift& shift) {

@@ -15,7 +15,7 @@ struct NotTransformable : std::runtime_error {
   using std::runtime_error::runtime_error;
 };
 
-/// A double as PROJ reads it, to the last bit.
+/// A double as PROJ reads it, without the rounding of its own computation behind the 15th digit.
 std::string ProjNumber(double number);
 
 /// From the source system to the target system.

@@ -1,0 +1,175 @@
+#include <CLI/App.hpp>
+#include <CLI/Config.hpp>
+#include <CLI/Formatter.hpp>
+#include <algorithm>
+#include <memory>
+#include <optional>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+#include "angle.h"
+#include "command.h"
+#include "definition_source.h"
+#include "description.h"
+#include "files.h"
+#include "geodesy/exports.h"
+#include "geodesy/proj_steps.h"
+
+namespace velta_tool {
+namespace {
+
+struct Options {
+  DefinitionSource source;
+  std::string format;
+  std::vector<std::string> files;
+  std::optional<double> latitude;   // degrees
+  std::optional<double> longitude;  // degrees
+  GridFiles grids;
+  std::string output = "-";
+};
+
+/// Sorts the files by their kinds.
+void TakeFiles(Options& options) {
+  for (const std::string& file : options.files) {
+    const bool isDatum = KindOf(file) == FileKind::kDatum;
+    std::string& place = isDatum ? options.source.datum : options.source.projection;
+    if (!place.empty()) {
+      throw CLI::ValidationError("FILE", "one datum file and one projection file at most");
+    }
+    place = file;
+  }
+  if (options.source.datum.empty() && options.source.messages.empty()) {
+    throw CLI::RequiredError("a datum file or --messages");
+  }
+}
+
+/// The datum shift that is to be exported.
+/// \throws std::runtime_error when there is none, or more than one to choose from
+std::size_t ShiftOf(const Definition& definition, const Options& options) {
+  std::optional<std::size_t> chosen;
+  for (const DatumArea& area : definition.areas) {
+    if (options.latitude && !area.area.Inside(*options.latitude / kDegreesPerRadian,
+                                              *options.longitude / kDegreesPerRadian, false)) {
+      continue;
+    }
+    if (!area.shift) {
+      if (!options.latitude) continue;
+      throw std::runtime_error(area.entry + " cannot be used");
+    }
+    if (options.latitude) return *area.shift;
+    if (chosen && chosen != area.shift) {
+      throw std::runtime_error(
+          "areas have different datum shifts: choose one by a position in it, --lat and --lon");
+    }
+    chosen = area.shift;
+  }
+  if (chosen) return *chosen;
+  throw std::runtime_error(options.latitude ? "no area holds the position"
+                                            : "no entry can be used");
+}
+
+void Write(const std::string& bytes, OutputKind kind, const std::string& name,
+           const Options& options) {
+  std::vector<std::string> inputs = options.source.names();
+  Output out(name, kind, inputs);
+  out.pending() = bytes;
+  out.Finish();
+}
+
+void WriteGrids(const Definition& definition, const Options& options, const TellLeftOut& tell) {
+  const GridTiffs grids = MakeGridTiffs(definition, tell);
+  if (grids.horizontal.empty() && grids.vertical.empty()) {
+    throw std::runtime_error("there is no residual grid to export");
+  }
+  const auto write = [&](const std::string& bytes, const std::string& name, const char* kind) {
+    if (name.empty()) {
+      if (!bytes.empty())
+        tell("the " + std::string(kind) + " residuals, for which no file is named");
+    } else if (bytes.empty()) {
+      throw std::runtime_error(name + ": not written: there are no " + kind + " residuals");
+    } else {
+      Write(bytes, OutputKind::kFrames, name, options);
+    }
+  };
+  write(grids.horizontal, options.grids.horizontal, "horizontal");
+  write(grids.vertical, options.grids.vertical, "height");
+}
+
+int Run(const Options& options) {
+  const Definition definition = Read(options.source);
+  const TellLeftOut tell = [&](std::string_view what) {
+    ReportNote("not in the " + options.format + ": " + std::string(what));
+  };
+  if (options.format == "gtg") {
+    WriteGrids(definition, options, tell);
+    return kDone;
+  }
+  std::string text;
+  if (options.format == "geojson") {
+    text = GeoJson(definition, tell);
+  } else {
+    const std::size_t shift = ShiftOf(definition, options);
+    text = options.format == "wkt" ? Wkt(definition, shift, tell)
+                                   : ProjPipeline(definition, shift, options.grids, tell);
+  }
+  Write(text, OutputKind::kText, options.output, options);
+  return kDone;
+}
+
+}  // namespace
+
+void AddExport(CLI::App& program, Action& action) {
+  const auto options = std::make_shared<Options>();
+  CLI::App* command = program.add_subcommand(
+      "export", "Writes a transformation in a form that other programs read.");
+  command->add_option("FILE", options->files, "a datum file, or one and a projection file")
+      ->check(kDatumOrProjectionFile);
+  command->add_option("--format", options->format, "proj, wkt, gtg or geojson")
+      ->required()
+      ->check(CLI::IsMember({"proj", "wkt", "gtg", "geojson"}));
+  AddMessages(*command, options->source)->excludes("FILE");
+  AddPosition(*command, options->latitude, options->longitude);
+  command
+      ->add_option("--hgrid", options->grids.horizontal,
+                   "GeoTIFF grid of horizontal residuals: gtg writes it, proj names it")
+      ->check(kFileName);
+  command
+      ->add_option("--vgrid", options->grids.vertical, "GeoTIFF grid of height residuals, likewise")
+      ->check(kFileName);
+  command
+      ->add_option("-o,--output", options->output,
+                   "the output of the other forms, \"-\" for standard output")
+      ->check(kFileName)
+      ->capture_default_str();
+  command->footer(
+      "proj     a pipeline for cct and every user of PROJ, with the columns of \"velta "
+      "transform\":\n"
+      "         latitude, longitude in degrees, height in; northing, easting, height out. Grids\n"
+      "         that were exported as gtg are applied when they are named.\n"
+      "wkt      the local system as WKT 2: a projected one, bound to the satellites' system\n"
+      "gtg      the residual grids as GeoTIFF grids of PROJ; windows that share points are joined\n"
+      "geojson  areas, grids and their points with residuals; degrees of the source system\n"
+      "Where the areas of a file have different datum shifts, a position chooses one. What a form\n"
+      "cannot say is told on standard error.\n"
+      "\n"
+      "Example:\n"
+      "  velta ingest --datum-dir . --projection-dir . examples/streams/dhdn.rtcm3\n"
+      "  velta export --format gtg AUTO_DHDN_BESEL.dff --hgrid hor.tif --vgrid ver.tif\n"
+      "  velta export --format proj AUTO_DHDN_BESEL.dff AUTO_DHDN_BESEL.prj --hgrid hor.tif "
+      "--vgrid ver.tif\n"
+      "  velta export --format wkt AUTO_DHDN_BESEL.dff AUTO_DHDN_BESEL.prj\n"
+      "  velta export --format geojson AUTO_DHDN_BESEL.dff");
+  command->callback([&action, options] {
+    TakeFiles(*options);
+    const bool isGrid = options->format == "gtg";
+    const bool hasGrids = !options->grids.horizontal.empty() || !options->grids.vertical.empty();
+    if (isGrid && !hasGrids) throw CLI::RequiredError("--hgrid or --vgrid");
+    if (hasGrids && !isGrid && options->format != "proj") {
+      throw CLI::ValidationError("--format", "only gtg and proj take grids");
+    }
+    action = [options] { return Run(*options); };
+  });
+}
+
+}  // namespace velta_tool
