@@ -4,8 +4,8 @@
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 
-build_packages=(g++ cmake ninja-build ccache libboost-dev libxxhash-dev libcli11-dev
-                nlohmann-json3-dev libgtest-dev)
+build_packages=(g++ cmake ninja-build ccache libboost-dev libxxhash-dev libcli11-dev libgeotiff-dev
+                libproj-dev libtiff-dev nlohmann-json3-dev libgtest-dev)
 windows_packages=(g++-mingw-w64-x86-64-posix googletest wine64)
 
 fail() {

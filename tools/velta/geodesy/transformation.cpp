@@ -18,6 +18,8 @@ constexpr double kEdge = 0.005;
 /// The same for a position that is still to be moved by the datum shift.
 constexpr double kWholeShift = 5000;
 
+constexpr const char* kOutside = "no area holds the position";
+
 template <class Held>
 AreaIndex IndexOf(const std::vector<Held>& held, bool isPlane) {
   std::vector<TRectRgn> areas;
@@ -62,36 +64,48 @@ Transformation::Transformation(Definition definition)
       prepared_(definition_.shifts.size()) {}
 
 Transformed Transformation::Forward(const Coordinates& source) {
-  const Transformed position = Apply(source, 0);
+  const DatumArea* const area = FindArea(source, 0);
+  if (!area) throw NotTransformable(kOutside);
+  const Transformed position = Apply(source, *area, 0);
   Note(position);
   return position;
 }
 
 Transformed Transformation::Inverse(const Coordinates& target) {
+  std::optional<Transformed> found = Reverse(target, 0);
+  // On an edge, where rounding takes a position in and out again.
+  if (!found) found = Reverse(target, kEdge);
+  if (!found) throw NotTransformable("its reverse is not found by iteration");
+  Note(*found);
+  return *found;
+}
+
+std::optional<Transformed> Transformation::Reverse(const Coordinates& target, double margin) {
   constexpr int kMostSteps = 10;
   constexpr double kSameAngle = 1e-12;  // radians
   constexpr double kSameLength = 1e-5;  // metres
   const bool isPlane = definition_.projection.has_value();
   const double same = isPlane ? kSameLength : kSameAngle;
   Coordinates aim = target;
-  const DatumArea* area = nullptr;
+  const DatumArea* area = &AreaNear(target);
   for (int step = 0; step < kMostSteps; ++step) {
-    if (!area) area = &AreaNear(aim);
-    const Transformed reached = Apply(Back(aim, *area), kEdge);
-    area = reached.area;
+    const Coordinates source = Back(aim, *area);
+    area = FindArea(source, margin);
+    if (!area) break;
+    const Transformed reached = Apply(source, *area, margin);
     const Coordinates& at = isPlane ? *reached.plane : reached.target;
     const Coordinates missed = {target.north - at.north, TurnedEast(target.east - at.east, isPlane),
                                 target.height - at.height};
     if (std::abs(missed.north) < same && std::abs(missed.east) < same &&
         std::abs(missed.height) < kSameLength) {
-      Note(reached);
       return reached;
     }
     aim.north += missed.north;
     aim.east += missed.east;
     aim.height += missed.height;
   }
-  throw NotTransformable("its reverse is not found in " + std::to_string(kMostSteps) + " steps");
+  if (!area && margin > 0) throw NotTransformable(kOutside);
+  return std::nullopt;
 }
 
 const Transformation::Operations& Transformation::OperationsOf(const DatumArea& area) {
@@ -119,24 +133,28 @@ const Transformation::Operations& Transformation::OperationsOf(const DatumArea& 
   return *prepared.operations;
 }
 
-const DatumArea& Transformation::AreaAt(const Coordinates& source, double margin) const {
+const DatumArea* Transformation::FindArea(const Coordinates& source, double margin) const {
   const auto found = Find(areas_, source, margin);
-  if (!found) throw NotTransformable("no area holds the position");
-  return definition_.areas[*found];
+  return found ? &definition_.areas[*found] : nullptr;
 }
 
 const DatumArea& Transformation::AreaNear(const Coordinates& target) {
-  if (!definition_.projection) return AreaAt(target, kWholeShift);
-  const auto usable = std::find_if(definition_.areas.begin(), definition_.areas.end(),
-                                   [](const DatumArea& area) { return area.shift.has_value(); });
-  if (usable == definition_.areas.end()) throw NotTransformable("no entry can be used");
-  return AreaAt(OperationsOf(*usable).projection->Inverse(target), kWholeShift);
+  Coordinates near = target;
+  if (definition_.projection) {
+    const auto usable = std::find_if(definition_.areas.begin(), definition_.areas.end(),
+                                     [](const DatumArea& area) { return area.shift.has_value(); });
+    if (usable == definition_.areas.end()) throw NotTransformable("no entry can be used");
+    near = OperationsOf(*usable).projection->Inverse(target);
+  }
+  const DatumArea* const area = FindArea(near, kWholeShift);
+  if (!area) throw NotTransformable(kOutside);
+  return *area;
 }
 
-Transformed Transformation::Apply(const Coordinates& source, double margin) {
+Transformed Transformation::Apply(const Coordinates& source, const DatumArea& area, double margin) {
   Transformed to{source, {}, std::nullopt};
-  to.area = &AreaAt(source, margin);
-  const Operations& operations = OperationsOf(*to.area);
+  to.area = &area;
+  const Operations& operations = OperationsOf(area);
   to.target = operations.datum.Forward(source);
   to.grid = GridAt(grids_, definition_.grids, source, margin);
   double heightResidual = 0;
@@ -155,7 +173,7 @@ Transformed Transformation::Apply(const Coordinates& source, double margin) {
     to.planeGrid = GridAt(planeGrids_, definition_.planeGrids, *to.plane, margin);
     add(to.planeGrid, Coordinates(*to.plane), *to.plane);
   }
-  const std::uint32_t heightIndicator = definition_.shifts[*to.area->shift].heightIndicator;
+  const std::uint32_t heightIndicator = definition_.shifts[*area.shift].heightIndicator;
   if (hasHeightResidual) {
     if (heightIndicator == kPhysicalOfSource) to.target.height = source.height;
     to.target.height += heightIndicator == kGeometricHeight ? heightResidual : -heightResidual;

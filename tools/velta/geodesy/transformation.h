@@ -63,10 +63,14 @@ class Transformation {
   };
 
   const Operations& OperationsOf(const DatumArea& area);
-  const DatumArea& AreaAt(const Coordinates& source, double margin) const;
+  /// \param margin metres by which areas and grids are taken for larger
+  const DatumArea* FindArea(const Coordinates& source, double margin) const;
   /// The area that holds, but for the shift, a position of the target.
   const DatumArea& AreaNear(const Coordinates& target);
-  Transformed Apply(const Coordinates& source, double margin);
+  Transformed Apply(const Coordinates& source, const DatumArea& area, double margin);
+  /// \return nothing when the iteration does not end
+  std::optional<Transformed> Reverse(const Coordinates& target, double margin);
+  /// Without the residuals.
   Coordinates Back(const Coordinates& aim, const DatumArea& area);
   void Note(const Transformed& position);
   void NoteGrid(const ResidualGrid& grid);
