@@ -54,3 +54,4 @@ install(FILES examples/library_usage.cpp DESTINATION ${CMAKE_INSTALL_DOCDIR}/exa
 install(DIRECTORY examples/outside DESTINATION ${CMAKE_INSTALL_DOCDIR}/examples
         COMPONENT development)
 install(DIRECTORY examples/streams DESTINATION ${CMAKE_INSTALL_DOCDIR}/examples COMPONENT program)
+install(FILES examples/positions.txt DESTINATION ${CMAKE_INSTALL_DOCDIR}/examples COMPONENT program)
