@@ -155,7 +155,8 @@ TEST_P(Session, GoesAsItShould) {
   }
 }
 
-INSTANTIATE_TEST_SUITE_P(Of, Session, testing::Values("convert", "files", "ingest"),
+INSTANTIATE_TEST_SUITE_P(Of, Session,
+                         testing::Values("convert", "files", "ingest" SESSIONS_WITH_PROJ),
                          [](const auto& name) { return std::string(name.param); });
 
 /// A 1021 whose indicator has its ten bits in the order of those who number them from the other

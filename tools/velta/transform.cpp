@@ -73,14 +73,13 @@ class Work {
   int Finish() {
     out_.Finish();
     progress_.Clear();
-    const LeftOut& leftOut = transformation_.leftOut();
-    if (leftOut.grids > 0) {
+    if (withoutGrid_ > 0) {
       ReportNote("positions that no residual grid covers, transformed without: " +
-                 std::to_string(leftOut.grids));
+                 std::to_string(withoutGrid_));
     }
-    if (leftOut.heights > 0) {
+    if (ellipsoidalHeights_ > 0) {
       ReportNote("heights that are ellipsoidal, not physical, for want of a height residual: " +
-                 std::to_string(leftOut.heights));
+                 std::to_string(ellipsoidalHeights_));
     }
     if (transformation_.readings().any()) {
       ReportNote(
@@ -107,6 +106,8 @@ class Work {
       const Transformed position = Transform(given);
       options_.json ? AppendJson(given, position) : AppendColumns(given, position);
       ++done_;
+      if (!position.grid && !transformation_.definition().grids.empty()) ++withoutGrid_;
+      if (given.height && position.lacksHeightResidual) ++ellipsoidalHeights_;
     } catch (const std::exception& error) {
       ReportFailure(options_.file + ":" + std::to_string(number_) + ": " + error.what());
       status_ = kFailed;
@@ -192,6 +193,8 @@ class Work {
   std::uint64_t number_ = 0;  ///< of the line
   std::uint64_t bytes_ = 0;
   std::uint64_t done_ = 0;
+  std::uint64_t withoutGrid_ = 0;
+  std::uint64_t ellipsoidalHeights_ = 0;
   int status_ = kDone;
 };
 

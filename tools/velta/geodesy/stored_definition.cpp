@@ -100,9 +100,15 @@ Projection ReadProjection(const StoredKey& standard) {
   return projection;
 }
 
-/// \throws std::runtime_error when a projection is of another ellipsoid than the datum
-void RequireEllipsoid(const std::string& file, const StoredKey& standard,
-                      const Definition& definition) {
+/// Notes that a projection is of another datum.
+/// \throws std::runtime_error when it is of another ellipsoid
+void RequireFit(const std::string& file, const StoredKey& standard, const Definition& definition) {
+  std::wstring datum;
+  if (velta::Read(standard, layout::kDatumName, datum) &&
+      orx::ToUtf8(datum) != definition.targetName) {
+    ReportNote(file + ": the projection is of the datum " + Printable(orx::ToUtf8(datum)) +
+               ", not " + Printable(definition.targetName));
+  }
   constexpr double kSame = 1e-3;  // metres, the step of the messages
   double axes[2];
   if (!velta::Read(standard, layout::kEllipsoid, axes)) return;
@@ -152,7 +158,7 @@ void AddProjectionFile(const std::string& file, Definition& definition) {
           const StoredKey standard(memory, layout::kStandardProjection);
           definition.projection = ReadProjection(standard);
           definition.projection->entry = name;
-          RequireEllipsoid(file, standard, definition);
+          RequireFit(file, standard, definition);
         }
         grids.Add(memory, name);
       });

@@ -178,6 +178,7 @@ Transformed Transformation::Apply(const Coordinates& source, const DatumArea& ar
     if (heightIndicator == kPhysicalOfSource) to.target.height = source.height;
     to.target.height += heightIndicator == kGeometricHeight ? heightResidual : -heightResidual;
   }
+  to.lacksHeightResidual = !hasHeightResidual && heightIndicator != kGeometricHeight;
   if (to.plane) to.plane->height = to.target.height;
   return to;
 }
@@ -209,10 +210,7 @@ void Transformation::Note(const Transformed& position) {
   if (hasHeightResidual) {
     if (shift.heightIndicator == kGeometricHeight) use(Reading::kHeightCorrection);
     if (shift.heightIndicator == kPhysicalOfSource) use(Reading::kHeightOfSource);
-  } else if (shift.heightIndicator != kGeometricHeight) {
-    ++leftOut_.heights;
   }
-  if (!position.grid && !definition_.grids.empty()) ++leftOut_.grids;
   if (position.plane && definition_.projection->type == ProjectionType::OS &&
       !IsPolar(*definition_.projection)) {
     use(Reading::kObliqueStereographic);

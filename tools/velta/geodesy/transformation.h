@@ -1,7 +1,6 @@
 #pragma once
 
 #include <cstddef>
-#include <cstdint>
 #include <memory>
 #include <optional>
 #include <string>
@@ -23,12 +22,8 @@ struct Transformed {
   const DatumArea* area = nullptr;
   const ResidualGrid* grid = nullptr;       ///< null where none covers the position
   const ResidualGrid* planeGrid = nullptr;  ///< likewise
-};
-
-/// What was left out of the positions that were transformed.
-struct LeftOut {
-  std::uint64_t grids = 0;    ///< positions that no residual grid covers, though there are some
-  std::uint64_t heights = 0;  ///< physical heights that are ellipsoidal, for want of a residual
+  /// Physical heights are meant, and no residual made one of the ellipsoidal height.
+  bool lacksHeightResidual = false;
 };
 
 /// Applies a definition to positions. The first area and the first grid that hold a position are
@@ -46,7 +41,6 @@ class Transformation {
   Transformed Inverse(const Coordinates& target);
 
   const Definition& definition() const { return definition_; }
-  const LeftOut& leftOut() const { return leftOut_; }
   /// What the positions so far rest on.
   const Readings& readings() const { return readings_; }
 
@@ -81,7 +75,6 @@ class Transformation {
   AreaIndex planeGrids_;
   ProjContext context_;
   std::vector<Prepared> prepared_;  ///< by the shifts' indices
-  LeftOut leftOut_;
   Readings readings_;
 };
 
