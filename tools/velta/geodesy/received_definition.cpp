@@ -90,8 +90,9 @@ void ReceivedDefinition::AddArea(const velta::MsgUtilized& records, const std::s
   const bool isSame = before.shift == shift &&
                       before.area.northExtent == received.area.northExtent &&
                       before.area.eastExtent == received.area.eastExtent;
-  if (!isSame) ++changes_;
+  if (isSame) return;
   before = received;
+  ++changes_;
 }
 
 void ReceivedDefinition::AddGrid(ResidualGrid grid, std::map<std::string, std::size_t>& known,
