@@ -16,11 +16,16 @@ fail() {
 # step LABEL COMMAND...: says what is done and how many seconds it took; what the command prints is
 # shown only when it fails, which ends the script. It stays in build/SCRIPT.log until the next.
 step() {
-  local label=$1 started=$SECONDS log=build/${0##*/}.log
+  local label=$1 started=$SECONDS log=build/${0##*/}.log status
   shift
   mkdir -p build
   printf '%s ... ' "$label"
-  if ! "$@" >"$log" 2>&1 </dev/null; then
+  # Not as a condition: there the first failure inside a function would not end it.
+  set +e
+  (set -e; "$@") >"$log" 2>&1 </dev/null
+  status=$?
+  set -e
+  if [ "$status" != 0 ]; then
     printf 'failed\n'
     cat "$log" >&2
     fail "$label: failed"
