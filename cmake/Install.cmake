@@ -8,9 +8,8 @@ include(CMakePackageConfigHelpers)
 set(platform_libraries orxutils userdirs projmath orxregistry)
 set(package_directory ${CMAKE_INSTALL_LIBDIR}/cmake/velta)
 set(velta_libraries velta velta-rtcm3)
-set_target_properties(${platform_libraries} ${velta_libraries} RTCMGridHost PROPERTIES
-  INSTALL_RPATH "$ORIGIN")
 set_target_properties(${platform_libraries} ${velta_libraries} PROPERTIES
+  INSTALL_RPATH "$ORIGIN"
   VERSION ${PROJECT_VERSION}
   SOVERSION ${PROJECT_VERSION_MAJOR})
 
@@ -26,9 +25,13 @@ foreach(export orx velta)
   install(EXPORT ${export}Targets NAMESPACE ${export}:: DESTINATION ${package_directory}
           COMPONENT development)
 endforeach()
-# Found at run time beside the library that asks for it.
+# Found at run time: on Windows beside the library that asks for it, elsewhere in a directory of this
+# release, as its name has no version and the libraries of another release may lie beside these.
+set(module_directory velta/${PROJECT_VERSION_MAJOR})
+target_compile_definitions(orxutils PRIVATE ORXUTILS_MODULE_DIRECTORY="${module_directory}")
+set_target_properties(RTCMGridHost PROPERTIES INSTALL_RPATH "$ORIGIN/../..")
 install(TARGETS RTCMGridHost COMPONENT library
-        LIBRARY DESTINATION $<IF:$<BOOL:${WIN32}>,${CMAKE_INSTALL_BINDIR},${CMAKE_INSTALL_LIBDIR}>)
+        LIBRARY DESTINATION $<IF:$<BOOL:${WIN32}>,${CMAKE_INSTALL_BINDIR},${CMAKE_INSTALL_LIBDIR}/${module_directory}>)
 
 install(TARGETS velta-tool EXPORT veltaProgramTargets RUNTIME COMPONENT program)
 install(EXPORT veltaProgramTargets NAMESPACE velta:: DESTINATION ${package_directory}

@@ -25,19 +25,36 @@ fs::path PlainName(const COrxStringT<wchar_t>& name) {
   return path.extension() == L".dll" ? path.replace_extension() : path;
 }
 
+/// The directory of the file that holds the code at an address; empty when the system cannot tell.
+fs::path DirectoryOf(const void* code) {
+  std::error_code unknown;
+  return dll::symbol_location_ptr(code, unknown).parent_path();
+}
+
+/// The library's file beside its asker or among those of this release; empty when it is in neither.
+fs::path Find(const fs::path& plainName, const void* asker) {
+  const void* const self = reinterpret_cast<const void*>(&DirectoryOf);
+  for (const fs::path& directory :
+       {DirectoryOf(asker), DirectoryOf(self) / ORXUTILS_MODULE_DIRECTORY}) {
+    if (directory.empty()) continue;  // the current directory is nobody's place
+    fs::path file = dll::shared_library::decorate(directory / plainName);
+    std::error_code unknown;
+    if (fs::exists(file, unknown)) return file;
+  }
+  return {};
+}
+
 }  // namespace
 
 TDLLFuncWrapper TDLLFuncLoader::LoadDLL(const COrxStringT<wchar_t>& name) {
   const void* const asker = __builtin_return_address(0);
   auto library = std::make_unique<Library>();
   std::error_code error;
-  const fs::path directory = dll::symbol_location_ptr(asker, error).parent_path();
-  const fs::path beside = dll::shared_library::decorate(directory / PlainName(name));
-  if (!error && fs::exists(beside, error)) {
-    library->module.load(beside, dll::load_mode::default_mode, error);
+  const fs::path file = Find(PlainName(name), asker);
+  if (!file.empty()) {
+    library->module.load(file, dll::load_mode::default_mode, error);
     if (error) library->status = kNotLoadable;
   } else {
-    error.clear();
     library->module.load(PlainName(name),
                          dll::load_mode::append_decorations | dll::load_mode::search_system_folders,
                          error);

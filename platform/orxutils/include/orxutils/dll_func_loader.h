@@ -20,7 +20,8 @@ class ORXUTILS_EXPORT TDLLFuncLoader {
   static constexpr std::int32_t kNotLoadable = static_cast<std::int32_t>(0x8007000B);
 
   /// Loads a library by the name that Windows uses ("Name.dll"), which becomes the platform's own
-  /// ("libName.so"). Looks beside the library that calls this, then where the system looks.
+  /// ("libName.so"). Looks beside the library that calls this, then where those lie that only this
+  /// release loads, then where the system looks.
   /// \return the loader, or null when there is no such library
   static TDLLFuncWrapper LoadDLL(const COrxStringT<wchar_t>& name);
 
