@@ -49,6 +49,7 @@ write_basic_package_version_file(${CMAKE_BINARY_DIR}/veltaConfigVersion.cmake
 install(FILES ${CMAKE_BINARY_DIR}/veltaConfig.cmake ${CMAKE_BINARY_DIR}/veltaConfigVersion.cmake
         DESTINATION ${package_directory} COMPONENT development)
 
+install(FILES cmake/copyright DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT program)
 install(FILES README.md CONTRIBUTING.md DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT development)
 install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT development
         FILES_MATCHING PATTERN *.md)
