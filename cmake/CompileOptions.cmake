@@ -22,6 +22,23 @@ if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_L
   add_compile_options(-Wno-array-bounds -Wno-stringop-overread)
 endif()
 
+# What is read comes from outside, and is read by other people's programs: an overrun ends the
+# program before it can be used. Windows has the rest of it unasked.
+add_compile_options(-fstack-protector-strong)
+if(WIN32)
+  # In each module, as it would be one more library of the runtime.
+  string(APPEND CMAKE_CXX_STANDARD_LIBRARIES " -l:libssp.a")
+else()
+  include(CheckCXXCompilerFlag)
+  include(CheckPIESupported)
+  check_pie_supported()
+  foreach(flag -fstack-clash-protection -fcf-protection)
+    check_cxx_compiler_flag(${flag} has${flag})
+    add_compile_options($<$<BOOL:${has${flag}}>:${flag}>)
+  endforeach()
+  add_link_options(LINKER:-z,relro,-z,now,-z,noexecstack)
+endif()
+
 # Boost: headers only.
 add_compile_definitions(BOOST_ALL_NO_LIB BOOST_DLL_USE_STD_FS)
 
@@ -30,6 +47,10 @@ if(VELTA_SANITIZE)
   add_compile_options(-fsanitize=${VELTA_SANITIZE} -fno-sanitize-recover=all
                       -fno-omit-frame-pointer)
   add_link_options(-fsanitize=${VELTA_SANITIZE})
+else()
+  # The sanitizers see more than this, and it needs an optimising compiler.
+  add_compile_options($<$<CONFIG:Release,RelWithDebInfo>:-U_FORTIFY_SOURCE>
+                      $<$<CONFIG:Release,RelWithDebInfo>:-D_FORTIFY_SOURCE=3>)
 endif()
 
 find_program(CCACHE ccache)
