@@ -49,6 +49,17 @@ write_basic_package_version_file(${CMAKE_BINARY_DIR}/veltaConfigVersion.cmake
 install(FILES ${CMAKE_BINARY_DIR}/veltaConfig.cmake ${CMAKE_BINARY_DIR}/veltaConfigVersion.cmake
         DESTINATION ${package_directory} COMPONENT development)
 
+# For who builds without CMake, where that is usual.
+if(NOT WIN32)
+  set(pkgconfig_directory ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
+  file(RELATIVE_PATH prefix_from_here /${pkgconfig_directory} /)
+  foreach(library ${velta_libraries})
+    configure_file(cmake/${library}.pc.in ${CMAKE_BINARY_DIR}/${library}.pc @ONLY)
+    install(FILES ${CMAKE_BINARY_DIR}/${library}.pc DESTINATION ${pkgconfig_directory}
+            COMPONENT development)
+  endforeach()
+endif()
+
 install(FILES cmake/copyright DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT program)
 install(FILES README.md CONTRIBUTING.md DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT development)
 install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT development

@@ -59,7 +59,7 @@ else()
   endforeach()
 
   set(CPACK_COMPONENT_LIBRARY_DESCRIPTION "What a program that uses the library needs to run.")
-  set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION "Headers and CMake package of the library.")
+  set(CPACK_COMPONENT_DEVELOPMENT_DESCRIPTION "Headers, CMake package and pkg-config files of the library.")
   set(CPACK_COMPONENT_PROGRAM_DESCRIPTION
       "Reads RTCM 3 streams into datum and projection files and writes RTCM 3 frames.")
 endif()
