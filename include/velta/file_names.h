@@ -1,5 +1,6 @@
 #pragma once
 
+/// \file
 /// How datum and projection files are named, and where they are kept.
 namespace orx::cs::velta {
 

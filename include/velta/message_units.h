@@ -2,6 +2,7 @@
 
 #include <cstdint>
 
+/// \file
 /// The units of the messages' integers (RTCM 10403, data fields 152 to 211), in the units of the
 /// descriptions. Their digits are binding: results agree with other users of the files to the last
 /// bit.

@@ -15,6 +15,7 @@ class TCSInFileKey;
 class TGenericRegistryKey;
 }  // namespace orx
 
+/// The library: message records to entries of datum and projection files, and back.
 namespace orx::cs::velta {
 
 /// Turns received transformation messages into entries of the shared RTCM datum and projection

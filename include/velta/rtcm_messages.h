@@ -4,6 +4,7 @@
 
 #include "orxutils/orx_string.h"
 
+/// \file
 /// Records of the RTCM SC-104 version 3 coordinate-transformation messages 1021 to 1027.
 ///
 /// Every numeric field holds the integer as it travels in the message, in the unit that its

@@ -7,6 +7,7 @@
 #include "rtcm3/field_error.h"
 #include "rtcm3/message.h"
 
+/// The codec: RTCM 3 streams to message records, and back.
 namespace orx::cs::velta::rtcm3 {
 
 /// What a payload turned out to be.

@@ -16,6 +16,7 @@
 /// A name is that of the record's member; what it counts, the member's comment says. The numbers
 /// behind are those of the data fields in the standard, RTCM 10403.
 
+/// \file
 namespace orx::cs::velta::rtcm3 {
 
 /// The values that a field can take.

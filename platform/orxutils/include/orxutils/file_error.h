@@ -4,6 +4,7 @@
 
 #include "orxutils/export.h"
 
+/// \file
 /// Why a file could not be used. Operations on files answer only whether they worked; the first of
 /// the system's calls that failed meanwhile is kept, in each thread its own.
 namespace orx {

@@ -6,6 +6,8 @@
 
 #include "orxutils/export.h"
 
+/// What the libraries stand on: text and file names in any language, trees of keys and values in
+/// files, libraries loaded at run time.
 namespace orx {
 
 /// The wide and the 8-bit string of every interface.

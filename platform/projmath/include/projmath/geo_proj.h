@@ -5,6 +5,7 @@
 
 #include "projmath/export.h"
 
+/// Ellipsoids, rectangles and projections with their parameters.
 namespace orx::cs::projmath {
 
 /// Unit selector of projection parameters: angles in degrees, lengths in metres, plain ratios.
