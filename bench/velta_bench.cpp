@@ -16,6 +16,7 @@
 #include "rtcm3/frame.h"
 #include "rtcm3/message_reader.h"
 #include "sqlite_peer.h"
+#include "transform_work.h"
 #include "velta/rtcm_generator.h"
 #include "workload.h"
 
@@ -286,6 +287,20 @@ void AddDecoding(Suite& suite, std::size_t bytes, int rounds) {
       });
 }
 
+/// Whole runs of the programs, as people start them.
+void AddTransforming(Suite& suite, const fs::path& directory, int rounds) {
+  const TransformWork work(directory);
+  const std::string name = "transform " + std::to_string(kPositions) + " positions";
+  suite.Add(
+      {name, kWindows, "the exported pipeline in cct", 1.0}, {rounds, 1},
+      [work](benchmark::State& state) {
+        for (auto _ : state) work.ByVelta();
+      },
+      [work](benchmark::State& state) {
+        for (auto _ : state) work.ByCct();
+      });
+}
+
 /// Bytes of an entry in a file that got one in each save.
 void AddBytes(Report& report, const Files& files) {
   constexpr double kMost = 1000.0;
@@ -399,6 +414,7 @@ int Run(const Options& options) {
     AddFirstIngestion(report, files);
   }
   AddDecoding(suite, options.quick ? 10'000'000 : 100'000'000, rounds);
+  AddTransforming(suite, options.directory / "transform", rounds);
   benchmark::RunSpecifiedBenchmarks(&report);
   if (sizes.back() > kSmall) AddGrowth(report, sizes.back());
   report.Print();

@@ -21,7 +21,7 @@ class ProjContext {
   ProjContext();
 
   pj_ctx* get() const { return context_.get(); }
-  /// What PROJ said last, or what an error code of it means.
+  /// What PROJ said first since, which is nearest to the cause, or what an error code of it means.
   std::string Reason(int code) const;
   void ForgetReason() { said_->clear(); }
 
