@@ -11,8 +11,14 @@
 #include "description.h"
 #include "geodesy/proj_steps.h"
 #include "geodesy/received_definition.h"
+#include "geodesy/stored_definition.h"
 #include "geodesy/transformation.h"
 #include "rtcm3/message_sets.h"
+#include "support/gff_tree.h"
+#include "support/numbered_set.h"
+#include "support/temporary_directory.h"
+#include "velta/rtcm_data_support.h"
+#include "velta/rtcm_generator.h"
 
 namespace velta_test {
 namespace {
@@ -120,6 +126,68 @@ TEST(AreaIndex, FindsTheFirstAreaThatHoldsAPosition) {
       }
       EXPECT_EQ(index.First(north, east), first) << north << ' ' << east;
     }
+  }
+}
+
+/// Files of which values are lost.
+class StoredDefinition : public testing::Test {
+ protected:
+  static constexpr std::uint32_t kEntries = 20;
+
+  StoredDefinition() {
+    velta::RTCMDataSupport support((directory_ / "").wstring().c_str(), nullptr);
+    for (std::uint32_t number = 0; number < kEntries; ++number) {
+      const NumberedSet set(number);
+      support.ParseDatumMessages(set.datum, &set.grid);
+    }
+    whole_ = ReadGff(file_);
+  }
+
+  /// Writes the file without one of the values of one of its entries.
+  void WriteWithout(std::size_t entry, const char* key, std::size_t value) {
+    Json changed = whole_;
+    Json& values = std::next(changed.back().begin(), 1 + std::ptrdiff_t(entry)).value()[key];
+    lost_ = std::next(values.begin(), std::ptrdiff_t(value % values.size())).key();
+    values.erase(lost_);
+    WriteGff(file_, changed);
+  }
+
+  /// Asks for a position in each of the sets.
+  void ExpectWhatTheLibraryFinds() const {
+    Transformation transformation(ReadDatumFile(file_.string()));
+    const velta::RTCMGenerator generator(1, file_.wstring(), L"");
+    for (std::uint32_t number = 0; number < kEntries; ++number) {
+      SCOPED_TRACE("set " + std::to_string(number) + " without " + lost_);
+      const NumberedSet set(number);
+      const double latitude = set.grid.phi0 * velta::kHalfArcSecond;
+      const double longitude = set.grid.lambda0 * velta::kHalfArcSecond;
+      const bool hasDatum = generator.getRtcmDatumMessage(latitude, longitude, 0) != nullptr;
+      const bool hasGrid = generator.get1023(latitude, longitude, 0) != nullptr;
+      try {
+        const Transformed there = transformation.Forward({latitude, longitude, 0});
+        EXPECT_TRUE(hasDatum);
+        EXPECT_EQ(there.area->entry, orx::ToUtf8(set.EntryName()));
+        EXPECT_EQ(there.grid != nullptr, hasGrid);
+      } catch (const NotTransformable&) {
+        EXPECT_TRUE(!hasDatum || !hasGrid);
+      }
+    }
+  }
+
+ private:
+  TemporaryDirectory directory_;
+  const std::filesystem::path file_ = directory_ / "ROVERS.dff";
+  Json whole_;
+  std::string lost_ = "nothing";
+};
+
+TEST_F(StoredDefinition, FindsWhatTheLibraryFinds) {
+  ExpectWhatTheLibraryFinds();
+  for (std::size_t value = 0; value < 12; ++value) {
+    WriteWithout(value, "StandardDatum", value);
+    ExpectWhatTheLibraryFinds();
+    WriteWithout(value, "TargetDatum", value);
+    ExpectWhatTheLibraryFinds();
   }
 }
 
