@@ -34,11 +34,13 @@ HeightSteps HeightStepsOf(const std::string& grid, std::uint32_t heightIndicator
                 swap + " +step +proj=pop +v_3",
             swap + clear};
   }
-  const char* const sign = heightIndicator == kGeometricHeight ? "1" : "-1";
+  // In kilometres: while it is added it stands where a longitude would, and PROJ turns and refuses
+  // large ones.
+  const char* const kilometres = heightIndicator == kGeometricHeight ? "0.001" : "-0.001";
   return {clear + " +step +proj=push +v_3 +step +proj=set +v_3=0" + read +
-              GridList(grid, kElseNothing) + " +multiplier=" + sign + swap +
+              GridList(grid, kElseNothing) + " +multiplier=" + kilometres + swap +
               " +step +proj=pop +v_3",
-          " +step +proj=push +v_1 +step +proj=axisswap +order=4,2,3,1 +step +proj=affine +s31=1"
+          " +step +proj=push +v_1 +step +proj=axisswap +order=4,2,3,1 +step +proj=affine +s31=1000"
           " +step +proj=pop +v_1" +
               clear};
 }
