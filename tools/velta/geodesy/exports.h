@@ -10,6 +10,9 @@
 /// A definition in the forms of other programs.
 namespace velta_tool {
 
+/// False in a build that writes only what PROJ has no part in: no WKT and no GeoTIFF.
+extern const bool kHasProj;
+
 /// Tells what a form cannot say, by name.
 using TellLeftOut = std::function<void(std::string_view what)>;
 
