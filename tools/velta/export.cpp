@@ -142,12 +142,15 @@ void AddExport(CLI::App& program, Action& action) {
                    "the output of the other forms, \"-\" for standard output")
       ->check(kFileName)
       ->capture_default_str();
+  const std::string withoutProj =
+      "This build has no PROJ: of the forms only proj and geojson are in it.\n\n";
   command->footer(
+      (kHasProj ? "" : withoutProj) +
       "proj     a pipeline for cct and every user of PROJ, with the columns of \"velta "
       "transform\":\n"
       "         latitude, longitude in degrees, height in; northing, easting, height out. Grids\n"
       "         that were exported as gtg are applied when they are named.\n"
-      "wkt      the local system as WKT 2: a projected one, bound to the satellites' system\n"
+      "wkt      the local system as WKT 2: a projected one, bound to WGS 84 by the datum shift\n"
       "gtg      the residual grids as GeoTIFF grids of PROJ; windows that share points are joined\n"
       "geojson  areas, grids and their points with residuals; degrees of the source system\n"
       "Where the areas of a file have different datum shifts, a position chooses one. What a form\n"
