@@ -236,9 +236,14 @@ TRectRgn AreaOf(const Definition& definition, std::size_t shift) {
 
 void TellWhatIsMissing(const Definition& definition, const DatumShift& shift,
                        const TellLeftOut& tell) {
-  const std::string kind = shift.heightIndicator == kGeometricHeight ? "" : " ellipsoidal";
-  tell("heights, which stay the" + kind +
-       " ones of the satellites' system; a position without a height is taken for one of height 0");
+  const bool isPhysical = shift.heightIndicator != kGeometricHeight;
+  if (shift.computationIndicator == kAbridgedMolodenski) {
+    if (isPhysical) tell("physical heights: they are ellipsoidal ones of the local system");
+  } else {
+    tell("heights, which stay " + std::string(isPhysical ? "ellipsoidal, " : "") +
+         "those of the satellites' system; a position without a height is taken for one of height "
+         "0");
+  }
   if (!definition.grids.empty()) tell("the residual grids");
   if (definition.projection && !definition.planeGrids.empty()) tell("the plane grids");
 }
