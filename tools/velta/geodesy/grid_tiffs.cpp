@@ -23,7 +23,6 @@ namespace velta = orx::cs::velta;
 /// So many are named of what may be many; of the others the number is said.
 constexpr std::size_t kMostNamed = 10;
 constexpr double kMillimetres = 1000;  // in a metre
-constexpr double kLeastTold = 0.0001;  // metres
 
 std::string Fixed(double number, int decimals) {
   std::string text;
@@ -168,24 +167,14 @@ std::string HorizontalFile(const Definition& definition, const TellLeftOut& tell
   const JoinedGrids joined = JoinGrids(definition.grids, kind.part);
   TellDifferences(definition.grids, kind, joined, tell);
   const OffsetsInFront offsets(definition);
-  double mostHeight = 0;
-  std::string file =
-      FileOf(definition, kind, joined,
-             [&](const GridPoint& point, const Coordinates& at, std::vector<float>& samples) {
-               const ResidualGrid& grid = definition.grids[point.grid];
-               const Residuals offset =
-                   offsets.At(at, {grid.north[point.point], grid.east[point.point], 0});
-               samples.push_back(static_cast<float>(offset.north * kArcSecondsPerRadian));
-               samples.push_back(static_cast<float>(offset.east * kArcSecondsPerRadian));
-               mostHeight = std::max(mostHeight, std::abs(offset.height));
-             });
-  if (mostHeight >= kLeastTold) {
-    tell(
-        "that horizontal residuals leave heights alone: as PROJ adds them in front of the datum "
-        "shift, heights are up to " +
-        Fixed(mostHeight * kMillimetres, 1) + " mm off");
-  }
-  return file;
+  return FileOf(definition, kind, joined,
+                [&](const GridPoint& point, const Coordinates& at, std::vector<float>& samples) {
+                  const ResidualGrid& grid = definition.grids[point.grid];
+                  const Residuals offset =
+                      offsets.At(at, {grid.north[point.point], grid.east[point.point], 0});
+                  samples.push_back(static_cast<float>(offset.north * kArcSecondsPerRadian));
+                  samples.push_back(static_cast<float>(offset.east * kArcSecondsPerRadian));
+                });
 }
 
 std::string HeightFile(const Definition& definition, const TellLeftOut& tell) {

@@ -43,7 +43,6 @@ Residuals OffsetsInFront::At(const Coordinates& at, const Residuals& residuals) 
     const double east = std::remainder(target.east + residuals.east - moved.east, 2 * kPi);
     offset.north += north;
     offset.east += east;
-    offset.height = moved.height - target.height;
     if (std::abs(north) < kSame && std::abs(east) < kSame) break;
   }
   return offset;

@@ -19,7 +19,7 @@ class OffsetsInFront {
 
   /// \param at latitude and longitude of a grid's point, radians
   /// \param residuals those of the point, radians
-  /// \return the offsets, radians, and how much the datum shift makes of them in height, metres
+  /// \return the offsets, radians
   Residuals At(const Coordinates& at, const Residuals& residuals) const;
 
  private:

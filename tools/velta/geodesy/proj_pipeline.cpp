@@ -16,33 +16,24 @@ std::string GridList(const std::string& file, const char* otherwise) {
   return " +grids=" + (needsQuotes ? '"' + list + '"' : list);
 }
 
-/// What a pipeline does in front of the datum's steps and behind them so that a height residual is
-/// read at the position of the source system and applied to the height that is meant.
-struct HeightSteps {
-  std::string inFront;
-  std::string behind;
-};
-
-/// The residual, or for the source system's heights the height itself, is carried past the datum's
-/// steps as the fourth coordinate.
-HeightSteps HeightStepsOf(const std::string& grid, std::uint32_t heightIndicator) {
-  const std::string swap = " +step +proj=axisswap +order=1,2,4,3";
-  const std::string clear = " +step +proj=set +v_4=0";
-  const std::string read = " +step +proj=vgridshift";
-  if (heightIndicator == kPhysicalOfSource) {
-    return {clear + " +step +proj=push +v_3" + read + GridList(grid, "") + " +multiplier=-1" +
-                swap + " +step +proj=pop +v_3",
-            swap + clear};
+/// The steps that leave the height as the fourth coordinate, where the datum's steps pass it by:
+/// its residual is read at the position of the source system, and the horizontal residuals, which
+/// PROJ adds in front of the datum, leave it alone.
+std::string HeightSteps(const DatumShift& shift, const std::string& grid) {
+  const bool isOfSource = shift.heightIndicator == kPhysicalOfSource && !grid.empty();
+  std::string steps = " +step +proj=set +v_4=0";
+  if (isOfSource) {
+    steps += " +step +proj=push +v_3";
+  } else {
+    steps += " +step +proj=push +v_1 +v_2 +v_3" + DatumSteps(shift) + " +step +proj=pop +v_1 +v_2";
   }
-  // In kilometres: while it is added it stands where a longitude would, and PROJ turns and refuses
-  // large ones.
-  const char* const kilometres = heightIndicator == kGeometricHeight ? "0.001" : "-0.001";
-  return {clear + " +step +proj=push +v_3 +step +proj=set +v_3=0" + read +
-              GridList(grid, kElseNothing) + " +multiplier=" + kilometres + swap +
-              " +step +proj=pop +v_3",
-          " +step +proj=push +v_1 +step +proj=axisswap +order=4,2,3,1 +step +proj=affine +s31=1000"
-          " +step +proj=pop +v_1" +
-              clear};
+  if (!grid.empty()) {
+    // Without a residual the height is that of the target.
+    const char* const otherwise = isOfSource ? "" : kElseNothing;
+    const char* const sign = shift.heightIndicator == kGeometricHeight ? "1" : "-1";
+    steps += " +step +proj=vgridshift" + GridList(grid, otherwise) + " +multiplier=" + sign;
+  }
+  return steps + " +step +proj=axisswap +order=1,2,4,3 +step +proj=pop +v_3";
 }
 
 /// A step a line.
@@ -79,13 +70,13 @@ std::string ProjPipeline(const Definition& definition, std::size_t shiftIndex,
   std::string steps =
       "+proj=pipeline +step +proj=axisswap +order=2,1"
       " +step +proj=unitconvert +xy_in=deg +xy_out=rad";
-  HeightSteps height;
-  if (!grids.vertical.empty()) height = HeightStepsOf(grids.vertical, shift.heightIndicator);
-  steps += height.inFront;
+  const bool hasGrids = !grids.horizontal.empty() || !grids.vertical.empty();
+  if (hasGrids) steps += HeightSteps(shift, grids.vertical);
   if (!grids.horizontal.empty()) {
     steps += " +step +proj=hgridshift" + GridList(grids.horizontal, kElseNothing);
   }
-  steps += DatumSteps(shift) + height.behind;
+  steps += DatumSteps(shift);
+  if (hasGrids) steps += " +step +proj=axisswap +order=1,2,4,3 +step +proj=set +v_4=0";
   steps += definition.projection ? ProjectionSteps(*definition.projection, shift.targetAxes)
                                  : " +step +proj=unitconvert +xy_in=rad +xy_out=deg";
   steps += " +step +proj=axisswap +order=2,1";
