@@ -34,6 +34,10 @@ install(TARGETS RTCMGridHost COMPONENT library
         LIBRARY DESTINATION $<IF:$<BOOL:${WIN32}>,${CMAKE_INSTALL_BINDIR},${CMAKE_INSTALL_LIBDIR}/${module_directory}>)
 
 install(TARGETS velta-tool EXPORT veltaProgramTargets RUNTIME COMPONENT program)
+if(TARGET manual)
+  install(DIRECTORY ${CMAKE_BINARY_DIR}/tools/manual/share/ DESTINATION ${CMAKE_INSTALL_DATAROOTDIR}
+          COMPONENT program)
+endif()
 install(EXPORT veltaProgramTargets NAMESPACE velta:: DESTINATION ${package_directory}
         COMPONENT program)
 

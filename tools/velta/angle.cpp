@@ -124,9 +124,11 @@ std::string DegreesMinutesSeconds(double degrees) {
 
 void AddPosition(CLI::App& command, std::optional<double>& latitude,
                  std::optional<double>& longitude) {
-  auto* north =
-      command.add_option("--lat", latitude, "latitude, degrees")->transform(AngleCheck(kLatitude));
-  auto* east = command.add_option("--lon", longitude, "longitude, degrees")
+  auto* north = command.add_option("--lat", latitude, "latitude")
+                    ->type_name("DEGREES")
+                    ->transform(AngleCheck(kLatitude));
+  auto* east = command.add_option("--lon", longitude, "longitude")
+                   ->type_name("DEGREES")
                    ->transform(AngleCheck(kLongitude));
   north->needs(east);
   east->needs(north);

@@ -96,6 +96,7 @@ CLI::Option* AddMessages(CLI::App& command, DefinitionSource& source) {
   command
       .add_option("--system-id", source.systemId,
                   "System Identification Number of the stream's messages")
+      ->type_name("0.." + std::to_string(kMaxSystemId))
       ->check(CLI::Range(std::uint32_t{0}, kMaxSystemId))
       ->needs(messages);
   return messages;

@@ -146,13 +146,14 @@ void AddExport(CLI::App& program, Action& action) {
       "This build has no PROJ: of the forms only proj and geojson are in it.\n\n";
   command->footer(
       (kHasProj ? "" : withoutProj) +
-      "proj     a pipeline for cct and every user of PROJ, with the columns of \"velta "
-      "transform\":\n"
-      "         latitude, longitude in degrees, height in; northing, easting, height out. Grids\n"
-      "         that were exported as gtg are applied when they are named.\n"
-      "wkt      the local system as WKT 2: a projected one, bound to WGS 84 by the datum shift\n"
-      "gtg      the residual grids as GeoTIFF grids of PROJ; windows that share points are joined\n"
-      "geojson  areas, grids and their points with residuals; degrees of the source system\n"
+      "  proj     a pipeline for cct and every user of PROJ, with the columns of \"velta\n"
+      "           transform\": latitude, longitude in degrees, height in; northing, easting, "
+      "height\n"
+      "           out. Grids that were exported as gtg are applied when they are named.\n"
+      "  wkt      the local system as WKT 2: a projected one, bound to WGS 84 by the datum shift\n"
+      "  gtg      the residual grids as GeoTIFF grids of PROJ; windows that share points are "
+      "joined\n"
+      "  geojson  areas, grids and their points with residuals; degrees of the source system\n"
       "Where the areas of a file have different datum shifts, a position chooses one. What a form\n"
       "cannot say is told on standard error.\n"
       "\n"

@@ -139,7 +139,7 @@ void RequireFile(const std::string& file) {
 }
 
 const CLI::Validator kFileName(
-    [](std::string& name) { return name.empty() ? "the name is empty" : ""; }, "");
+    [](std::string& name) { return name.empty() ? "the name is empty" : ""; }, "FILE");
 const CLI::Validator kDatumFile = KindCheck(ExtensionOf(FileKind::kDatum),
                                             [](FileKind kind) { return kind == FileKind::kDatum; });
 const CLI::Validator kProjectionFile =

@@ -246,14 +246,16 @@ void AddGenerate(CLI::App& program, Action& action) {
                          ->check(kProjectionFile);
   AddPosition(*command, options->latitude, options->longitude);
   datum->needs("--lat")->needs("--lon");
-  auto* northing =
-      command->add_option("--northing", options->northing, "northing for a 1024, metres")
-          ->check(kNumber);
-  auto* easting = command->add_option("--easting", options->easting, "easting for a 1024, metres")
+  auto* northing = command->add_option("--northing", options->northing, "northing for a 1024")
+                       ->type_name("METRES")
+                       ->check(kNumber);
+  auto* easting = command->add_option("--easting", options->easting, "easting for a 1024")
+                      ->type_name("METRES")
                       ->check(kNumber);
   northing->needs(easting)->needs(projection);
   easting->needs(northing);
   command->add_option("--system-id", options->systemId, "System Identification Number")
+      ->type_name("0.." + std::to_string(kMaxSystemId))
       ->check(CLI::Range(0, kMaxSystemId))
       ->capture_default_str();
   command->add_option("-o,--output", options->output, "the output")

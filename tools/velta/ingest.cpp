@@ -431,7 +431,9 @@ void AddIngest(CLI::App& program, Action& action) {
                                             "directory of the projection files (.prj)");
   datumDir->needs(projectionDir)->excludes(dir);
   projectionDir->needs(datumDir)->excludes(dir);
-  for (CLI::Option* const directory : {dir, datumDir, projectionDir}) directory->check(kFileName);
+  for (CLI::Option* const directory : {dir, datumDir, projectionDir}) {
+    directory->check(kFileName)->type_name("DIR");
+  }
   command->add_flag("--json", options->json, "print the result as JSON, one object a line");
   command->footer(
       "A set is a datum message (1021 or 1022) and the messages that it announces, all with the\n"

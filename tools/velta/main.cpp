@@ -3,6 +3,7 @@
 #include <cstdio>
 #include <exception>
 #include <iostream>
+#include <memory>
 #include <sstream>
 #include <stdexcept>
 #include <string>
@@ -14,25 +15,11 @@
 #include "orxregistry/in_file_key.h"
 #include "orxutils/file_funcs.h"
 #include "orxutils/orx_string.h"
+#include "program.h"
 #include "suggestion.h"
 #include "terminal.h"
 
 namespace {
-
-constexpr char kHelp[] =
-    "Turns RTCM 3 coordinate-transformation messages (1021 to 1027) into datum files (.dff) and\n"
-    "projection files (.prj), and these files back into messages.";
-
-constexpr char kFooter[] =
-    "\"velta COMMAND --help\" tells more about a command. As a FILE of messages or of JSON,\n"
-    "\"-\" is standard input; as an output it is standard output.\n"
-    "Exit status: 0 everything was done, 1 something of it failed, 2 a wrong call.\n"
-    "\n"
-    "The examples are typed beside a folder \"examples\": that of the source tree, or a copy of\n"
-    "the package's, share/doc/velta/examples.\n"
-    "\n"
-    "Example: what is in a stream\n"
-    "  velta decode examples/streams/dhdn.rtcm3";
 
 using namespace velta_tool;
 
@@ -51,17 +38,9 @@ void RequireCommand(const CLI::App& program, const std::string& word) {
 }
 
 int Run(std::vector<std::string> arguments) {
-  CLI::App program(kHelp, "velta");
-  program.allow_windows_style_options(false);  // "/" begins a file name
-  program.footer(kFooter);
-  program.set_version_flag("--version", "velta " VELTA_VERSION);
-  program.require_subcommand(1);
   Action action;
-  for (const auto add : {AddIngest, AddList, AddGenerate, AddTransform, AddExport, AddMerge,
-                         AddDecode, AddEncode, AddDump}) {
-    add(program, action);
-  }
-  if (arguments.size() > 1) RequireCommand(program, arguments[1]);
+  const std::unique_ptr<CLI::App> program = MakeProgram(action);
+  if (arguments.size() > 1) RequireCommand(*program, arguments[1]);
   orx::OnAwaitedLock([](const std::wstring& file) {
     ReportNote(orx::ToUtf8(file) + ": waits for another program that holds its lock");
   });
@@ -69,11 +48,11 @@ int Run(std::vector<std::string> arguments) {
     // Takes them from the last to the first, without the program's name.
     std::reverse(arguments.begin(), arguments.end());
     if (!arguments.empty()) arguments.pop_back();
-    program.parse(std::move(arguments));
+    program->parse(std::move(arguments));
   } catch (const CLI::ParseError& error) {
     std::ostringstream out;
     std::ostringstream err;
-    const int status = program.exit(error, out, err);
+    const int status = program->exit(error, out, err);
     if (!(std::cout << out.str() << std::flush)) {
       throw std::runtime_error("standard output: cannot be written");
     }
