@@ -13,6 +13,7 @@
 #include <memory>
 #include <string>
 
+#include "completions.h"
 #include "man_page.h"
 #include "program.h"
 
@@ -36,6 +37,11 @@ void WriteAll(const fs::path& share, const std::string& date) {
   };
   writePage(*program);
   for (const CLI::App* const command : program->get_subcommands({})) writePage(*command);
+  Write(share / "bash-completion" / "completions" / "velta",
+        velta_manual::BashCompletion(*program));
+  Write(share / "zsh" / "vendor-completions" / "_velta", velta_manual::ZshCompletion(*program));
+  Write(share / "fish" / "vendor_completions.d" / "velta.fish",
+        velta_manual::FishCompletion(*program));
 }
 
 }  // namespace
