@@ -9,10 +9,13 @@
 namespace velta_tool {
 
 void ReportFailure(std::string_view what) {
+  ClearLine();
   std::cerr << WithoutControls("velta: " + std::string(what) + '\n');
 }
 
-void ReportNote(std::string_view what) { ReportFailure("note: " + std::string(what)); }
+void ReportNote(std::string_view what) {
+  if (!IsQuiet()) ReportFailure("note: " + std::string(what));
+}
 
 std::string CodeText(orx::cs::velta::ResultCode code) {
   char text[sizeof "0x00000000"];

@@ -32,7 +32,8 @@ void AddExport(CLI::App& program, Action& action);
 /// Tells the user on standard error what failed.
 void ReportFailure(std::string_view what);
 
-/// Tells the user on standard error what is worth knowing, though nothing failed.
+/// Tells the user on standard error what is worth knowing, though nothing failed; but not one who
+/// wants to know failures only.
 void ReportNote(std::string_view what);
 
 /// A result code as eight hexadecimal digits after "0x".

@@ -1,6 +1,7 @@
 #include <CLI/App.hpp>
 #include <CLI/Config.hpp>
 #include <CLI/Formatter.hpp>
+#include <cstdint>
 #include <memory>
 #include <string>
 
@@ -46,7 +47,7 @@ int DecodeStream(const Conversion& files) {
       out.FlushIfLarge();
     }
     counts.frames.frames > 0 ? out.Finish() : out.Discard();
-    progress.Clear();
+    ClearLine();
     notes.Tell();
     if (PassedOver(counts)) ReportNote(files.from + ": " + Summary(counts));
     if (counts.shortMessages > 0) {
@@ -67,15 +68,20 @@ int DecodeStream(const Conversion& files) {
 int EncodeLines(const Conversion& files) {
   Input in(files.from);
   Output out(files.to, OutputKind::kFrames, {files.from});
+  Progress progress;
+  std::uint64_t bytes = 0;
   int status = kDone;
   bool hasFrames = false;
   const auto finish = [&] {
+    ClearLine();
     status == kDone || hasFrames ? out.Finish() : out.Discard();
     return status;
   };
   FinishWhenInterrupted(finish);
   std::string line;
   for (std::size_t number = 1; ReadLine(in.buffer(), line, rtcm3::kMaxJsonLine); ++number) {
+    bytes += line.size() + 1;
+    progress.Show(bytes);
     if (line.find_first_not_of(" \t\r") == std::string::npos) continue;
     try {
       rtcm3::Encode(rtcm3::ParseJsonLine(line), out.pending());

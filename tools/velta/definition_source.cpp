@@ -3,6 +3,7 @@
 #include <map>
 #include <stdexcept>
 
+#include "busy.h"
 #include "command.h"
 #include "conversion/message_fields.h"
 #include "files.h"
@@ -45,7 +46,7 @@ Systems ReadSystems(const std::string& stream) {
     progress.Show(counts.frames.bytes);
   });
   while (const rtcm3::Message* message = messages.Next()) sets.Put(*message);
-  progress.Clear();
+  ClearLine();
   notes.Tell();
   for (const rtcm3::IncompleteSet& set : sets.Incomplete()) {
     if (set.hadCompleteSet) continue;
@@ -107,6 +108,7 @@ Definition Read(const DefinitionSource& source) {
   if (!source.messages.empty()) {
     definition = Receive(source);
   } else {
+    const Busy busy("reading", {source.datum, source.projection});
     definition = ReadDatumFile(source.datum);
     if (!source.projection.empty()) AddProjectionFile(source.projection, definition);
   }

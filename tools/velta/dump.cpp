@@ -9,6 +9,7 @@
 #include <string>
 #include <string_view>
 
+#include "busy.h"
 #include "command.h"
 #include "files.h"
 #include "orxregistry/bin_value.h"
@@ -114,6 +115,7 @@ void WriteKey(const TGenericRegistryKey& key, const std::string& indent, Output&
 
 int Run(const std::string& file) {
   RequireFile(file);
+  const Busy busy("reading", {file});
   orx::ForgetFileError();
   const orx::TInFileKey tree(ToWide(file), nullptr, nullptr, true, orx::kRegistryFlags);
   Output out({file});

@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "angle.h"
+#include "busy.h"
 #include "command.h"
 #include "definition_source.h"
 #include "description.h"
@@ -98,6 +99,7 @@ void WriteGrids(const Definition& definition, const Options& options, const Tell
 
 int Run(const Options& options) {
   const Definition definition = Read(options.source);
+  const Busy busy("exporting", options.source.names());
   const TellLeftOut tell = [&](std::string_view what) {
     ReportNote("not in the " + options.format + ": " + std::string(what));
   };

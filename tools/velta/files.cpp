@@ -213,6 +213,7 @@ void Output::FlushIfLarge() {
 
 void Output::Flush() {
   if (kind_ == OutputKind::kText) pending_ = WithoutControls(std::move(pending_));
+  if (beside_.empty() && orx::FileFuncs::isTerminal(stdout)) ClearLine();
   const auto size = static_cast<std::streamsize>(pending_.size());
   const bool written = buffer_->sputn(pending_.data(), size) == size && buffer_->pubsync() == 0;
   pending_.clear();

@@ -17,6 +17,7 @@
 #include <vector>
 
 #include "angle.h"
+#include "busy.h"
 #include "command.h"
 #include "description.h"
 #include "entries.h"
@@ -221,6 +222,7 @@ std::vector<Message> Generate(const Options& options) {
 int Run(const Options& options) {
   Output out(options.output, options.json ? OutputKind::kText : OutputKind::kFrames,
              {options.datum, options.projection});
+  const Busy busy("reading", {options.datum, options.projection});
   for (const Message& message : Generate(options)) {
     std::string frame;
     try {

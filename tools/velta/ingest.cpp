@@ -116,7 +116,7 @@ class Ingestion {
 
   int Finish() {
     EndStream();
-    progress_.Clear();
+    ClearLine();
     for (const rtcm3::IncompleteSet& set : sets_.Incomplete()) ReportIncomplete(set);
     const rtcm3::CollectingCounts& counts = sets_.counts();
     totals_.repeats = counts.repeats;

@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "angle.h"
+#include "busy.h"
 #include "command.h"
 #include "description.h"
 #include "entries.h"
@@ -121,6 +122,7 @@ std::vector<Description> Chosen(const std::string& file, const Entries& found,
 /// \return false when something is wrong with the file, or nothing of it can be shown
 bool List(const std::string& file, const Options& options, Output& out) {
   RequireFile(file);
+  const Busy busy("reading", {file});
   const Entries found = ReadEntries(file);
   const std::vector<Description> chosen = Chosen(file, found, options);
   if (!options.json && options.files.size() > 1) {

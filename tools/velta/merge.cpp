@@ -7,6 +7,7 @@
 #include <stdexcept>
 #include <string>
 
+#include "busy.h"
 #include "command.h"
 #include "entries.h"
 #include "files.h"
@@ -64,6 +65,7 @@ int Run(const Merge& merge) {
   Output out({merge.target, merge.source});
   RequireFile(merge.target);
   RequireFile(merge.source);
+  const Busy busy("merging", {merge.target, merge.source});
   const Entries source = ReadEntries(merge.source);
   const Entries before = ReadEntries(merge.target);
   RequireUsable(merge.target, before);

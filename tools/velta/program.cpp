@@ -4,6 +4,7 @@
 #include <string>
 
 #include "argument.h"
+#include "terminal.h"
 
 namespace velta_tool {
 namespace {
@@ -54,6 +55,9 @@ std::unique_ptr<CLI::App> MakeProgram(Action& action) {
   for (const auto add : {AddIngest, AddList, AddGenerate, AddTransform, AddExport, AddMerge,
                          AddDecode, AddEncode, AddDump}) {
     add(*program, action);
+  }
+  for (CLI::App* const command : program->get_subcommands([](CLI::App*) { return true; })) {
+    command->add_flag_callback("--quiet", BeQuiet, "tell failures only: no notes, no progress");
   }
   return program;
 }

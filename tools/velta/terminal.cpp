@@ -14,6 +14,9 @@ constexpr std::chrono::seconds kLongInput{1};
 constexpr std::chrono::milliseconds kBetweenUpdates{200};
 constexpr double kMegabyte = 1e6;
 
+bool isQuiet = false;
+std::size_t shownBytes = 0;  ///< of the text on the terminal's last line
+
 /// A character that a terminal obeys instead of showing it.
 struct Control {
   unsigned code = 0;
@@ -67,19 +70,32 @@ std::string WithoutControls(std::string text) {
 
 std::string Printable(const std::string& name) { return Escaped(name, false); }
 
-Progress::Progress()
-    : next_(Clock::now() + kLongInput), terminal_(orx::FileFuncs::isTerminal(stderr)) {}
+void BeQuiet() { isQuiet = true; }
 
-void Progress::Clear() {
-  if (std::exchange(shown_, false)) std::fprintf(stderr, "%24s\r", "");
+bool IsQuiet() { return isQuiet; }
+
+// The cursor goes back to the start of the line, where whatever is printed next begins.
+void ShowOnLine(const std::string& text) {
+  static const bool isTerminal = orx::FileFuncs::isTerminal(stderr);
+  if (!isTerminal || isQuiet) return;
+  ClearLine();
+  std::fprintf(stderr, "%s\r", text.c_str());
+  shownBytes = text.size();
 }
 
-// The cursor goes back to the start of the line, so that any other output covers the text.
+void ClearLine() {
+  const int width = static_cast<int>(std::exchange(shownBytes, 0));
+  if (width > 0) std::fprintf(stderr, "%*s\r", width, "");
+}
+
+Progress::Progress() : next_(Clock::now() + kLongInput) {}
+
 void Progress::Show(std::uint64_t bytes) {
-  if (!terminal_ || Clock::now() < next_) return;
-  std::fprintf(stderr, "%10.1f MB read\r", static_cast<double>(bytes) / kMegabyte);
+  if (Clock::now() < next_) return;
   next_ = Clock::now() + kBetweenUpdates;
-  shown_ = true;
+  char text[32];
+  std::snprintf(text, sizeof text, "%10.1f MB read", static_cast<double>(bytes) / kMegabyte);
+  ShowOnLine(text);
 }
 
 }  // namespace velta_tool

@@ -13,25 +13,32 @@ std::string WithoutControls(std::string text);
 /// A name from a stream or a file as a terminal may get it: on one line, too.
 std::string Printable(const std::string& name);
 
+/// From now on the user is told of failures only: no notes, no progress.
+void BeQuiet();
+bool IsQuiet();
+
+/// Shows a text on standard error, when that is a terminal, in place of the one shown before. The
+/// next line that is printed takes its place.
+void ShowOnLine(const std::string& text);
+
+/// Takes away what ShowOnLine shows.
+void ClearLine();
+
 /// Shows on standard error, when that is a terminal, how much of a long input has been read.
 class Progress {
  public:
   Progress();
-  ~Progress() { Clear(); }
+  ~Progress() { ClearLine(); }
   Progress(const Progress&) = delete;
   Progress& operator=(const Progress&) = delete;
 
   /// \param bytes read so far
   void Show(std::uint64_t bytes);
-  /// Takes away what was shown.
-  void Clear();
 
  private:
   using Clock = std::chrono::steady_clock;
 
   Clock::time_point next_;
-  bool terminal_;
-  bool shown_ = false;
 };
 
 }  // namespace velta_tool

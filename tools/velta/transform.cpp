@@ -72,7 +72,7 @@ class Work {
 
   int Finish() {
     out_.Finish();
-    progress_.Clear();
+    ClearLine();
     if (withoutGrid_ > 0) {
       ReportNote("positions that no residual grid covers, transformed without: " +
                  std::to_string(withoutGrid_));
