@@ -28,6 +28,7 @@ void AddEncode(CLI::App& program, Action& action);
 void AddDump(CLI::App& program, Action& action);
 void AddTransform(CLI::App& program, Action& action);
 void AddExport(CLI::App& program, Action& action);
+void AddMap(CLI::App& program, Action& action);
 
 /// Tells the user on standard error what failed.
 void ReportFailure(std::string_view what);

@@ -52,7 +52,7 @@ std::unique_ptr<CLI::App> MakeProgram(Action& action) {
   program->set_help_flag("-h,--help", "show this help");
   program->set_version_flag("--version", "velta " VELTA_VERSION)->description("show the version");
   program->require_subcommand(1);
-  for (const auto add : {AddIngest, AddList, AddGenerate, AddTransform, AddExport, AddMerge,
+  for (const auto add : {AddIngest, AddList, AddGenerate, AddTransform, AddExport, AddMap, AddMerge,
                          AddDecode, AddEncode, AddDump}) {
     add(*program, action);
   }

@@ -99,7 +99,8 @@ ResidualGrid MakeGrid(std::string entry, const velta::TableData& table) {
                     table.vertInterpolation,
                     {},
                     {},
-                    {}};
+                    {},
+                    {table.meanValue[0], table.meanValue[1], table.meanValue[2]}};
   for (std::size_t i = 0; i < grid.north.size(); ++i) {
     grid.north[i] = table.meanValue[0] + table.dNdLatData[i];
     grid.east[i] = table.meanValue[1] + table.dEdLonData[i];

@@ -1,0 +1,131 @@
+// The legend: what the signs of the map mean, with their scales.
+
+function countText(count, one, many) {
+  return `${numberText(count, 0)} ${count === 1 ? one : many}`;
+}
+
+// Makes an element of the page. Whatever a text holds, it is shown as it is.
+function element(name, attributes, ...children) {
+  const made = document.createElement(name);
+  for (const [key, value] of Object.entries(attributes)) made.setAttribute(key, value);
+  made.append(...children);
+  return made;
+}
+
+const swatch = (...children) =>
+    svgElement("svg", {class: "swatch", width: 76, height: 22, "aria-hidden": "true"}, ...children);
+
+function legendRow(sign, ...text) {
+  return element("div", {class: "row"}, sign, element("span", {}, ...text));
+}
+
+function areaRow(sheet, file, areas, windows) {
+  const index = sheet.files.indexOf(file) % 6;
+  const line = swatch(svgElement("rect", {class: `area file${index}`, x: 14, y: 3, width: 48, height: 16}));
+  const entries = areas.reduce((sum, area) => sum + area.entries, 0);
+  const areaText = sheet.isPlane ? "" : areas.length === 0 ? "no area of validity, " :
+      `${countText(areas.length, "area of validity", "areas of validity")} of ` +
+      `${countText(entries, "entry", "entries")}, `;
+  const text = areaText + countText(windows.length, "window", "windows");
+  if (sheet.files.length === 1) return legendRow(line, text);
+  const check = element("input", {type: "checkbox"});
+  check.checked = file.isShown;
+  check.addEventListener("change", () => {
+    file.isShown = check.checked;
+    requestDraw();
+  });
+  return legendRow(line, element("label", {}, check, element("b", {}, file.name), ` ${text}`));
+}
+
+function arrowRow({arrow, pixels}) {
+  const length = arrow * pixels;
+  const start = 38 - length / 2;
+  const sign = swatch(
+      svgElement("path", {class: "arrows", d: arrowPath(start, 11, length, 0)}),
+      svgElement("path", {class: "points", d: `M${start} 11h0`}));
+  return legendRow(sign, element("b", {id: "arrowLength"}, lengthText(arrow)),
+                   " horizontal residual, on the ground ",
+                   element("span", {id: "arrowHint", class: "aside"}));
+}
+
+function colourScale(sheet) {
+  const {mean, colourStep} = sheet.symbols;
+  const end = (kColours - 1) / 2;
+  const isLarge = end * colourStep >= 100;
+  const unit = isLarge ? "m" : "mm";
+  const perUnit = isLarge ? kMillimetresPerMetre : 1;
+  const decimals = Math.max(0, -Math.floor(Math.log10(colourStep / perUnit) + 1e-9));
+  const width = 30;
+  const side = 16;  // so that the texts at the ends have room
+  const scale = svgElement("svg", {
+    class: "scale", viewBox: `${-side} 0 ${kColours * width + 2 * side} 36`, role: "img",
+    "aria-label": "Scale of colours of height residuals"});
+  for (let colour = 0; colour < kColours; ++colour) {
+    const x = colour * width;
+    scale.append(svgElement(
+        "rect", {class: `cell height${colour}`, x, y: 0, width, height: 16}));
+    if (colour % 2) continue;
+    const sign = {0: "≤", [kColours - 1]: "≥"}[colour] ?? "";
+    const value = (colour - end) * colourStep / perUnit;
+    scale.append(svgElement(
+        "text", {x: x + width / 2, y: 31, "text-anchor": "middle"},
+        sign + (value > 0 ? "+" : "") + numberText(value, decimals)));
+  }
+  const from = sheet.withoutMeans ? "deviation from the mean of its window" :
+      `deviation from ${numberText(mean / kMillimetresPerMetre, 3)} m, the mean of all windows`;
+  return element("div", {class: "colours"},
+                 element("p", {}, element("b", {}, "Colour: height residual"), `, ${from}, in ${unit}`),
+                 scale, element("p", {id: "numberHint", class: "aside"}));
+}
+
+// Whether residuals are shown whole or as deviations: the means are often so much larger that
+// they hide what happens inside a window.
+function meansChoice(sheet) {
+  const choice = (text, withoutMeans) => {
+    const radio = element("input", {type: "radio", name: "means"});
+    radio.checked = sheet.withoutMeans === withoutMeans;
+    radio.addEventListener("change", () => {
+      sheet.withoutMeans = withoutMeans;
+      measure(sheet);
+      showLegend(sheet);
+      showDetails(sheet);
+      requestDraw();
+      document.querySelector("input[name=means]:checked").focus();
+    });
+    return element("label", {}, radio, text);
+  };
+  return element("div", {role: "radiogroup", "aria-label": "Residuals"}, element("b", {}, "Residuals"),
+                 choice("whole", false), choice("without the mean of their window", true));
+}
+
+function showLegend(sheet) {
+  const rows = [];
+  for (const file of sheet.files) {
+    rows.push(areaRow(sheet, file, sheet.areas.filter((area) => area.file === file),
+                      sheet.windows.filter((window) => window.file === file)));
+  }
+  const has = (property) => sheet.windows.some((window) => window[property]);
+  const cell = (name) => swatch(svgElement("rect", {class: name, x: 26, y: 2, width: 24, height: 18}));
+  if (has("hasVectors")) rows.push(arrowRow(sheet.symbols));
+  if (sheet.windows.some((window) => !window.problem && !window.hasHeights)) {
+    rows.push(legendRow(cell("cell plain outline"), "window without heights"));
+  }
+  if (has("problem")) {
+    const sign = cell("problem");
+    sign.append(svgElement("path", {class: "problem", d: "M26 2L50 20M26 20L50 2"}));
+    const count = sheet.windows.filter((window) => window.problem).length;
+    rows.push(legendRow(sign, `${countText(count, "window", "windows")} that cannot be used`));
+  }
+  const colours = has("hasHeights") ? [colourScale(sheet)] : [];
+  document.getElementById("legend").replaceChildren(element("div", {}, ...rows), ...colours);
+  const hasResiduals = has("hasHeights") || has("hasVectors");
+  document.getElementById("means").replaceChildren(...(hasResiduals ? [meansChoice(sheet)] : []));
+}
+
+// Says what of the legend must be zoomed to.
+function updateLegend({hasArrows, hasNumbers}) {
+  const arrowHint = document.getElementById("arrowHint");
+  if (arrowHint) arrowHint.textContent = hasArrows ? "" : "(zoom in to see it)";
+  const numberHint = document.getElementById("numberHint");
+  if (numberHint) numberHint.textContent = hasNumbers ? "Numbers at points: height residual in mm" : "";
+}
