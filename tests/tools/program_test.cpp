@@ -156,7 +156,7 @@ TEST_P(Session, GoesAsItShould) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Of, Session,
-                         testing::Values("convert", "files", "ingest" SESSIONS_WITH_PROJ),
+                         testing::Values("convert", "files", "ingest", "map" SESSIONS_WITH_PROJ),
                          [](const auto& name) { return std::string(name.param); });
 
 /// A 1021 whose indicator has its ten bits in the order of those who number them from the other

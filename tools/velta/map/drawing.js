@@ -2,13 +2,14 @@
 // colour, then an outline with one arrow, then 16 points with theirs, then numbers at them.
 
 const kMargins = {left: 24, right: 8, top: 8, bottom: 24};  // pixels, for the graticule's labels
-const kSmallest = 2;            // pixels that a window has, however far away
+const kSmallest = 3;            // pixels that a window has, however far away
 const kOutlineFrom = 8;         // pixels of a window's shorter side
 const kArrowFrom = 40;
 const kPointsFrom = 100;
-const kNumbersFrom = 300;
+const kNumbersFrom = 240;
 const kMostNear = 250;          // windows that are drawn with points; of more, nothing can be read
 const kMostArrows = 3000;
+const kMostSilhouettes = 2000;  // behind the colours, so that a few far windows are seen at all
 const kLabelHeight = 14;        // pixels
 const kLetterWidth = 6.6;       // pixels, on the safe side
 
@@ -45,6 +46,7 @@ const layers = (() => {
     paper: map.insertBefore(svgElement("rect", {class: "paper"}), inside),
     graticule: path("graticule"),
     areas: inside.appendChild(svgElement("g", {class: "areas"})),
+    silhouettes: path("silhouette"),
     plain: path("cell plain"),
     cells: Array.from({length: kColours}, (_, colour) => path(`cell height${colour}`)),
     outlines: path("outline"),
@@ -156,7 +158,7 @@ function drawAreas(sheet, plot, texts, hasRoom) {
     if (isLarge && isIn) placeText(texts, hasRoom, text, x + 6, y + 15, "start", "areaText");
   }
   layers.areas.replaceChildren(...sheet.files.map(
-      (file, index) => svgElement("path", {class: `area file${index % 6}`, d: paths.get(file)})));
+      (file, index) => svgElement("path", {class: `area file${index % kFileColours}`, d: paths.get(file)})));
 }
 
 // The vector of residuals in pixels, turned as north is at its place.
@@ -209,12 +211,16 @@ function drawWindows(sheet, plot, texts, hasRoom) {
     drawn.size = Math.min(drawn.right - drawn.left, drawn.bottom - drawn.top);
     inView.push([window, drawn]);
   }
-  const paths = {cells: Array(kColours).fill(""), plain: "", outlines: "", problems: "",
-                 points: "", arrows: ""};
+  const paths = {cells: Array(kColours).fill(""), plain: "", silhouettes: "", outlines: "",
+                 problems: "", points: "", arrows: ""};
   let [hasArrows, hasNumbers] = [false, false];
   for (const [window, drawn] of inView) {
     const path = windowPath(drawn);
-    if (drawn.size >= kOutlineFrom) paths.outlines += path;
+    if (drawn.size >= kOutlineFrom) {
+      paths.outlines += path;
+    } else if (inView.length <= kMostSilhouettes) {
+      paths.silhouettes += path;
+    }
     if (window.problem) {
       paths.problems += path;
       if (drawn.size >= kOutlineFrom) paths.problems += crossPath(drawn);
@@ -244,7 +250,7 @@ function drawWindows(sheet, plot, texts, hasRoom) {
   }
   paths.cells.forEach((path, colour) => layers.cells[colour].setAttribute("d", path));
   layers.arrowHalo.setAttribute("d", paths.arrows);
-  for (const name of ["plain", "outlines", "problems", "points", "arrows"]) {
+  for (const name of ["plain", "silhouettes", "outlines", "problems", "points", "arrows"]) {
     layers[name].setAttribute("d", paths[name]);
   }
   return {hasArrows, hasNumbers};

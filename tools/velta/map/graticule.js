@@ -52,11 +52,11 @@ function multiplesIn(from, to, step) {
 // A coordinate as a label: 51.95° N, 350 000 m E.
 function coordinateText(value, step, isPlane, isNorth) {
   const decimals = Math.max(0, -Math.floor(Math.log10(step) + 1e-9));
-  if (isPlane) return `${numberText(value, decimals)} m ${isNorth ? "N" : "E"}`;
+  if (isPlane) return `${numberText(value, decimals)}\u00a0m\u00a0${isNorth ? "N" : "E"}`;
   const degrees = isNorth ? value : value - 360 * Math.round(value / 360);
   const letter = Math.abs(degrees) < step / 2 || (!isNorth && Math.abs(degrees) === 180) ?
-      "" : isNorth ? (degrees < 0 ? " S" : " N") : degrees < 0 ? " W" : " E";
-  return `${numberText(Math.abs(degrees), decimals)}°${letter}`;
+      "" : isNorth ? (degrees < 0 ? "S" : "N") : degrees < 0 ? "W" : "E";
+  return `${numberText(Math.abs(degrees), decimals)}°${letter && "\u00a0"}${letter}`;
 }
 
 // Labels where lines meet an edge.

@@ -1,5 +1,7 @@
 // The legend: what the signs of the map mean, with their scales.
 
+const kFileColours = 6;  // of the outlines of areas
+
 function countText(count, one, many) {
   return `${numberText(count, 0)} ${count === 1 ? one : many}`;
 }
@@ -19,9 +21,9 @@ function legendRow(sign, ...text) {
   return element("div", {class: "row"}, sign, element("span", {}, ...text));
 }
 
-function areaRow(sheet, file, areas, windows) {
-  const index = sheet.files.indexOf(file) % 6;
-  const line = swatch(svgElement("rect", {class: `area file${index}`, x: 14, y: 3, width: 48, height: 16}));
+function fileRow(sheet, file, areas, windows) {
+  const name = sheet.isPlane ? "outline" : `area file${sheet.files.indexOf(file) % kFileColours}`;
+  const line = swatch(svgElement("rect", {class: name, x: 14, y: 3, width: 48, height: 16}));
   const entries = areas.reduce((sum, area) => sum + area.entries, 0);
   const areaText = sheet.isPlane ? "" : areas.length === 0 ? "no area of validity, " :
       `${countText(areas.length, "area of validity", "areas of validity")} of ` +
@@ -45,7 +47,7 @@ function arrowRow({arrow, pixels}) {
       svgElement("path", {class: "points", d: `M${start} 11h0`}));
   return legendRow(sign, element("b", {id: "arrowLength"}, lengthText(arrow)),
                    " horizontal residual, on the ground ",
-                   element("span", {id: "arrowHint", class: "aside"}));
+                   element("span", {id: "arrowHint", class: "aside"}, "(zoom in to see it)"));
 }
 
 function colourScale(sheet) {
@@ -75,7 +77,7 @@ function colourScale(sheet) {
       `deviation from ${numberText(mean / kMillimetresPerMetre, 3)} m, the mean of all windows`;
   return element("div", {class: "colours"},
                  element("p", {}, element("b", {}, "Colour: height residual"), `, ${from}, in ${unit}`),
-                 scale, element("p", {id: "numberHint", class: "aside"}));
+                 scale, element("p", {id: "numberHint", class: "aside"}, "Numbers at points: height residual, mm"));
 }
 
 // Whether residuals are shown whole or as deviations: the means are often so much larger that
@@ -101,7 +103,7 @@ function meansChoice(sheet) {
 function showLegend(sheet) {
   const rows = [];
   for (const file of sheet.files) {
-    rows.push(areaRow(sheet, file, sheet.areas.filter((area) => area.file === file),
+    rows.push(fileRow(sheet, file, sheet.areas.filter((area) => area.file === file),
                       sheet.windows.filter((window) => window.file === file)));
   }
   const has = (property) => sheet.windows.some((window) => window[property]);
@@ -122,10 +124,13 @@ function showLegend(sheet) {
   document.getElementById("means").replaceChildren(...(hasResiduals ? [meansChoice(sheet)] : []));
 }
 
-// Says what of the legend must be zoomed to.
+// Says what of the legend is on the map now. The hints keep their room, as the map would else change
+// its size while it is zoomed.
 function updateLegend({hasArrows, hasNumbers}) {
-  const arrowHint = document.getElementById("arrowHint");
-  if (arrowHint) arrowHint.textContent = hasArrows ? "" : "(zoom in to see it)";
-  const numberHint = document.getElementById("numberHint");
-  if (numberHint) numberHint.textContent = hasNumbers ? "Numbers at points: height residual in mm" : "";
+  const show = (id, isShown) => {
+    const hint = document.getElementById(id);
+    if (hint) hint.style.visibility = isShown ? "visible" : "hidden";
+  };
+  show("arrowHint", !hasArrows);
+  show("numberHint", hasNumbers);
 }

@@ -1,5 +1,7 @@
 // The page: its sheets, the tabs that choose one, and when the map is drawn.
 
+const kMostNames = 4;  // of files in the heading
+
 const data = JSON.parse(document.getElementById("data").textContent);
 const tabs = ["datums", "projections"].filter((kind) => data[kind].files.length > 0);
 const sheets = {};
@@ -45,14 +47,7 @@ function summaryOf(sheet) {
 // Shows a kind of files. Its sheet is made when it is first shown.
 function show(kind) {
   kindShown = kind;
-  if (!sheets[kind]) {
-    const sheet = makeSheet(data[kind], kind === "projections");
-    sheet.withoutMeans = false;
-    sheet.limits = limitsOf(sheet);
-    measure(sheet);
-    fit(sheet, sheet.windows.length > 0 ? sheet.windows : everything(sheet));
-    sheets[kind] = sheet;
-  }
+  sheets[kind] ??= makeSheet(data[kind], kind === "projections");
   for (const tab of tabs) {
     const button = document.getElementById(tab);
     button.setAttribute("aria-selected", tab === kind);
@@ -61,12 +56,17 @@ function show(kind) {
   document.getElementById("summary").textContent = summaryOf(current());
   document.getElementById("windows").disabled = current().windows.length === 0;
   showLegend(current());
+  if (!current().view) {  // now that the map has its size beside the legend
+    fit(current(), current().windows.length > 0 ? current().windows : everything(current()));
+  }
   showDetails(current());
   requestDraw();
 }
 
 function start() {
-  const names = tabs.flatMap((kind) => data[kind].files).join(", ");
+  const files = tabs.flatMap((kind) => data[kind].files);
+  const more = files.length - kMostNames;
+  const names = files.slice(0, kMostNames).join(", ") + (more > 0 ? ` and ${more} more` : "");
   document.title = `${names} – residual grids`;
   document.getElementById("heading").textContent = `Residual grids of ${names}`;
   document.getElementById("tabs").hidden = tabs.length < 2;

@@ -109,8 +109,12 @@ function makeSheet(columns, isPlane) {
   if (!isPlane) boxes.forEach((box) => placeOnGlobe(box, middle));
   const focus = windows.length > 0 ? windows : boxes;
   const projection = isPlane ? planeView() : globeView(hull(focus), hull(telling), middle);
-  return {isPlane, files, areas, windows, projection, columns, ...toGround(columns, windows, isPlane),
-          view: null, selected: null};
+  const sheet = {isPlane, files, areas, windows, projection, columns,
+                 ...toGround(columns, windows, isPlane), withoutMeans: false,
+                 view: null, selected: null, hovered: null};
+  sheet.limits = limitsOf(sheet);
+  measure(sheet);
+  return sheet;
 }
 
 // A residual as it is shown: with the mean of its window, or as the deviation from it.

@@ -23,7 +23,7 @@ function roundDown(number) {
 function numberText(number, decimals) {
   const [whole, fraction] = Math.abs(number).toFixed(decimals).split(".");
   const isZero = !/[1-9]/.test(whole + (fraction ?? ""));
-  const grouped = whole.replace(/\B(?=(\d{3})+$)/g, "\u2009");
+  const grouped = whole.replace(/\B(?=(\d{3})+$)/g, "\u202f");
   return (number < 0 && !isZero ? "−" : "") + grouped + (fraction ? `.${fraction}` : "");
 }
 
