@@ -66,7 +66,7 @@ struct ResidualGrid {
   Points east;    ///< likewise
   Points height;  ///< likewise, metres
   /// Of the north, east and height residuals; the points have them in.
-  std::array<double, 3> means;
+  std::array<double, 3> means = {};
 
   double NorthStep() const { return area.northExtent / (kGridPoints - 1); }
   double EastStep() const { return area.eastExtent / (kGridPoints - 1); }
