@@ -104,7 +104,7 @@ Projection ReadProjection(const StoredKey& standard) {
 /// \throws std::runtime_error when it is of another ellipsoid
 void RequireFit(const std::string& file, const StoredKey& standard, const Definition& definition) {
   std::wstring datum;
-  if (velta::Read(standard, layout::kDatumName, datum) &&
+  if (!definition.targetName.empty() && velta::Read(standard, layout::kDatumName, datum) &&
       orx::ToUtf8(datum) != definition.targetName) {
     ReportNote(file + ": the projection is of the datum " + Printable(orx::ToUtf8(datum)) +
                ", not " + Printable(definition.targetName));
