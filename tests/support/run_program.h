@@ -75,7 +75,8 @@ inline int RunProgram(const std::vector<std::string>& arguments, const std::file
   posix_spawn_file_actions_addopen(&streams, 1, out.c_str(), kWrite, 0666);
   posix_spawn_file_actions_addopen(&streams, 2, err.c_str(), kWrite, 0666);
   pid_t process = -1;
-  const int error = posix_spawnp(&process, pointers[0], &streams, nullptr, pointers.data(), environ);
+  const int error =
+      posix_spawnp(&process, pointers[0], &streams, nullptr, pointers.data(), environ);
   posix_spawn_file_actions_destroy(&streams);
   int status = -1;
   if (error != 0 || waitpid(process, &status, 0) != process) return -1;
