@@ -18,16 +18,17 @@ using Place = std::pair<int, int>;  // row, counted to the south, and column
 
 constexpr double kStep = 15.0 / 3600;  // degrees
 constexpr double kNorth = 10;          // of row 0, degrees
-constexpr double kWest = 179.9;        // of column 0, degrees
+/// Of column 0, degrees: the antimeridian and Greenwich are among the columns.
+constexpr double kWests[] = {179.9, -0.1};
 constexpr int kRows = 30;
-constexpr int kColumns = 60;  // the date line is among them
+constexpr int kColumns = 60;
 constexpr double kResidualStep = 0.001;
 const GridPart kHeights = {&ResidualGrid::vertShift, {&ResidualGrid::height}, kResidualStep};
 
-/// A field of heights on both sides of the date line, out of which windows are cut.
+/// A field of heights, out of which windows are cut.
 class Field {
  public:
-  explicit Field(unsigned seed) : random_(seed) {
+  explicit Field(unsigned seed, double west = kWests[0]) : random_(seed), west_(west) {
     for (int row = 0; row < kRows; ++row) {
       for (int column = 0; column < kColumns; ++column) {
         heights_[{row, column}] = std::uniform_real_distribution(-100.0, 100.0)(random_);
@@ -39,7 +40,7 @@ class Field {
 
   ResidualGrid Window(int row, int column) const {
     const double south = kNorth - (row + kGridPoints - 1) * kStep;
-    const double west = std::remainder(kWest + column * kStep, 360);
+    const double west = std::remainder(west_ + column * kStep, 360);
     const double extent = (kGridPoints - 1) * kStep / kDegreesPerRadian;
     ResidualGrid grid = {};
     grid.area = {south / kDegreesPerRadian, extent, west / kDegreesPerRadian, extent};
@@ -49,6 +50,22 @@ class Field {
           At({row + i / kGridPoints, column + i % kGridPoints});
     }
     return grid;
+  }
+
+  Place PlaceOf(const JoinedGrid& grid, std::size_t point) const {
+    const double row = (kNorth - grid.north) / kStep;
+    const double column = std::remainder(grid.west - west_, 360) / kStep;
+    return {static_cast<int>(std::lround(row)) + static_cast<int>(point / grid.columns),
+            static_cast<int>(std::lround(column)) + static_cast<int>(point % grid.columns)};
+  }
+
+  std::vector<Place> CellsOf(const JoinedGrid& grid) const {
+    std::vector<Place> cells;
+    for (std::size_t point = 0; point + grid.columns < grid.points.size(); ++point) {
+      const bool isLast = point % grid.columns == grid.columns - 1;
+      if (!isLast) cells.push_back(PlaceOf(grid, point));
+    }
+    return cells;
   }
 
   /// Windows here and there, some of which touch and some overlap.
@@ -65,33 +82,19 @@ class Field {
 
  private:
   std::mt19937 random_;
+  double west_;
   std::map<Place, double> heights_;
 };
-
-Place PlaceOf(const JoinedGrid& grid, std::size_t point) {
-  const double row = (kNorth - grid.north) / kStep;
-  const double column = std::remainder(grid.west - kWest, 360) / kStep;
-  return {static_cast<int>(std::lround(row) + std::lround(point / grid.columns)),
-          static_cast<int>(std::lround(column) + std::lround(point % grid.columns))};
-}
-
-std::vector<Place> CellsOf(const JoinedGrid& grid) {
-  std::vector<Place> cells;
-  for (std::size_t point = 0; point + grid.columns < grid.points.size(); ++point) {
-    const bool isLast = point % grid.columns == grid.columns - 1;
-    if (!isLast) cells.push_back(PlaceOf(grid, point));
-  }
-  return cells;
-}
 
 TEST(JoinedGrids, EveryCoveredCellIsInOneRectangle) {
   for (unsigned seed = 0; seed < 50; ++seed) {
     SCOPED_TRACE(seed);
+    Field field(seed, kWests[seed % 2]);
     std::set<Place> covered;
-    const std::vector<ResidualGrid> windows = Field(seed).Windows(40, covered);
+    const std::vector<ResidualGrid> windows = field.Windows(40, covered);
     std::multiset<Place> joined;
     for (const JoinedGrid& grid : JoinGrids(windows, kHeights).grids) {
-      const std::vector<Place> cells = CellsOf(grid);
+      const std::vector<Place> cells = field.CellsOf(grid);
       joined.insert(cells.begin(), cells.end());
     }
     EXPECT_EQ(joined, std::multiset<Place>(covered.begin(), covered.end()));
@@ -101,7 +104,7 @@ TEST(JoinedGrids, EveryCoveredCellIsInOneRectangle) {
 TEST(JoinedGrids, EveryPointHasTheValueOfTheField) {
   for (unsigned seed = 0; seed < 50; ++seed) {
     SCOPED_TRACE(seed);
-    Field field(seed);
+    Field field(seed, kWests[seed % 2]);
     std::set<Place> covered;
     const std::vector<ResidualGrid> windows = field.Windows(40, covered);
     const JoinedGrids joined = JoinGrids(windows, kHeights);
@@ -110,22 +113,25 @@ TEST(JoinedGrids, EveryPointHasTheValueOfTheField) {
     for (const JoinedGrid& grid : joined.grids) {
       for (std::size_t point = 0; point < grid.points.size(); ++point) {
         const auto [window, number] = grid.points[point];
-        EXPECT_EQ(windows[window].height[number], field.At(PlaceOf(grid, point)));
+        EXPECT_EQ(windows[window].height[number], field.At(field.PlaceOf(grid, point)));
       }
     }
   }
 }
 
-TEST(JoinedGrids, AdjacentWindowsMakeOneRectangleAcrossTheDateLine) {
-  const Field field(1);
-  std::vector<ResidualGrid> windows;
-  for (int column = 0; column + kGridPoints <= kColumns; column += kGridPoints - 1) {
-    windows.insert(windows.begin(), field.Window(5, column));
+TEST(JoinedGrids, AdjacentWindowsMakeOneRectangleAcrossTheAntimeridianAndGreenwich) {
+  for (const double west : kWests) {
+    SCOPED_TRACE(west);
+    const Field field(1, west);
+    std::vector<ResidualGrid> windows;
+    for (int column = 0; column + kGridPoints <= kColumns; column += kGridPoints - 1) {
+      windows.insert(windows.begin(), field.Window(5, column));
+    }
+    const JoinedGrids joined = JoinGrids(windows, kHeights);
+    ASSERT_EQ(joined.grids.size(), 1);
+    EXPECT_EQ(joined.grids[0].columns, (kColumns - 1) / 3 * 3 + 1);
+    EXPECT_DOUBLE_EQ(joined.grids[0].west, west);
   }
-  const JoinedGrids joined = JoinGrids(windows, kHeights);
-  ASSERT_EQ(joined.grids.size(), 1);
-  EXPECT_EQ(joined.grids[0].columns, (kColumns - 1) / 3 * 3 + 1);
-  EXPECT_DOUBLE_EQ(joined.grids[0].west, kWest);
 }
 
 TEST(JoinedGrids, TheFirstWindowsValueIsTakenAndTheDifferenceTold) {
@@ -161,7 +167,8 @@ TEST(JoinedGrids, WhereTheFirstWindowDoesNotApplyNothingIsJoined) {
   const JoinedGrids joined = JoinGrids(windows, kHeights);
   ASSERT_EQ(joined.grids.size(), 1);
   const std::vector<Place> last = {{5, 8}, {6, 8}, {7, 8}};
-  EXPECT_EQ(CellsOf(joined.grids[0]), last);
+  EXPECT_EQ(field.CellsOf(joined.grids[0]), last);
+  for (const GridPoint& point : joined.grids[0].points) EXPECT_EQ(point.grid, 1);
 }
 
 TEST(JoinedGrids, WindowsOfOtherStepsStayApartAndAreNamedWhereTheyOverlap) {

@@ -90,7 +90,7 @@ std::vector<Extent> ExtentsOf(const std::vector<ResidualGrid>& grids) {
     ranges.emplace_back(extent.west, extent.west + kCells * extent.eastStep);
   }
   std::sort(ranges.begin(), ranges.end());
-  double end = 0;
+  double end = -kTurn;
   for (const auto& range : ranges) end = std::max(end, range.second - kTurn);
   double widest = -kTurn;
   double from = 0;
