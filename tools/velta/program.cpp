@@ -5,6 +5,7 @@
 
 #include "argument.h"
 #include "terminal.h"
+#include "versions.h"
 
 namespace velta_tool {
 namespace {
@@ -50,7 +51,7 @@ std::unique_ptr<CLI::App> MakeProgram(Action& action) {
   program->allow_windows_style_options(false);  // "/" begins a file name
   program->footer(kFooter);
   program->set_help_flag("-h,--help", "show this help");
-  program->set_version_flag("--version", "velta " VELTA_VERSION)->description("show the version");
+  program->set_version_flag("--version", Versions, "show the version and those of the libraries");
   program->require_subcommand(1);
   for (const auto add : {AddIngest, AddList, AddGenerate, AddTransform, AddExport, AddMap, AddMerge,
                          AddDecode, AddEncode, AddDump}) {

@@ -3,6 +3,7 @@
 
 #include "command.h"
 #include "geodesy/exports.h"
+#include "versions.h"
 
 /// What a build without PROJ has in the place of what needs it.
 namespace velta_tool {
@@ -13,6 +14,8 @@ namespace {
 }  // namespace
 
 const bool kHasProj = false;
+
+std::string ProjVersion() { return "without PROJ"; }
 
 std::string Wkt(const Definition&, std::size_t, const TellLeftOut&) { Refuse(); }
 
