@@ -146,6 +146,11 @@ void AddExport(CLI::App& program, Action& action) {
       ->capture_default_str();
   const std::string withoutProj =
       "This build has no PROJ: of the forms only proj and geojson are in it.\n\n";
+  const std::string withProj =
+      "  velta export --format gtg AUTO_DHDN_BESEL.dff --hgrid hor.tif --vgrid ver.tif\n"
+      "  velta export --format proj AUTO_DHDN_BESEL.dff AUTO_DHDN_BESEL.prj --hgrid hor.tif "
+      "--vgrid ver.tif\n"
+      "  velta export --format wkt AUTO_DHDN_BESEL.dff AUTO_DHDN_BESEL.prj\n";
   command->footer(
       (kHasProj ? "" : withoutProj) +
       "  proj     a pipeline for cct and every user of PROJ, with the columns of \"velta\n"
@@ -160,11 +165,9 @@ void AddExport(CLI::App& program, Action& action) {
       "cannot say is told on standard error.\n"
       "\n"
       "Example:\n"
-      "  velta ingest --datum-dir . --projection-dir . examples/streams/dhdn.rtcm3\n"
-      "  velta export --format gtg AUTO_DHDN_BESEL.dff --hgrid hor.tif --vgrid ver.tif\n"
-      "  velta export --format proj AUTO_DHDN_BESEL.dff AUTO_DHDN_BESEL.prj --hgrid hor.tif "
-      "--vgrid ver.tif\n"
-      "  velta export --format wkt AUTO_DHDN_BESEL.dff AUTO_DHDN_BESEL.prj\n"
+      "  velta ingest --datum-dir . --projection-dir . examples/streams/dhdn.rtcm3\n" +
+      (kHasProj ? withProj : "") +
+      "  velta export --format proj AUTO_DHDN_BESEL.dff AUTO_DHDN_BESEL.prj\n"
       "  velta export --format geojson AUTO_DHDN_BESEL.dff");
   command->callback([&action, options] {
     TakeFiles(*options);

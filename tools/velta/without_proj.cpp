@@ -29,6 +29,7 @@ void AddTransform(CLI::App& program, Action& action) {
       "\"velta export --format proj\" writes what PROJ's cct transforms positions by.\n"
       "\n"
       "Example:\n"
+      "  velta ingest --datum-dir . --projection-dir . examples/streams/dhdn.rtcm3\n"
       "  velta export --format proj AUTO_DHDN_BESEL.dff AUTO_DHDN_BESEL.prj -o pipeline");
   command->callback([&action] { action = []() -> int { Refuse(); }; });
 }
