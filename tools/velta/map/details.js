@@ -12,8 +12,12 @@ function edgeText(value, isPlane, isNorth) {
 
 function edgeTexts(box, isPlane) {
   const text = (value, isNorth) => edgeText(value, isPlane, isNorth);
-  return [`${text(box.south, true)} – ${text(box.north, true)}`,
-          `${text(box.west, false)} – ${text(box.east, false)}`];
+  const isWhole = (from, to, range) => !isPlane && to - from >= range;
+  return [
+    isWhole(box.south, box.north, 180) ? "every latitude" :
+        `${text(box.south, true)} – ${text(box.north, true)}`,
+    isWhole(box.west, box.east, 360) ? "every longitude" :
+        `${text(box.west, false)} – ${text(box.east, false)}`];
 }
 
 // Terms with their values, each of which is some lines.
@@ -95,7 +99,7 @@ function placeDetails(sheet, [east, north]) {
       coordinateText(east, step, sheet.isPlane, false);
   const children = [element("h2", {}, "No window here"), element("p", {class: "place"}, place)];
   if (sheet.isPlane) return children;
-  const around = sheet.areas.filter((area) => area.file.isShown && holds(area, east, north, 0, false));
+  const around = sheet.areas.filter((area) => area.file.isShown && holds(sheet, area, east, north, 0));
   const areaText = (area) => element("li", {}, `${area.file.name}: ${edgeTexts(area, false).join(", ")}; ` +
       countText(area.entries, "entry", "entries") +
       (area.unusable > 0 ? `, of which ${numberText(area.unusable, 0)} cannot be used` : ""));

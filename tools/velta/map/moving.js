@@ -9,11 +9,12 @@ const kPointingRoom = 4;       // pixels around a window that is too small to be
 const kLargestWindow = 2500;   // pixels, at the nearest
 
 // Whether a box holds a place.
-// room: around the box, in units of the place
-function holds(box, east, north, room, isPlane) {
-  const turns = isPlane ? 0 : 360 * Math.round(((box.west + box.east) / 2 - east) / 360);
+// room: around the box, in units of the picture
+function holds(sheet, box, east, north, room) {
+  const turns = sheet.isPlane ? 0 : 360 * Math.round(((box.west + box.east) / 2 - east) / 360);
+  const eastRoom = room / sheet.projection.unitWidth(north);
   return north >= box.south - room && north <= box.north + room &&
-      east + turns >= box.west - room && east + turns <= box.east + room;
+      east + turns >= box.west - eastRoom && east + turns <= box.east + eastRoom;
 }
 
 // The window that a place is in; of several the one whose middle is nearest.
@@ -22,7 +23,7 @@ function windowAt(sheet, [east, north]) {
   let nearest = null;
   let least = Infinity;
   for (const window of sheet.windows) {
-    if (!window.file.isShown || !holds(window, east, north, room, sheet.isPlane)) continue;
+    if (!window.file.isShown || !holds(sheet, window, east, north, room)) continue;
     const distance = Math.hypot((window.south + window.north) / 2 - north,
                                 (window.west + window.east) / 2 - east);
     if (distance < least) [nearest, least] = [window, distance];
@@ -83,9 +84,10 @@ function select(sheet, window) {
 
 // Goes on to another window, and brings it into view.
 function selectNext(sheet, by) {
-  const count = sheet.windows.length;
-  const from = sheet.selected?.index ?? (by > 0 ? -1 : 0);
-  const window = sheet.windows[(from + by + count) % count];
+  const shown = sheet.windows.filter((window) => window.file.isShown);
+  if (shown.length === 0) return;
+  const from = sheet.selected ? shown.indexOf(sheet.selected) : by > 0 ? -1 : 0;
+  const window = shown[(from + by + shown.length) % shown.length];
   const {left, right, top, bottom} = onScreen(sheet, window);
   const plot = plotOf();
   if (left < plot.left || right > plot.right || top < plot.top || bottom > plot.bottom) {
