@@ -200,7 +200,7 @@ void AddMap(CLI::App& program, Action& action) {
       "\n"
       "Example:\n"
       "  velta ingest --datum-dir . --projection-dir . examples/streams/rover.rtcm3\n"
-      "  velta map ROVER_NET.dff ROVER_NET.prj -o map.html");
+      "  velta map ROVER_NET.dff -o map.html");
   command->callback([&action, options] { action = [options] { return Run(*options); }; });
 }
 
