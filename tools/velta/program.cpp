@@ -12,7 +12,8 @@ namespace {
 
 constexpr char kHelp[] =
     "Turns RTCM 3 coordinate-transformation messages (1021 to 1027) into datum files (.dff) and\n"
-    "projection files (.prj), and these files back into messages.";
+    "projection files (.prj), these files back into messages, and positions into coordinates of\n"
+    "the local system.";
 
 constexpr char kFooter[] =
     "\"velta COMMAND --help\" tells more about a command. As a FILE of messages or of JSON,\n"
