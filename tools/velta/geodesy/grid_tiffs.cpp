@@ -86,8 +86,8 @@ void TellDifferences(const std::vector<ResidualGrid>& grids, const Kind& kind,
   for (std::size_t i = 0; i < std::min(differences.size(), kMostNamed); ++i) {
     const auto& [used, other, difference] = differences[i];
     const ResidualGrid& grid = grids[used.grid];
-    const double row = used.point / kGridPoints;
-    const double column = used.point % kGridPoints;
+    const std::uint32_t row = used.point / kGridPoints;
+    const std::uint32_t column = used.point % kGridPoints;
     const double north = grid.area.south + grid.area.northExtent - row * grid.NorthStep();
     const double east = grid.area.west + column * grid.EastStep();
     constexpr int kDecimals = 6;
@@ -134,11 +134,11 @@ std::string FileOf(const Definition& definition, const Kind& kind, const JoinedG
     const JoinedGrid& grid = joined.grids[number];
     GeoTiffImage image = ImageOf(grid, kind.part.values.size(), Metadata(kind, number + 1));
     for (std::size_t i = 0; i < grid.points.size(); ++i) {
-      const auto row = static_cast<double>(i / grid.columns);
-      const auto column = static_cast<double>(i % grid.columns);
-      add(grid.points[i],
-          Coordinates{(grid.north - row * grid.northStep) / kDegreesPerRadian,
-                      (grid.west + column * grid.eastStep) / kDegreesPerRadian, 0},
+      const std::size_t row = i / grid.columns;
+      const std::size_t column = i % grid.columns;
+      const double north = grid.north - static_cast<double>(row) * grid.northStep;
+      const double east = grid.west + static_cast<double>(column) * grid.eastStep;
+      add(grid.points[i], Coordinates{north / kDegreesPerRadian, east / kDegreesPerRadian, 0},
           image.samples);
     }
     file.Add(image);

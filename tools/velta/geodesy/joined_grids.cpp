@@ -26,7 +26,11 @@ struct Lattice {
   double north;  ///< from the equator to the next row in the north
   double east;   ///< from the meridian of Greenwich to the next column in the east
 
-  auto operator<=>(const Lattice&) const = default;
+  bool operator==(const Lattice&) const = default;
+  bool operator<(const Lattice& other) const {
+    return std::tie(northStep, eastStep, north, east) <
+           std::tie(other.northStep, other.eastStep, other.north, other.east);
+  }
 };
 
 /// A grid's place in its lattice.
@@ -86,6 +90,7 @@ std::vector<Extent> ExtentsOf(const std::vector<ResidualGrid>& grids) {
                        static_cast<std::uint32_t>(i)});
   }
   std::vector<std::pair<double, double>> ranges;
+  ranges.reserve(extents.size());
   for (const Extent& extent : extents) {
     ranges.emplace_back(extent.west, extent.west + kCells * extent.eastStep);
   }

@@ -277,10 +277,10 @@ std::string Wkt(const Definition& definition, std::size_t shiftIndex, const Tell
   Hub hub = HubOf(nameOr(definition.sourceName), shift.sourceAxes, tell);
   const ReverseShift reverse = ReverseOf(shift, hub.ellipsoid.axes, AreaOf(definition, shiftIndex));
   const std::string name = local + " to " + hub.system["name"].get<std::string>();
-  const std::string text = TextOf({{"type", "BoundCRS"},
-                                   {"source_crs", std::move(system)},
-                                   {"target_crs", std::move(hub.system)},
-                                   {"transformation", TransformationOf(name, reverse.shift)}});
+  std::string text = TextOf({{"type", "BoundCRS"},
+                             {"source_crs", std::move(system)},
+                             {"target_crs", std::move(hub.system)},
+                             {"transformation", TransformationOf(name, reverse.shift)}});
   TellWhatIsMissing(definition, shift, tell);
   TellError(reverse, tell);
   return text;
