@@ -49,17 +49,19 @@ std::string Arguments(const CLI::App& command, const std::string& begin) {
   return lines;
 }
 
+constexpr char kAsCommand[] = "complete -c velta -n __fish_use_subcommand";
+
+std::string Command(const CLI::App& command) {
+  const std::string& name = command.get_name();
+  return kAsCommand + (" -a " + name) + " -d " + Quoted(command.get_description()) + '\n' +
+         Arguments(command, "complete -c velta -n '__fish_seen_subcommand_from " + name + '\'');
+}
+
 }  // namespace
 
 std::string FishCompletion(const CLI::App& program) {
-  const std::string begin = "complete -c velta -n ";
-  const std::string first = begin + "__fish_use_subcommand";
-  std::string lines = kBegin + Arguments(program, first);
-  for (const CLI::App* const command : program.get_subcommands({})) {
-    const std::string& name = command->get_name();
-    lines += first + " -a " + name + " -d " + Quoted(command->get_description()) + '\n' +
-             Arguments(*command, begin + Quoted("__fish_seen_subcommand_from " + name));
-  }
+  std::string lines = kBegin + Arguments(program, kAsCommand);
+  for (const CLI::App* const command : program.get_subcommands({})) lines += Command(*command);
   return lines;
 }
 

@@ -9,6 +9,7 @@
 #include <utility>
 #include <vector>
 
+#include "busy.h"
 #include "command.h"
 #include "description.h"
 #include "files.h"
@@ -158,6 +159,7 @@ std::string Embedded(const json& data) {
 
 int Run(const Options& options) {
   Output out(options.output, OutputKind::kText, options.files);
+  const Busy busy("drawing", options.files);
   Sheet datums{kArcSecondsPerRadian, kAngleUnits};
   Sheet projections{1, kLengthUnits};
   for (const std::string& file : options.files) {
