@@ -51,7 +51,7 @@ Systems ReadSystems(const std::string& stream) {
   for (const rtcm3::IncompleteSet& set : sets.Incomplete()) {
     if (set.hadCompleteSet) continue;
     std::string missing;
-    for (const unsigned number : set.missing) missing += " " + std::to_string(number);
+    for (const unsigned number : set.missing) (missing += ' ') += std::to_string(number);
     ReportNote(stream + ": system " + std::to_string(set.systemId) +
                ": incomplete, not received:" + missing);
   }

@@ -22,7 +22,7 @@ struct Property {
   const char* label;             ///< for people
   const char* key;               ///< for JSON
   nlohmann::ordered_json value;  ///< number, text, or an array or an object of them
-  std::string_view unit = "";
+  std::string_view unit = {};
   double step = 0;  ///< of the message's field; what is much smaller is rounding
 };
 using Description = std::vector<Property>;

@@ -44,7 +44,7 @@ class TAreaWalk::Walk {
       // In a file as it is written, what comes later lies behind, and in front of what leads to it.
       const bool isInOrder = item.at >= floors_[node.level] && item.at < node.place;
       if (node.level == 0) {
-        const TGenericRegistryKey entry = isInOrder ? Read(item.at) : TGenericRegistryKey(nullptr);
+        TGenericRegistryKey entry = isInOrder ? Read(item.at) : TGenericRegistryKey(nullptr);
         if (!entry.IsNull()) return entry;
         ReadWhole();
       } else if (!isInOrder || !Descend(item.at)) {
