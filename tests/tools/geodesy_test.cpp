@@ -322,6 +322,50 @@ TEST(Transformation, TakesHeightsByTheirIndicator) {
   EXPECT_THROW(heightBy(3), NotTransformable);
 }
 
+TEST(Transformation, FindsItsWayBackFromEveryEdge) {
+  std::mt19937 random(7);
+  const auto share = [&random](int parts) {
+    return static_cast<double>(random() % static_cast<unsigned>(parts)) / (parts - 1);
+  };
+  constexpr double kRoundings[] = {-1e-6, -1e-9, -1e-14, 0, 1e-14, 1e-9, 1e-6};
+  for (std::uint32_t method = kLinearHelmert; method <= velta::kMolodenskiBadekas; ++method) {
+    SCOPED_TRACE(method);
+    Definition definition = AustrianDefinition();
+    if (method % 2 == 0) definition.projection.reset();
+    DatumShift shift = definition.shifts[0];
+    shift.computationIndicator = method;
+    DatumShift other = shift;
+    other.parameters[1] += 8;
+    definition.shifts = {shift, other};
+    definition.areas = {{"west", {0.8, 0.01, 0.27, 0.01}, 0}, {"east", {0.8, 0.01, 0.28, 0.01}, 1}};
+    ResidualGrid grid{"grid", "", {0.804, 0.001, 0.2795, 0.001}, true, true, 0, 0, {}, {}, {}};
+    grid.north.fill(5e-7);
+    grid.east.fill(-5e-7);
+    grid.height.fill(43);
+    definition.grids = {grid};
+    Transformation transformation(definition);
+    for (std::size_t i = 0; i < 400; ++i) {
+      const TRectRgn& area = i % 2 ? grid.area : definition.areas[i % 4 / 2].area;
+      const Coordinates source = {
+          area.south + area.northExtent * share(3) + kRoundings[random() % 7],
+          area.west + area.eastExtent * share(3) + kRoundings[random() % 7], 100};
+      Transformed there;
+      try {
+        there = transformation.Forward(source);
+      } catch (const NotTransformable&) {
+        continue;  // outside
+      }
+      const Coordinates& target = there.plane ? *there.plane : there.target;
+      const double same = there.plane ? 1e-5 : 1e-11;
+      const Transformed back = transformation.Inverse(target);
+      const Coordinates& reached = back.plane ? *back.plane : back.target;
+      ASSERT_NEAR(reached.north, target.north, same);
+      ASSERT_NEAR(reached.east, target.east, same);
+      ASSERT_NEAR(reached.height, target.height, 1e-5);
+    }
+  }
+}
+
 /// A message set of random numbers, and the pipeline that PROJ would have of it.
 class RandomSet {
  public:

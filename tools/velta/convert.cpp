@@ -67,7 +67,7 @@ int DecodeStream(const Conversion& files) {
 
 int EncodeLines(const Conversion& files) {
   Input in(files.from);
-  Output out(files.to, OutputKind::kFrames, {files.from});
+  Output out(files.to, OutputKind::kBinary, {files.from});
   Progress progress;
   std::uint64_t bytes = 0;
   int status = kDone;

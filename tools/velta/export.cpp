@@ -45,6 +45,32 @@ void TakeFiles(Options& options) {
   }
 }
 
+/// Refuses what would have no effect, or another than is meant.
+void CheckUse(const Options& options) {
+  const auto& [horizontal, vertical] = options.grids;
+  const bool isGrid = options.format == "gtg";
+  const bool hasGrids = !horizontal.empty() || !vertical.empty();
+  if (isGrid && !hasGrids) throw CLI::RequiredError("--hgrid or --vgrid");
+  if (isGrid && horizontal == vertical) {
+    throw CLI::ValidationError("--vgrid", "the two grids need files of their own");
+  }
+  if (isGrid && options.output != "-") {
+    throw CLI::ValidationError("--output", "gtg writes the files of --hgrid and --vgrid");
+  }
+  if (hasGrids && !isGrid && options.format != "proj") {
+    throw CLI::ValidationError("--format", "only gtg and proj take grids");
+  }
+  const bool takesAll = isGrid || options.format == "geojson";
+  if (takesAll && options.latitude) {
+    throw CLI::ValidationError("--lat", options.format + " takes all areas");
+  }
+  for (const std::string& grid : {horizontal, vertical}) {
+    if (!isGrid && grid.find_first_of(",#\"") != grid.npos) {
+      throw CLI::ValidationError("--hgrid, --vgrid", "PROJ takes no \",\" nor \"#\" in a name");
+    }
+  }
+}
+
 /// The datum shift that is to be exported.
 /// \throws std::runtime_error when there is none, or more than one to choose from
 std::size_t ShiftOf(const Definition& definition, const Options& options) {
@@ -83,18 +109,21 @@ void WriteGrids(const Definition& definition, const Options& options, const Tell
   if (grids.horizontal.empty() && grids.vertical.empty()) {
     throw std::runtime_error("there is no residual grid to export");
   }
-  const auto write = [&](const std::string& bytes, const std::string& name, const char* kind) {
-    if (name.empty()) {
-      if (!bytes.empty())
-        tell("the " + std::string(kind) + " residuals, for which no file is named");
-    } else if (bytes.empty()) {
+  const auto check = [&](const std::string& bytes, const std::string& name, const char* kind) {
+    if (name.empty() && !bytes.empty()) {
+      tell("the " + std::string(kind) + " residuals, for which no file is named");
+    }
+    if (!name.empty() && bytes.empty()) {
       throw std::runtime_error(name + ": not written: there are no " + kind + " residuals");
-    } else {
-      Write(bytes, OutputKind::kFrames, name, options);
     }
   };
-  write(grids.horizontal, options.grids.horizontal, "horizontal");
-  write(grids.vertical, options.grids.vertical, "height");
+  check(grids.horizontal, options.grids.horizontal, "horizontal");
+  check(grids.vertical, options.grids.vertical, "height");
+  const auto write = [&](const std::string& bytes, const std::string& name) {
+    if (!name.empty()) Write(bytes, OutputKind::kBinary, name, options);
+  };
+  write(grids.horizontal, options.grids.horizontal);
+  write(grids.vertical, options.grids.vertical);
 }
 
 int Run(const Options& options) {
@@ -172,12 +201,7 @@ void AddExport(CLI::App& program, Action& action) {
       "  velta export --format geojson AUTO_DHDN_BESEL.dff");
   command->callback([&action, options] {
     TakeFiles(*options);
-    const bool isGrid = options->format == "gtg";
-    const bool hasGrids = !options->grids.horizontal.empty() || !options->grids.vertical.empty();
-    if (isGrid && !hasGrids) throw CLI::RequiredError("--hgrid or --vgrid");
-    if (hasGrids && !isGrid && options->format != "proj") {
-      throw CLI::ValidationError("--format", "only gtg and proj take grids");
-    }
+    CheckUse(*options);
     action = [options] { return Run(*options); };
   });
 }

@@ -171,7 +171,7 @@ Output::Output(const std::string& name, OutputKind kind, const std::vector<std::
   const fs::path path = isStandard ? fs::path() : orx::ToSystemPath(PathOf(name));
   RefuseInputs(inputs, path);
   const bool isTerminal = isStandard ? orx::FileFuncs::isTerminal(stdout) : IsTerminal(path);
-  if (isTerminal && kind == OutputKind::kFrames) {
+  if (isTerminal && kind == OutputKind::kBinary) {
     throw WrongCall("frames are not written to a terminal: name a file with -o, or use a pipe");
   }
   if (isStandard) return;

@@ -60,7 +60,7 @@ class Input {
 };
 
 /// What is written to an output.
-enum class OutputKind { kText, kFrames };
+enum class OutputKind { kText, kBinary };
 
 /// A file to write or, under the name "-", standard output. A file is written beside its place and
 /// gets its name when it is whole; until then what was there stays. Control characters, which may

@@ -220,7 +220,7 @@ std::vector<Message> Generate(const Options& options) {
 }
 
 int Run(const Options& options) {
-  Output out(options.output, options.json ? OutputKind::kText : OutputKind::kFrames,
+  Output out(options.output, options.json ? OutputKind::kText : OutputKind::kBinary,
              {options.datum, options.projection});
   const Busy busy("reading", {options.datum, options.projection});
   for (const Message& message : Generate(options)) {

@@ -1,6 +1,7 @@
 #include <CLI/App.hpp>
 #include <CLI/Config.hpp>
 #include <CLI/Formatter.hpp>
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <exception>
@@ -9,6 +10,7 @@
 #include <optional>
 #include <stdexcept>
 #include <string>
+#include <vector>
 
 #include "command.h"
 #include "definition_source.h"
@@ -45,6 +47,12 @@ Coordinates InMetres(const PositionLine& line) {
   return {line.north, line.east, line.height.value_or(0)};
 }
 
+std::vector<std::string> InputsOf(const Options& options) {
+  std::vector<std::string> inputs = options.source.names();
+  inputs.push_back(options.file);
+  return inputs;
+}
+
 /// Transforms positions line by line.
 class Work {
  public:
@@ -53,9 +61,7 @@ class Work {
         transformation_(Read(options.source)),
         isPlane_(transformation_.definition().projection.has_value()),
         in_(options.file),
-        out_(options.output, OutputKind::kText,
-             {options.source.datum, options.source.projection, options.source.messages,
-              options.file}) {}
+        out_(options.output, OutputKind::kText, InputsOf(options)) {}
 
   void DoAll() {
     std::string line;
@@ -76,6 +82,10 @@ class Work {
     if (withoutGrid_ > 0) {
       ReportNote("positions that no residual grid covers, transformed without: " +
                  std::to_string(withoutGrid_));
+    }
+    if (withoutHeight_ > 0 && withoutHeight_ < done_) {
+      ReportNote("positions without a height among others with one, taken at 0: " +
+                 std::to_string(withoutHeight_));
     }
     if (ellipsoidalHeights_ > 0) {
       ReportNote("heights that are ellipsoidal, not physical, for want of a height residual: " +
@@ -108,6 +118,7 @@ class Work {
       ++done_;
       if (!position.grid && !transformation_.definition().grids.empty()) ++withoutGrid_;
       if (given.height && position.lacksHeightResidual) ++ellipsoidalHeights_;
+      if (!given.height) ++withoutHeight_;
     } catch (const std::exception& error) {
       ReportFailure(options_.file + ":" + std::to_string(number_) + ": " + error.what());
       status_ = kFailed;
@@ -134,7 +145,12 @@ class Work {
       out += given.separator;
       AppendFixed(to.height, kDecimalsOfMetres, out);
     }
-    if (!given.rest.empty()) (out += given.separator) += given.rest;
+    if (!given.rest.empty()) {
+      (out += given.separator) += given.rest;
+      // Tabs would be shown as the control characters that they are.
+      std::replace(out.end() - static_cast<std::ptrdiff_t>(given.rest.size()), out.end(), '\t',
+                   ' ');
+    }
     if (options_.entries) {
       AppendEntry(given, position.area, out);
       AppendEntry(given, position.grid, out);
@@ -195,6 +211,7 @@ class Work {
   std::uint64_t done_ = 0;
   std::uint64_t withoutGrid_ = 0;
   std::uint64_t ellipsoidalHeights_ = 0;
+  std::uint64_t withoutHeight_ = 0;
   int status_ = kDone;
 };
 
@@ -202,10 +219,15 @@ int Run(const Options& options) {
   if (options.source.messages == "-" && options.file == "-") {
     throw WrongCall("positions and messages cannot both come from standard input: name a FILE");
   }
-  Work work(options);
-  FinishWhenInterrupted([&work] { return work.Finish(); });
-  work.DoAll();
-  return work.Finish();
+  std::unique_ptr<Work> work;
+  FinishWhenInterrupted([&work] {
+    if (work) return work->Finish();
+    ReportFailure("interrupted before the first position");
+    return kFailed;
+  });
+  work = std::make_unique<Work>(options);
+  work->DoAll();
+  return work->Finish();
 }
 
 }  // namespace

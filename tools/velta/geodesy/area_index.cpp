@@ -74,7 +74,8 @@ AreaIndex::~AreaIndex() = default;
 AreaIndex::AreaIndex(AreaIndex&&) noexcept = default;
 AreaIndex& AreaIndex::operator=(AreaIndex&&) noexcept = default;
 
-std::optional<std::size_t> AreaIndex::First(double north, double east, double margin) const {
+template <class Visit>
+void AreaIndex::VisitHolding(double north, double east, double margin, const Visit& visit) const {
   constexpr double kLeastShrinking = 1e-3;
   double marginNorth = margin;
   double marginEast = margin;
@@ -84,19 +85,29 @@ std::optional<std::size_t> AreaIndex::First(double north, double east, double ma
     marginEast = marginNorth / std::max(std::cos(north), kLeastShrinking);
     shownEast = std::remainder(east, kFullTurn);
   }
-  if (!std::isfinite(north) || !std::isfinite(east)) return std::nullopt;
-  const Box around = BoxOf(north - marginNorth, north + marginNorth, shownEast - marginEast,
-                           shownEast + marginEast);
-  std::optional<std::size_t> first;
+  if (!std::isfinite(north) || !std::isfinite(east)) return;
+  const Box around = BoxOf(north - std::abs(marginNorth), north + std::abs(marginNorth),
+                           shownEast - std::abs(marginEast), shownEast + std::abs(marginEast));
   for (auto item = tree_->qbegin(bg::index::intersects(around)); item != tree_->qend(); ++item) {
-    const std::size_t number = item->second;
-    if (first && number >= *first) continue;
-    const auto& [south, northExtent, west, eastExtent] = areas_[number];
+    const auto& [south, northExtent, west, eastExtent] = areas_[item->second];
     const TRectRgn larger{south - marginNorth, northExtent + 2 * marginNorth, west - marginEast,
                           eastExtent + 2 * marginEast};
-    if (larger.Inside(north, east, isPlane_)) first = number;
+    if (larger.Inside(north, east, isPlane_)) visit(item->second);
   }
+}
+
+std::optional<std::size_t> AreaIndex::First(double north, double east, double margin) const {
+  std::optional<std::size_t> first;
+  VisitHolding(north, east, margin, [&first](std::size_t number) {
+    if (!first || number < *first) first = number;
+  });
   return first;
+}
+
+std::vector<std::size_t> AreaIndex::All(double north, double east, double margin) const {
+  std::set<std::size_t> numbers;  // an area may have two boxes
+  VisitHolding(north, east, margin, [&numbers](std::size_t number) { numbers.insert(number); });
+  return {numbers.begin(), numbers.end()};
 }
 
 }  // namespace velta_tool

@@ -59,6 +59,12 @@ const double* SetStored(Projection& projection, const Message& kind, const doubl
                          });
 }
 
+/// A message has not the fields that another's types need.
+void RefuseType(Projection& projection, unsigned message) {
+  projection.problem =
+      "projection type " + std::to_string(projection.type) + " in a " + std::to_string(message);
+}
+
 /// What is wrong with the settings of a grid; empty when nothing is.
 std::string ProblemOf(const ResidualGrid& grid) {
   const auto isKnown = [](int method) { return method >= kBilinear && method <= kSpline; };
@@ -73,6 +79,13 @@ std::string ProblemOf(const ResidualGrid& grid) {
 }
 
 }  // namespace
+
+bool IsBounded(const Definition& definition) {
+  return std::any_of(definition.areas.begin(), definition.areas.end(), [](const DatumArea& held) {
+    return held.area.northExtent < velta::kWholeLatitude ||
+           held.area.eastExtent < velta::kWholeLongitude;
+  });
+}
 
 std::size_t AddShift(const velta::DatumData& datum, std::vector<DatumShift>& shifts) {
   DatumShift shift{{datum.sourceEllipsoid.a, datum.sourceEllipsoid.second},
@@ -112,6 +125,9 @@ ResidualGrid MakeGrid(std::string entry, const velta::TableData& table) {
 
 Projection ProjectionOf(const velta::Rtcm1025& message) {
   Projection projection = FromMessage(message, message.projectionType);
+  const bool isOfOthers =
+      projection.type == ProjectionType::LCC2SP || projection.type == ProjectionType::OM;
+  if (isOfOthers) RefuseType(projection, 1025);
   if (projection.type == ProjectionType::MC) {
     projection.scale = velta::kScaleFactor.toNumber(static_cast<double>(message.addSNO));
   }
@@ -119,11 +135,14 @@ Projection ProjectionOf(const velta::Rtcm1025& message) {
 }
 
 Projection ProjectionOf(const velta::Rtcm1026& message) {
-  return FromMessage(message, message.projectionType);
+  Projection projection = FromMessage(message, message.projectionType);
+  if (projection.type != ProjectionType::LCC2SP) RefuseType(projection, 1026);
+  return projection;
 }
 
 Projection ProjectionOf(const velta::Rtcm1027& message) {
   Projection projection = FromMessage(message, velta::TypeCodeOf(message));
+  if (message.projectionType != ProjectionType::OM) RefuseType(projection, 1027);
   projection.skew =
       projection.azimuth + velta::kProjectionAngle.toNumber(static_cast<double>(message.diffARSG));
   return projection;

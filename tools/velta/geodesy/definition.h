@@ -107,6 +107,9 @@ struct Definition {
   std::optional<Projection> projection;
 };
 
+/// True when there are positions outside an area of validity.
+bool IsBounded(const Definition& definition);
+
 /// Adds a datum's shift, unless it is there.
 /// \return its index in `shifts`
 std::size_t AddShift(const orx::cs::velta::DatumData& datum, std::vector<DatumShift>& shifts);

@@ -6,19 +6,9 @@
 #include "geodesy/proj_steps.h"
 
 namespace velta_tool {
-namespace {
-
-std::vector<TRectRgn> AreasOf(const Definition& definition) {
-  std::vector<TRectRgn> areas;
-  areas.reserve(definition.areas.size());
-  for (const DatumArea& area : definition.areas) areas.push_back(area.area);
-  return areas;
-}
-
-}  // namespace
 
 OffsetsInFront::OffsetsInFront(const Definition& definition)
-    : definition_(definition), areas_(AreasOf(definition), false) {
+    : definition_(definition), areas_(IndexOf(definition.areas, false)) {
   for (const DatumShift& shift : definition.shifts) {
     try {
       operations_.emplace_back(ProjOperation(context_, DatumSteps(shift)));

@@ -49,8 +49,8 @@ bool AnyApplies(const std::vector<ResidualGrid>& grids, bool ResidualGrid::*shif
                      [=](const ResidualGrid& grid) { return grid.*shift; });
 }
 
-void TellWhatIsMissing(const Definition& definition, const GridFiles& grids,
-                       const TellLeftOut& tell) {
+void TellWhatIsMissing(const Definition& definition, const DatumShift& shift,
+                       const GridFiles& grids, const TellLeftOut& tell) {
   if (grids.horizontal.empty() && AnyApplies(definition.grids, &ResidualGrid::horShift)) {
     tell("horizontal residuals: export them as gtg, and name the file by --hgrid");
   }
@@ -59,6 +59,19 @@ void TellWhatIsMissing(const Definition& definition, const GridFiles& grids,
   }
   if (definition.projection && !definition.planeGrids.empty()) {
     tell("the residuals of plane grids");
+  }
+  if (IsBounded(definition)) tell("the area of validity: it goes on outside");
+  if (grids.horizontal.empty() && grids.vertical.empty()) return;
+  tell("the way back: with grids it leads forward only");
+  const auto isCurved = [](const ResidualGrid& grid) {
+    return (grid.horShift && grid.horInterpolation != kBilinear) ||
+           (grid.vertShift && grid.vertInterpolation != kBilinear);
+  };
+  if (std::any_of(definition.grids.begin(), definition.grids.end(), isCurved)) {
+    tell("the interpolation by parabolas or splines, where PROJ's is bilinear");
+  }
+  if (!grids.vertical.empty() && shift.heightIndicator == kPhysicalOfSource) {
+    tell("positions outside the height grid, which fail");
   }
 }
 
@@ -80,7 +93,7 @@ std::string ProjPipeline(const Definition& definition, std::size_t shiftIndex,
   steps += definition.projection ? ProjectionSteps(*definition.projection, shift.targetAxes)
                                  : " +step +proj=unitconvert +xy_in=rad +xy_out=deg";
   steps += " +step +proj=axisswap +order=2,1";
-  TellWhatIsMissing(definition, grids, tell);
+  TellWhatIsMissing(definition, shift, grids, tell);
   return OnLines(std::move(steps));
 }
 

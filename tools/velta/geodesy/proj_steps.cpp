@@ -134,6 +134,9 @@ std::string ProjectionSteps(const Projection& projection, const std::array<doubl
       }
       [[fallthrough]];
     case ProjectionType::PS:
+      if (!IsPolar(projection)) {
+        throw NotTransformable("a polar stereographic projection whose origin is no pole");
+      }
       return step("stere", {{"lon_0", lon}, {"lat_0", pole}, {"k_0", k}}, fe, fn);
     case ProjectionType::ROM:
       return step("omerc",

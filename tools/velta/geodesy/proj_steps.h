@@ -31,8 +31,10 @@ std::string ProjectionSteps(const Projection& projection, const std::array<doubl
 /// True when an origin is the pole, but for the step of the messages.
 bool IsPolar(const Projection& projection);
 
-/// The northing of a parallel in Mercator's projection, without false northing. Source: EPSG
-/// Guidance Note 7-2, method 9804. \param latitude degrees \param axes of the ellipsoid, metres
+/// The northing of a parallel in Mercator's projection, without false northing: EPSG Guidance Note
+/// 7-2, method 9804.
+/// \param latitude degrees
+/// \param axes of the ellipsoid, metres
 /// \return metres
 double MercatorNorthing(double latitude, double scale, const std::array<double, 2>& axes);
 

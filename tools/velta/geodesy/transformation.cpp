@@ -12,46 +12,65 @@
 namespace velta_tool {
 namespace {
 
-/// Metres by which a position may lie outside an area that its own reverse is looked for in: more
-/// than the iteration leaves, less than anybody would notice.
-constexpr double kEdge = 0.005;
-/// The same for a position that is still to be moved by the datum shift.
-constexpr double kWholeShift = 5000;
+// Metres.
+/// By which a position may lie outside the area or the grid that its reverse was found with: more
+/// than what the iteration leaves, less than anybody would notice.
+constexpr double kEdge = 1e-4;
+/// More than any datum shift, and more than any horizontal residual.
+constexpr double kMostShift = 5000;
+constexpr double kMostResidual = 6;
 
 constexpr const char* kOutside = "no area holds the position";
 
+/// \return null when there is none
 template <class Held>
-AreaIndex IndexOf(const std::vector<Held>& held, bool isPlane) {
-  std::vector<TRectRgn> areas;
-  areas.reserve(held.size());
-  for (const Held& one : held) areas.push_back(one.area);
-  return {std::move(areas), isPlane};
-}
-
-std::optional<std::size_t> Find(const AreaIndex& index, const Coordinates& position,
-                                double margin) {
+const Held* FirstOf(const AreaIndex& index, const std::vector<Held>& held,
+                    const Coordinates& position) {
   const auto found = index.First(position.north, position.east);
-  if (found || margin == 0) return found;
-  return index.First(position.north, position.east, margin);
+  return found ? &held[*found] : nullptr;
 }
 
-/// The grid for a position; null when there is none.
-/// \throws NotTransformable when it cannot be used
-const ResidualGrid* GridAt(const AreaIndex& index, const std::vector<ResidualGrid>& grids,
-                           const Coordinates& position, double margin) {
-  const auto found = Find(index, position, margin);
-  if (!found) return nullptr;
-  const ResidualGrid& grid = grids[*found];
-  if (!grid.problem.empty()) {
-    throw NotTransformable("the residual grid of " + Printable(grid.entry) +
-                           " cannot be used: " + grid.problem);
+/// The first of those that hold a position which a condition is true of; on an edge the position is
+/// in all that meet there.
+/// \return null when there is none
+template <class Held, class Condition>
+const Held* FirstAround(const AreaIndex& index, const std::vector<Held>& held,
+                        const Coordinates& position, const Condition& condition) {
+  const auto surely = index.First(position.north, position.east, -kEdge);
+  for (const std::size_t number : index.All(position.north, position.east, kEdge)) {
+    if (surely && number > *surely) break;
+    if (condition(held[number])) return &held[number];
   }
-  return &grid;
+  return nullptr;
 }
 
-/// Longitudes by the shorter way.
-double TurnedEast(double east, bool isPlane) {
-  return isPlane ? east : std::remainder(east, 2 * kPi);
+/// \param grid may be null
+/// \throws NotTransformable when it cannot be used
+void RequireUsable(const ResidualGrid* grid) {
+  if (!grid || grid->problem.empty()) return;
+  throw NotTransformable("the residual grid of " + Printable(grid->entry) +
+                         " cannot be used: " + grid->problem);
+}
+
+/// The grids that a position may be in once its residuals are known, in their order, and at last
+/// none.
+std::vector<const ResidualGrid*> GridsNear(const AreaIndex& index,
+                                           const std::vector<ResidualGrid>& grids,
+                                           const Coordinates& position) {
+  std::vector<const ResidualGrid*> near;
+  for (const std::size_t number : index.All(position.north, position.east, kMostResidual)) {
+    near.push_back(&grids[number]);
+  }
+  near.push_back(nullptr);
+  return near;
+}
+
+/// True when a position has the grid that was taken for it; null: none.
+bool IsTaken(const AreaIndex& index, const std::vector<ResidualGrid>& grids,
+             const ResidualGrid* grid, const Coordinates& position) {
+  if (!grid) return !index.First(position.north, position.east, -kEdge);
+  return FirstAround(index, grids, position,
+                     [grid](const ResidualGrid& held) { return &held == grid; }) != nullptr;
 }
 
 }  // namespace
@@ -64,48 +83,31 @@ Transformation::Transformation(Definition definition)
       prepared_(definition_.shifts.size()) {}
 
 Transformed Transformation::Forward(const Coordinates& source) {
-  const DatumArea* const area = FindArea(source, 0);
+  const DatumArea* const area = FirstOf(areas_, definition_.areas, source);
   if (!area) throw NotTransformable(kOutside);
-  const Transformed position = Apply(source, *area, 0);
+  const Transformed position = Apply(source, *area, FirstOf(grids_, definition_.grids, source));
   Note(position);
   return position;
 }
 
 Transformed Transformation::Inverse(const Coordinates& target) {
-  std::optional<Transformed> found = Reverse(target, 0);
-  // On an edge, where rounding takes a position in and out again.
-  if (!found) found = Reverse(target, kEdge);
-  if (!found) throw NotTransformable("its reverse is not found by iteration");
-  Note(*found);
-  return *found;
-}
-
-std::optional<Transformed> Transformation::Reverse(const Coordinates& target, double margin) {
-  constexpr int kMostSteps = 10;
-  constexpr double kSameAngle = 1e-12;  // radians
-  constexpr double kSameLength = 1e-5;  // metres
-  const bool isPlane = definition_.projection.has_value();
-  const double same = isPlane ? kSameLength : kSameAngle;
-  Coordinates aim = target;
-  const DatumArea* area = &AreaNear(target);
-  for (int step = 0; step < kMostSteps; ++step) {
-    const Coordinates source = Back(aim, *area);
-    area = FindArea(source, margin);
-    if (!area) break;
-    const Transformed reached = Apply(source, *area, margin);
-    const Coordinates& at = isPlane ? *reached.plane : reached.target;
-    const Coordinates missed = {target.north - at.north, TurnedEast(target.east - at.east, isPlane),
-                                target.height - at.height};
-    if (std::abs(missed.north) < same && std::abs(missed.east) < same &&
-        std::abs(missed.height) < kSameLength) {
-      return reached;
+  const Coordinates near = Unprojected(target);
+  std::string refused = kOutside;
+  std::vector<std::optional<std::size_t>> tried;
+  for (const std::size_t number : areas_.All(near.north, near.east, kMostShift)) {
+    const DatumArea& area = definition_.areas[number];
+    if (std::find(tried.begin(), tried.end(), area.shift) != tried.end()) continue;
+    tried.push_back(area.shift);
+    try {
+      const std::optional<Transformed> found = ReverseIn(target, area);
+      if (!found) continue;
+      Note(*found);
+      return *found;
+    } catch (const NotTransformable& reason) {
+      refused = reason.what();
     }
-    aim.north += missed.north;
-    aim.east += missed.east;
-    aim.height += missed.height;
   }
-  if (!area && margin > 0) throw NotTransformable(kOutside);
-  return std::nullopt;
+  throw NotTransformable(refused);
 }
 
 const Transformation::Operations& Transformation::OperationsOf(const DatumArea& area) {
@@ -133,44 +135,32 @@ const Transformation::Operations& Transformation::OperationsOf(const DatumArea& 
   return *prepared.operations;
 }
 
-const DatumArea* Transformation::FindArea(const Coordinates& source, double margin) const {
-  const auto found = Find(areas_, source, margin);
-  return found ? &definition_.areas[*found] : nullptr;
-}
-
-const DatumArea& Transformation::AreaNear(const Coordinates& target) {
-  Coordinates near = target;
-  if (definition_.projection) {
-    const auto usable = std::find_if(definition_.areas.begin(), definition_.areas.end(),
-                                     [](const DatumArea& area) { return area.shift.has_value(); });
-    if (usable == definition_.areas.end()) throw NotTransformable("no entry can be used");
-    near = OperationsOf(*usable).projection->Inverse(target);
-  }
-  const DatumArea* const area = FindArea(near, kWholeShift);
-  if (!area) throw NotTransformable(kOutside);
-  return *area;
-}
-
-Transformed Transformation::Apply(const Coordinates& source, const DatumArea& area, double margin) {
+Transformed Transformation::Apply(const Coordinates& source, const DatumArea& area,
+                                  const ResidualGrid* grid,
+                                  std::optional<const ResidualGrid*> planeGrid) {
   Transformed to{source, {}, std::nullopt};
   to.area = &area;
+  to.grid = grid;
+  RequireUsable(grid);
   const Operations& operations = OperationsOf(area);
   to.target = operations.datum.Forward(source);
-  to.grid = GridAt(grids_, definition_.grids, source, margin);
   double heightResidual = 0;
   bool hasHeightResidual = false;
-  const auto add = [&](const ResidualGrid* grid, const Coordinates& at, Coordinates& moved) {
-    if (!grid) return;
-    const Residuals residuals = Interpolate(*grid, at.north, at.east, grid == to.planeGrid);
+  const auto add = [&](const ResidualGrid* read, const Coordinates& at, Coordinates& moved) {
+    if (!read) return;
+    const Residuals residuals = Interpolate(*read, at.north, at.east, read == to.planeGrid);
     moved.north += residuals.north;
     moved.east += residuals.east;
     heightResidual += residuals.height;
-    hasHeightResidual = hasHeightResidual || grid->vertShift;
+    hasHeightResidual = hasHeightResidual || read->vertShift;
   };
   add(to.grid, source, to.target);
+  if (std::abs(to.target.north) > kPi / 2) throw NotTransformable("it comes to lie beyond a pole");
+  if (std::abs(to.target.east) > kPi) to.target.east = std::remainder(to.target.east, 2 * kPi);
   if (operations.projection) {
     to.plane = operations.projection->Forward(to.target);
-    to.planeGrid = GridAt(planeGrids_, definition_.planeGrids, *to.plane, margin);
+    to.planeGrid = planeGrid ? *planeGrid : FirstOf(planeGrids_, definition_.planeGrids, *to.plane);
+    RequireUsable(to.planeGrid);
     add(to.planeGrid, Coordinates(*to.plane), *to.plane);
   }
   const std::uint32_t heightIndicator = definition_.shifts[*area.shift].heightIndicator;
@@ -183,10 +173,90 @@ Transformed Transformation::Apply(const Coordinates& source, const DatumArea& ar
   return to;
 }
 
-Coordinates Transformation::Back(const Coordinates& aim, const DatumArea& area) {
+Coordinates Transformation::Unprojected(const Coordinates& target) {
+  if (!definition_.projection) return target;
+  std::string refused = kOutside;
+  for (const DatumArea& area : definition_.areas) {
+    try {
+      return OperationsOf(area).projection->Inverse(target);
+    } catch (const NotTransformable& reason) {
+      refused = reason.what();
+    }
+  }
+  throw NotTransformable(refused);
+}
+
+Coordinates Transformation::Back(const Coordinates& target, const DatumArea& area) {
   const Operations& operations = OperationsOf(area);
-  const Coordinates target = operations.projection ? operations.projection->Inverse(aim) : aim;
-  return operations.datum.Inverse(target);
+  return operations.datum.Inverse(operations.projection ? operations.projection->Inverse(target)
+                                                        : target);
+}
+
+std::optional<Transformed> Transformation::ReverseIn(const Coordinates& target,
+                                                     const DatumArea& area) {
+  const Coordinates guess = Back(target, area);
+  bool isInArea = false;
+  std::string refused = "its reverse is not found by iteration";
+  for (const ResidualGrid* const grid : GridsNear(grids_, definition_.grids, guess)) {
+    for (const ResidualGrid* const planeGrid :
+         GridsNear(planeGrids_, definition_.planeGrids, target)) {
+      std::optional<Transformed> reached;
+      try {
+        reached = Iterate(target, area, grid, planeGrid);
+      } catch (const NotTransformable& reason) {
+        refused = reason.what();
+      }
+      if (!reached) continue;
+      const DatumArea* const holder =
+          FirstAround(areas_, definition_.areas, reached->source,
+                      [&area](const DatumArea& held) { return held.shift == area.shift; });
+      if (!holder) continue;
+      isInArea = true;
+      if (!IsWhereItIsTaken(*reached)) continue;
+      Transformed found = *reached;
+      found.area = holder;
+      return found;
+    }
+  }
+  if (isInArea) throw NotTransformable(refused);
+  return std::nullopt;
+}
+
+std::optional<Transformed> Transformation::Iterate(const Coordinates& target, const DatumArea& area,
+                                                   const ResidualGrid* grid,
+                                                   const ResidualGrid* planeGrid) {
+  constexpr int kMostSteps = 10;
+  constexpr double kSameAngle = 1e-12;  // radians
+  constexpr double kSameLength = 1e-5;  // metres
+  const bool isPlane = definition_.projection.has_value();
+  const double same = isPlane ? kSameLength : kSameAngle;
+  Coordinates aim = target;
+  for (int step = 0; step < kMostSteps; ++step) {
+    const Transformed reached = Apply(Back(aim, area), area, grid, planeGrid);
+    const Coordinates& at = isPlane ? *reached.plane : reached.target;
+    Coordinates missed = {target.north - at.north, target.east - at.east,
+                          target.height - at.height};
+    double eastWay = missed.east;
+    if (!isPlane) {
+      missed.east = std::remainder(missed.east, 2 * kPi);
+      eastWay = missed.east * std::cos(target.north);
+    }
+    if (std::abs(missed.north) < same && std::abs(eastWay) < same &&
+        std::abs(missed.height) < kSameLength) {
+      return reached;
+    }
+    aim.north += missed.north;
+    aim.east += missed.east;
+    aim.height += missed.height;
+  }
+  return std::nullopt;
+}
+
+bool Transformation::IsWhereItIsTaken(const Transformed& reached) {
+  if (!IsTaken(grids_, definition_.grids, reached.grid, reached.source)) return false;
+  if (!reached.plane || definition_.planeGrids.empty()) return true;
+  const Coordinates projected = OperationsOf(*reached.area).projection->Forward(reached.target);
+  return IsTaken(planeGrids_, definition_.planeGrids, reached.planeGrid, projected);
 }
 
 void Transformation::Note(const Transformed& position) {
@@ -199,7 +269,8 @@ void Transformation::Note(const Transformed& position) {
   const TRectRgn& area = position.area->area;
   const bool isWhole = area.northExtent >= kPi && area.eastExtent >= 2 * kPi;
   if (!isWhole) use(Reading::kWholeExtents);
-  if (position.grid) use(Reading::kGridAtSource);
+  const bool isGridRead = position.grid && (position.grid->horShift || position.grid->vertShift);
+  if (isGridRead) use(Reading::kGridAtSource);
   if (position.planeGrid) use(Reading::kPlaneGrid);
   bool hasHeightResidual = false;
   for (const ResidualGrid* grid : {position.grid, position.planeGrid}) {

@@ -36,8 +36,8 @@ class Transformation {
   /// \throws NotTransformable when no area holds the position, and for what cannot be applied
   Transformed Forward(const Coordinates& source);
 
-  /// \param target northing, easting and height, without a projection latitude, longitude and
-  /// height \throws NotTransformable as above, and when the iteration does not end
+  /// \param target northing, easting, height; without a projection latitude, longitude, height
+  /// \throws NotTransformable as above, and when the iteration does not end
   Transformed Inverse(const Coordinates& target);
 
   const Definition& definition() const { return definition_; }
@@ -57,15 +57,24 @@ class Transformation {
   };
 
   const Operations& OperationsOf(const DatumArea& area);
-  /// \param margin metres by which areas and grids are taken for larger
-  const DatumArea* FindArea(const Coordinates& source, double margin) const;
-  /// The area that holds, but for the shift, a position of the target.
-  const DatumArea& AreaNear(const Coordinates& target);
-  Transformed Apply(const Coordinates& source, const DatumArea& area, double margin);
-  /// \return nothing when the iteration does not end
-  std::optional<Transformed> Reverse(const Coordinates& target, double margin);
+  /// \param planeGrid the one that is to be used; nothing: the one that holds the plane position
+  Transformed Apply(const Coordinates& source, const DatumArea& area, const ResidualGrid* grid,
+                    std::optional<const ResidualGrid*> planeGrid = std::nullopt);
+
+  // The inverse. Which area and which grids a position is in is known of the source only: each that
+  // comes into question is tried, and stands when the source turns out to be in it.
+  using Grids = std::vector<const ResidualGrid*>;
+  /// A position of the target in latitude and longitude.
+  Coordinates Unprojected(const Coordinates& target);
   /// Without the residuals.
-  Coordinates Back(const Coordinates& aim, const DatumArea& area);
+  Coordinates Back(const Coordinates& target, const DatumArea& area);
+  /// \return nothing when the source is not where this area's shift applies
+  std::optional<Transformed> ReverseIn(const Coordinates& target, const DatumArea& area);
+  /// \return nothing when the iteration does not end
+  std::optional<Transformed> Iterate(const Coordinates& target, const DatumArea& area,
+                                     const ResidualGrid* grid, const ResidualGrid* planeGrid);
+  bool IsWhereItIsTaken(const Transformed& reached);
+
   void Note(const Transformed& position);
   void NoteGrid(const ResidualGrid& grid);
 

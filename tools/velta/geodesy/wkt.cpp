@@ -244,6 +244,7 @@ void TellWhatIsMissing(const Definition& definition, const DatumShift& shift,
          "those of the satellites' system; a position without a height is taken for one of height "
          "0");
   }
+  if (IsBounded(definition)) tell("the area of validity: it goes on outside");
   if (!definition.grids.empty()) tell("the residual grids");
   if (definition.projection && !definition.planeGrids.empty()) tell("the plane grids");
 }
