@@ -45,26 +45,26 @@ std::string Completing(const Argument& argument) {
   }
 }
 
-/// The specifications of an argument, each followed by a blank; an option has one by each name.
-std::string Specification(const Argument& argument) {
+/// The lines of an argument, each followed by a blank; an option has one by each name.
+std::string LineFor(const Argument& argument) {
   if (!argument.isOption)
     return Quoted((argument.isRepeated ? "*" : "") + Completing(argument)) + ' ';
-  std::string specification;
+  std::string line;
   for (const std::string& name : argument.names) {
     const char* const follows = argument.kind == Kind::kFlag ? "" : name.size() == 2 ? "+" : "=";
-    specification += Quoted('(' + Joined(argument.names, " ") + ')' + name + follows + '[' +
-                            Escaped(argument.text) + ']' + Completing(argument)) +
-                     ' ';
+    line += Quoted('(' + Joined(argument.names, " ") + ')' + name + follows + '[' +
+                   Escaped(argument.text) + ']' + Completing(argument)) +
+            ' ';
   }
-  return specification;
+  return line;
 }
 
 std::string Arguments(const CLI::App& command) {
-  std::string specifications;
+  std::string lines;
   for (const Argument& argument : velta_tool::ArgumentsOf(command)) {
-    specifications += Specification(argument);
+    lines += LineFor(argument);
   }
-  return specifications;
+  return lines;
 }
 
 }  // namespace

@@ -149,7 +149,7 @@ const velta::RtcmBasicTransformMessage& BasicMessage(const velta::MsgUtilized& s
   return *set.msg1022;
 }
 
-ReceivedEntry ReceivedDatum(const velta::MsgUtilized& set) {
+velta::DatumData DatumOf(const velta::MsgUtilized& set) {
   const velta::RtcmBasicTransformMessage& message = BasicMessage(set);
   DatumData datum;
   datum.targetDatumName = velta::CleanDatumName(message.targetName);
@@ -161,7 +161,13 @@ ReceivedEntry ReceivedDatum(const velta::MsgUtilized& set) {
   if (set.msg1022) velta::ConvertRotationPoint(*set.msg1022, datum);
   velta::ConvertValidityArea(message, datum);
   if (set.msg1023) velta::ConvertEllipsoidalGrid(*set.msg1023, datum.grid);
-  return {message.messageType + 1000, velta::DatumEntryName(message, set.msg1023), Describe(datum)};
+  return datum;
+}
+
+ReceivedEntry ReceivedDatum(const velta::MsgUtilized& set) {
+  const velta::RtcmBasicTransformMessage& message = BasicMessage(set);
+  return {message.messageType + 1000, velta::DatumEntryName(message, set.msg1023),
+          Describe(DatumOf(set))};
 }
 
 std::vector<ReceivedEntry> ReceivedProjections(const velta::MsgUtilized& set) {

@@ -9,6 +9,7 @@
 #include "orxregistry/in_file_key.h"
 #include "orxregistry/registry_key.h"
 #include "projmath/rect_rgn.h"
+#include "velta/datum_data.h"
 #include "velta/rtcm_messages.h"
 
 /// The entries of datum and projection files as they are stored, and as the library would store
@@ -52,6 +53,9 @@ bool HoldsOtherKind(const std::string& file);
 /// The datum message of a set that has one.
 const orx::cs::velta::RtcmBasicTransformMessage& BasicMessage(
     const orx::cs::velta::MsgUtilized& set);
+
+/// What the datum message of a set and its residual grid describe.
+orx::cs::velta::DatumData DatumOf(const orx::cs::velta::MsgUtilized& set);
 
 /// What a message set becomes: an entry's name, and what would be stored.
 struct ReceivedEntry {

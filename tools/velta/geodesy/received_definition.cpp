@@ -17,18 +17,6 @@ namespace {
 namespace velta = orx::cs::velta;
 using orx::ToUtf8;
 
-velta::DatumData DatumOf(const velta::MsgUtilized& records) {
-  const velta::RtcmBasicTransformMessage& message = BasicMessage(records);
-  velta::DatumData datum;
-  velta::ConvertEllipsoids(message, datum);
-  datum.computationIndicator = message.computationIndicator;
-  datum.heightIndicator = message.heightIndicator;
-  velta::ConvertParameters(message, datum);
-  if (records.msg1022) velta::ConvertRotationPoint(*records.msg1022, datum);
-  velta::ConvertValidityArea(message, datum);
-  return datum;
-}
-
 /// The first of the messages 1025, 1027 and 1026 that is there: the library takes them so.
 std::optional<Projection> ProjectionIn(const velta::MsgUtilized& records) {
   const velta::Rtcm1024* const grid = records.msg1024;
@@ -53,15 +41,12 @@ void ReceivedDefinition::Add(const velta::rtcm3::MessageSet& set) {
   const velta::MsgUtilized records = set.Records();
   const velta::RtcmBasicTransformMessage& message = BasicMessage(records);
   const std::string entry = ToUtf8(velta::DatumEntryName(message, records.msg1023));
-  AddArea(records, entry);
+  const velta::DatumData datum = DatumOf(records);
+  AddArea(message, datum, entry);
   if (std::find(targets_.begin(), targets_.end(), message.targetName) == targets_.end()) {
     targets_.push_back(message.targetName);
   }
-  if (records.msg1023) {
-    velta::TableData table;
-    velta::ConvertEllipsoidalGrid(*records.msg1023, table);
-    AddGrid(MakeGrid(entry, table), grids_, definition_.grids);
-  }
+  if (records.msg1023) AddGrid(MakeGrid(entry, datum.grid), grids_, definition_.grids);
   const std::optional<Projection> projection = ProjectionIn(records);
   if (!projection) return;
   AddProjection(*projection);
@@ -72,11 +57,10 @@ void ReceivedDefinition::Add(const velta::rtcm3::MessageSet& set) {
   }
 }
 
-void ReceivedDefinition::AddArea(const velta::MsgUtilized& records, const std::string& entry) {
-  const velta::RtcmBasicTransformMessage& message = BasicMessage(records);
-  const velta::DatumData datum = DatumOf(records);
-  definition_.sourceName = ToUtf8(velta::NormaliseSourceName(message.sourceName));
-  definition_.targetName = ToUtf8(velta::CleanDatumName(message.targetName));
+void ReceivedDefinition::AddArea(const velta::RtcmBasicTransformMessage& message,
+                                 const velta::DatumData& datum, const std::string& entry) {
+  definition_.sourceName = ToUtf8(datum.sourceDatumName);
+  definition_.targetName = ToUtf8(datum.targetDatumName);
   const double(&area)[4] = datum.validityArea;
   const std::size_t shift = AddShift(datum, definition_.shifts);
   const DatumArea received{entry, {area[0], area[1], area[2], area[3]}, shift};

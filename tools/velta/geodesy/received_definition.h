@@ -25,7 +25,8 @@ class ReceivedDefinition {
   std::size_t changes() const { return changes_; }
 
  private:
-  void AddArea(const orx::cs::velta::MsgUtilized& records, const std::string& entry);
+  void AddArea(const orx::cs::velta::RtcmBasicTransformMessage& message,
+               const orx::cs::velta::DatumData& datum, const std::string& entry);
   void AddGrid(ResidualGrid grid, std::map<std::string, std::size_t>& known,
                std::vector<ResidualGrid>& grids);
   void AddProjection(Projection projection);
