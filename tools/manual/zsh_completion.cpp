@@ -45,7 +45,7 @@ std::string Completing(const Argument& argument) {
   }
 }
 
-/// The lines of an argument, each followed by a blank; an option has one by each name.
+/// What completes an argument, each part followed by a blank; an option has one by each name.
 std::string LineFor(const Argument& argument) {
   if (!argument.isOption)
     return Quoted((argument.isRepeated ? "*" : "") + Completing(argument)) + ' ';

@@ -26,8 +26,6 @@ std::string Geocentric(const char* operation, const std::array<double, 2>& axes)
   return Step(operation, {{"a", axes[0]}, {"b", axes[1]}});
 }
 
-double Flattening(const std::array<double, 2>& axes) { return (axes[0] - axes[1]) / axes[0]; }
-
 }  // namespace
 
 std::string ProjNumber(double number) {
@@ -37,6 +35,8 @@ std::string ProjNumber(double number) {
       std::to_chars(digits.begin(), digits.end(), number, std::chars_format::general, kDigits);
   return {digits.data(), result.ptr};
 }
+
+double Flattening(const std::array<double, 2>& axes) { return (axes[0] - axes[1]) / axes[0]; }
 
 std::string DatumSteps(const DatumShift& shift) {
   const auto& [source, target, parameters, method, height] = shift;

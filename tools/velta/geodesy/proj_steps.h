@@ -18,6 +18,9 @@ struct NotTransformable : std::runtime_error {
 /// A double as PROJ reads it, without the rounding of its own computation behind the 15th digit.
 std::string ProjNumber(double number);
 
+/// \param axes semi-major and semi-minor axis of an ellipsoid
+double Flattening(const std::array<double, 2>& axes);
+
 /// From the source system to the target system.
 /// \throws NotTransformable for indicators that are reserved
 std::string DatumSteps(const DatumShift& shift);

@@ -16,8 +16,9 @@ namespace {
 /// By which a position may lie outside the area or the grid that its reverse was found with: more
 /// than what the iteration leaves, less than anybody would notice.
 constexpr double kEdge = 1e-4;
-/// More than any datum shift, and more than any horizontal residual.
-constexpr double kMostShift = 5000;
+/// More than the translations and the scale of a message together, and more than any horizontal
+/// residual.
+constexpr double kMostShift = 20000;
 constexpr double kMostResidual = 6;
 
 constexpr const char* kOutside = "no area holds the position";

@@ -199,13 +199,10 @@ ordered_json TransformationOf(const std::string& name, const DatumShift& shift) 
                              Length("Y-axis translation", 8606, p[1]),
                              Length("Z-axis translation", 8607, p[2])};
   if (shift.computationIndicator == kAbridgedMolodenski) {
-    const auto flattening = [](const std::array<double, 2>& axes) {
-      return (axes[0] - axes[1]) / axes[0];
-    };
     parameters.push_back(Length("Semi-major axis length difference", 8654,
                                 shift.targetAxes[0] - shift.sourceAxes[0]));
     parameters.push_back(Ratio("Flattening difference", 8655,
-                               flattening(shift.targetAxes) - flattening(shift.sourceAxes)));
+                               Flattening(shift.targetAxes) - Flattening(shift.sourceAxes)));
     return Operation(name, Identified("Abridged Molodensky", 9605), std::move(parameters));
   }
   parameters.push_back(Rotation("X-axis rotation", 8608, p[3]));
