@@ -175,8 +175,10 @@ void AddParameters(int code, const double (&parameters)[16], Description& descri
 }
 
 ordered_json EllipsoidJson(double a, double b) {
-  ordered_json ellipsoid = {{"a", a}, {"b", b}};
-  if (a != b) ellipsoid["1/f"] = a / (a - b);
+  ordered_json ellipsoid = ordered_json::object();
+  if (a != b) ellipsoid["1/f"] = a / (a - b);  // in front, as the unit at the end is the lengths'
+  ellipsoid["a"] = a;
+  ellipsoid["b"] = b;
   return ellipsoid;
 }
 

@@ -40,6 +40,7 @@ struct Sheet {
   double factor;         ///< from what is stored to arc-seconds or metres
   double residualUnits;  ///< of north and east residuals
   json files = json::array();
+  json systems = json::array();  ///< of the files: [source, target], empty when not known
   json areas = json::array();
   json fileOf = json::array();
   json entries = json::array();
@@ -115,9 +116,9 @@ void AddWindow(const ResidualGrid& grid, Sheet& sheet) {
   sheet.methods.push_back(grid.vertShift ? grid.vertInterpolation : -1);
 }
 
-void AddFile(const std::string& file, const std::vector<DatumArea>& areas,
+void AddFile(const std::string& file, const Definition& definition,
              const std::vector<ResidualGrid>& windows, Sheet& sheet) {
-  AddAreas(areas, sheet);
+  AddAreas(definition.areas, sheet);
   std::size_t unplaced = 0;
   for (const ResidualGrid& window : windows) {
     if (IsDrawable(window.area)) {
@@ -131,14 +132,21 @@ void AddFile(const std::string& file, const std::vector<DatumArea>& areas,
                ": residual grids that lie nowhere and are not shown: " + std::to_string(unplaced));
   }
   sheet.files.push_back(Printable(NameOf(PathOf(file).filename())));
+  sheet.systems.push_back({Printable(definition.sourceName), Printable(definition.targetName)});
 }
 
 json ToJson(Sheet sheet) {
-  return {{"files", std::move(sheet.files)},      {"areas", std::move(sheet.areas)},
-          {"residualUnits", sheet.residualUnits}, {"heightUnits", kLengthUnits},
-          {"fileOf", std::move(sheet.fileOf)},    {"entries", std::move(sheet.entries)},
-          {"places", std::move(sheet.places)},    {"methods", std::move(sheet.methods)},
-          {"means", std::move(sheet.means)},      {"residuals", std::move(sheet.residuals)},
+  return {{"files", std::move(sheet.files)},
+          {"systems", std::move(sheet.systems)},
+          {"areas", std::move(sheet.areas)},
+          {"residualUnits", sheet.residualUnits},
+          {"heightUnits", kLengthUnits},
+          {"fileOf", std::move(sheet.fileOf)},
+          {"entries", std::move(sheet.entries)},
+          {"places", std::move(sheet.places)},
+          {"methods", std::move(sheet.methods)},
+          {"means", std::move(sheet.means)},
+          {"residuals", std::move(sheet.residuals)},
           {"problems", std::move(sheet.problems)}};
 }
 
@@ -165,11 +173,11 @@ int Run(const Options& options) {
   for (const std::string& file : options.files) {
     if (KindOf(file) == FileKind::kDatum) {
       const Definition definition = ReadDatumFile(file);
-      AddFile(file, definition.areas, definition.grids, datums);
+      AddFile(file, definition, definition.grids, datums);
     } else {
       Definition definition;
       AddProjectionFile(file, definition);
-      AddFile(file, {}, definition.planeGrids, projections);
+      AddFile(file, definition, definition.planeGrids, projections);
     }
   }
   const json data = {{"datums", ToJson(std::move(datums))},

@@ -126,14 +126,34 @@ function stepButtons(sheet) {
                  button("›", "Next window", 1));
 }
 
-// Shows what is pointed at, else what is kept, else what can be done.
+// What the signs of the map say, for who sees such a map for the first time.
+function readingDetails(sheet) {
+  const title = element("h2", {}, "How to read this map");
+  if (sheet.windows.length === 0) {
+    return [title, element("p", {}, "There are no grid windows in these files.")];
+  }
+  const paragraph = (...text) => element("p", {}, ...text);
+  const term = (text) => element("b", {}, text);
+  return [
+    title,
+    paragraph("A ", term("grid window"), " has 4 × 4 points with residuals, from edge to edge. Between " +
+        "the points they are interpolated."),
+    paragraph("An ", term("arrow"), " shows which way, and by the scale of the legend how far on the " +
+        "ground, a position is moved."),
+    paragraph("A ", term("colour"), " shows what is added to the height. Where the target has physical " +
+        "heights, it is how far their zero lies above the ellipsoid, and is taken off."),
+    paragraph("From afar a window has one arrow and one colour, its mean. Zoom in for those of its points, " +
+        "and for numbers."),
+    paragraph("Point at a window for all its numbers."),
+  ];
+}
+
+// Shows what is pointed at, else what is kept, else how to read the map.
 // place: [longitude or easting, latitude or northing] that is pointed at, if any
 function showDetails(sheet, place) {
   const window = sheet.hovered ?? (place ? null : sheet.selected);
   const children = window ? windowDetails(sheet, window) :
-      place ? placeDetails(sheet, place) :
-      [element("h2", {}, "Numbers"), element("p", {}, sheet.windows.length > 0 ?
-          "Point at a window of the map." : "There are no windows in these files.")];
+      place ? placeDetails(sheet, place) : readingDetails(sheet);
   if (sheet.windows.length > 0) {
     children[0] = element("div", {class: "title"}, children[0], stepButtons(sheet));
   }

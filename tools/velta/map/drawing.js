@@ -144,12 +144,16 @@ function placeText(texts, hasRoom, text, x, y, anchor, name) {
   texts.append(element);
 }
 
+// Returns whether an edge of an area is in view.
 function drawAreas(sheet, plot, texts, hasRoom) {
+  let hasEdge = false;
   const paths = new Map(sheet.files.map((file) => [file, ""]));
   for (const area of sheet.areas) {
     if (!area.file.isShown) continue;
     const drawn = onScreen(sheet, area);
     if (!meets(drawn, plot)) continue;
+    hasEdge ||= drawn.left >= plot.left || drawn.right <= plot.right ||
+        drawn.top >= plot.top || drawn.bottom <= plot.bottom;
     paths.set(area.file, paths.get(area.file) + drawn.rings.map(pathOf).join(""));
     const text = `valid for ${countText(area.entries, "entry", "entries")}`;
     const [x, y] = drawn.rings[0][drawn.rings[0].length - 1];  // its north-west corner
@@ -159,6 +163,7 @@ function drawAreas(sheet, plot, texts, hasRoom) {
   }
   layers.areas.replaceChildren(...sheet.files.map(
       (file, index) => svgElement("path", {class: `area file${index % kFileColours}`, d: paths.get(file)})));
+  return hasEdge;
 }
 
 // The vector of residuals in pixels, turned as north is at its place.
@@ -213,7 +218,7 @@ function drawWindows(sheet, plot, texts, hasRoom) {
   }
   const paths = {cells: Array(kColours).fill(""), plain: "", silhouettes: "", outlines: "",
                  problems: "", points: "", arrows: ""};
-  let [hasArrows, hasNumbers] = [false, false];
+  const shown = {arrows: "none", heights: "none"};
   for (const [window, drawn] of inView) {
     const path = windowPath(drawn);
     if (drawn.size >= kOutlineFrom) {
@@ -230,13 +235,16 @@ function drawWindows(sheet, plot, texts, hasRoom) {
     if (isNear) {
       if (!window.hasHeights) paths.plain += path;
       drawPoints(sheet, window, drawn, paths, texts, hasRoom);
-      hasArrows ||= window.hasVectors;
-      hasNumbers ||= window.hasHeights && drawn.size >= kNumbersFrom;
+      if (window.hasVectors) shown.arrows = "points";
+      if (window.hasHeights && shown.heights !== "numbers") {
+        shown.heights = drawn.size >= kNumbersFrom ? "numbers" : "points";
+      }
       continue;
     }
     const [north, east, height] = window.middle;
     if (window.hasHeights) {
       paths.cells[colourOf(sheet.symbols, height)] += path;
+      if (shown.heights === "none") shown.heights = "windows";
     } else {
       paths.plain += path;
     }
@@ -246,14 +254,14 @@ function drawWindows(sheet, plot, texts, hasRoom) {
     const [x, y] = toScreen(sheet, longitude, (window.south + window.north) / 2);
     paths.points += `M${tenth(x)} ${tenth(y)}h0`;
     paths.arrows += arrowPath(x, y, ...vectorOnScreen(sheet, longitude, north, east));
-    hasArrows = true;
+    if (shown.arrows === "none") shown.arrows = "windows";
   }
   paths.cells.forEach((path, colour) => layers.cells[colour].setAttribute("d", path));
   layers.arrowHalo.setAttribute("d", paths.arrows);
   for (const name of ["plain", "silhouettes", "outlines", "problems", "points", "arrows"]) {
     layers[name].setAttribute("d", paths[name]);
   }
-  return {hasArrows, hasNumbers};
+  return shown;
 }
 
 const crossPath = ({left, right, top, bottom}) =>
@@ -281,7 +289,8 @@ function drawChosen(sheet) {
   }
 }
 
-// Draws everything. Returns what of the legend is on the map: {hasArrows, hasNumbers}.
+// Draws everything. Returns what of the legend is on the map: hasAreaEdge; arrows, of "none",
+// "windows" or "points"; heights, likewise or "numbers" at points.
 function draw(sheet) {
   const plot = plotOf();
   const {map, clip, paper, border, middle} = layers;
@@ -298,8 +307,8 @@ function draw(sheet) {
   const hasRoom = makeRoom();
   drawGraticule(sheet, plot);
   const shown = drawWindows(sheet, plot, {append: (text) => texts.push(text)}, hasRoom);
-  drawAreas(sheet, plot, {append: (text) => texts.push(text)}, hasRoom);
+  const hasAreaEdge = drawAreas(sheet, plot, {append: (text) => texts.push(text)}, hasRoom);
   layers.texts.replaceChildren(...texts);
   drawChosen(sheet);
-  return shown;
+  return {...shown, hasAreaEdge};
 }

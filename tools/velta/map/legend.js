@@ -36,8 +36,13 @@ function fileRow(sheet, file, areas, windows) {
     file.isShown = check.checked;
     requestDraw();
   });
-  return legendRow(line, element("label", {}, check, element("b", {}, file.name), ` ${text}`));
+  const systems = file.systems ? ` ${file.systems},` : "";
+  return legendRow(line, element("label", {}, check, element("b", {}, file.name), `${systems} ${text}`));
 }
+
+// A remark on what is in view. It keeps its room, as the map would else change its size while it is
+// zoomed.
+const hintOf = (name) => element("span", {id: `${name}Hint`, class: "aside"});
 
 function arrowRow({arrow, pixels}) {
   const length = arrow * pixels;
@@ -45,9 +50,8 @@ function arrowRow({arrow, pixels}) {
   const sign = swatch(
       svgElement("path", {class: "arrows", d: arrowPath(start, 11, length, 0)}),
       svgElement("path", {class: "points", d: `M${start} 11h0`}));
-  return legendRow(sign, element("b", {id: "arrowLength"}, lengthText(arrow)),
-                   " horizontal residual, on the ground ",
-                   element("span", {id: "arrowHint", class: "aside"}, "(zoom in to see it)"));
+  return legendRow(sign, element("b", {}, "Arrow: horizontal residual"), ", this one: ",
+                   element("b", {id: "arrowLength"}, lengthText(arrow)), hintOf("arrow"));
 }
 
 function colourScale(sheet) {
@@ -77,7 +81,7 @@ function colourScale(sheet) {
       `deviation from ${numberText(mean / kMillimetresPerMetre, 3)} m, the mean of all windows`;
   return element("div", {class: "colours"},
                  element("p", {}, element("b", {}, "Colour: height residual"), `, ${from}, in ${unit}`),
-                 scale, element("p", {id: "numberHint", class: "aside"}, "Numbers at points: height residual, mm"));
+                 scale, hintOf("height"));
 }
 
 // Whether residuals are shown whole or as deviations: the means are often so much larger that
@@ -108,6 +112,7 @@ function showLegend(sheet) {
   }
   const has = (property) => sheet.windows.some((window) => window[property]);
   const cell = (name) => swatch(svgElement("rect", {class: name, x: 26, y: 2, width: 24, height: 18}));
+  if (sheet.windows.length > 0) rows.push(legendRow(cell("outline"), "grid window, 4 × 4 points"));
   if (has("hasVectors")) rows.push(arrowRow(sheet.symbols));
   if (sheet.windows.some((window) => !window.problem && !window.hasHeights)) {
     rows.push(legendRow(cell("cell plain outline"), "window without heights"));
@@ -119,18 +124,21 @@ function showLegend(sheet) {
     rows.push(legendRow(sign, `${countText(count, "window", "windows")} that cannot be used`));
   }
   const colours = has("hasHeights") ? [colourScale(sheet)] : [];
-  document.getElementById("legend").replaceChildren(element("div", {}, ...rows), ...colours);
+  document.getElementById("legend").replaceChildren(
+      element("div", {}, ...rows, ...(sheet.areas.length > 0 ? [hintOf("area")] : [])), ...colours);
   const hasResiduals = has("hasHeights") || has("hasVectors");
   document.getElementById("means").replaceChildren(...(hasResiduals ? [meansChoice(sheet)] : []));
 }
 
-// Says what of the legend is on the map now. The hints keep their room, as the map would else change
-// its size while it is zoomed.
-function updateLegend({hasArrows, hasNumbers}) {
-  const show = (id, isShown) => {
-    const hint = document.getElementById(id);
-    if (hint) hint.style.visibility = isShown ? "visible" : "hidden";
+// Says what of the legend is on the map now, and of what: see draw().
+function updateLegend({hasAreaEdge, arrows, heights}) {
+  const say = (name, text) => {
+    const hint = document.getElementById(`${name}Hint`);
+    if (hint) hint.textContent = text;
   };
-  show("arrowHint", !hasArrows);
-  show("numberHint", hasNumbers);
+  say("area", hasAreaEdge ? "" : "No edge of an area of validity is in this view.");
+  say("arrow", {none: "zoom in to see it", windows: "here the mean of a window",
+                points: "here that of each point"}[arrows]);
+  say("height", {windows: "here the mean of a window", points: "here that of each point",
+                 numbers: "here that of each point, and its number in mm"}[heights] ?? "");
 }

@@ -36,12 +36,14 @@ function drawForPrint() {
 
 function summaryOf(sheet) {
   const windows = countText(sheet.windows.length, "grid window", "grid windows");
+  const [first] = sheet.files;
   if (sheet.isPlane) {
-    return `Residuals of map projections at the points of ${windows}: what is added to northing, ` +
-        "easting and height there.";
+    return `Residuals at the points of ${windows}: what is left to correct in northing, easting and height ` +
+        "after the map projection.";
   }
-  return `Where datum transformations are valid, and their residuals at the points of ${windows}: ` +
-      "what is added to latitude, longitude and height there.";
+  const systems = sheet.files.length === 1 && first.systems ? ` ${first.systems}` : "";
+  return `Residuals at the points of ${windows}: what is left to correct in latitude, longitude and height ` +
+      `after the datum transformation${systems}.`;
 }
 
 // Shows a kind of files. Its sheet is made when it is first shown.

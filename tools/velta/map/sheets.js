@@ -89,7 +89,10 @@ function toGround(columns, windows, isPlane) {
 
 function makeSheet(columns, isPlane) {
   const unitsPerDegree = isPlane ? 1 : kArcSecondsPerDegree;
-  const files = columns.files.map((name) => ({name, isShown: true}));
+  const files = columns.files.map((name, index) => {
+    const [source, target] = columns.systems[index];
+    return {name, systems: target ? `from ${source} to ${target}` : "", isShown: true};
+  });
   const areas = columns.areas.map((area) => ({
     ...toBox(area.place, 0, unitsPerDegree),
     file: files[area.file], entries: area.entries, unusable: area.unusable}));
