@@ -9,7 +9,9 @@
 namespace velta_tool {
 namespace {
 
-[[noreturn]] void Refuse() { throw std::runtime_error("this build has no PROJ, which it needs"); }
+[[noreturn]] void Refuse() {
+  throw std::runtime_error("this needs PROJ, without which the program was built");
+}
 
 }  // namespace
 

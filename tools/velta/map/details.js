@@ -134,12 +134,14 @@ function readingDetails(sheet) {
   }
   const paragraph = (...text) => element("p", {}, ...text);
   const term = (text) => element("b", {}, text);
+  const areas = paragraph("An ", term("area of validity"), ", dashed, is where an entry of the file may be " +
+      "used; entries often share one. Latitudes and longitudes are the source system's.");
   return [
-    title,
+    title, ...(sheet.isPlane ? [] : [areas]),
     paragraph("A ", term("grid window"), " has 4 × 4 points with residuals, from edge to edge. Between " +
         "the points they are interpolated."),
-    paragraph("An ", term("arrow"), " shows which way, and by the scale of the legend how far on the " +
-        "ground, a position is moved."),
+    paragraph("An ", term("arrow"), " points where a position is moved. Its length has a scale of its " +
+        "own, in the legend, as the map's distances are much longer."),
     paragraph("A ", term("colour"), " shows what is added to the height. Where the target has physical " +
         "heights, it is how far their zero lies above the ellipsoid, and is taken off."),
     paragraph("From afar a window has one arrow and one colour, its mean. Zoom in for those of its points, " +
