@@ -4,7 +4,7 @@
 const kMargins = {left: 24, right: 8, top: 8, bottom: 24};  // pixels, for the graticule's labels
 const kSmallest = 3;            // pixels that a window has, however far away
 const kOutlineFrom = 8;         // pixels of a window's shorter side
-const kArrowFrom = 40;
+const kArrowFrom = 32;
 const kPointsFrom = 100;
 const kNumbersFrom = 240;
 const kMostNear = 250;          // windows that are drawn with points; of more, nothing can be read
