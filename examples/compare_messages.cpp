@@ -183,6 +183,7 @@ class Comparison {
 
 }  // namespace
 
+// What goes wrong beyond what is reported ends it: NOLINTNEXTLINE(bugprone-exception-escape)
 int main(int argc, char** argv) {
   const bool isSummary = argc == 4 && std::string_view(argv[1]) == "--summary";
   if (argc != 3 && !isSummary) {

@@ -205,8 +205,8 @@ TEST(TGeoProj, HoldsItsParametersAndNoOthers) {
 }
 
 TEST(TRectRgn, HoldsItsEdgesAndEveryNumberOfAMeridian) {
-  constexpr double kDegree = std::numbers::pi / 180,
-                   kNaN = std::numeric_limits<double>::quiet_NaN();
+  constexpr double kDegree = std::numbers::pi / 180;
+  constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
   // A region and a point in degrees, whether it is inside, and whether it is on the plane.
   const std::tuple<const char*, TRectRgn, double, double, bool, bool> cases[] = {
       {"north-east corner", {50, 2, 8, 3}, 52, 11, true, true},

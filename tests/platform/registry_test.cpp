@@ -294,7 +294,8 @@ TEST(RegistryFile, IsNotIndexedByAreasThatItsHeaderCannotHold) {
 }
 
 TEST(RegistryKey, IsCopiedAsItIsAlsoIntoItself) {
-  const TCSInFileKey tree = RegistryFile::New(), other = RegistryFile::New();
+  const TCSInFileKey tree = RegistryFile::New();
+  const TCSInFileKey other = RegistryFile::New();
   RegistryFile::AddEntry(tree, L"S_1", "first");
   orx::TGenericRegistryKey(RootOf(other), L"key", 3, true)
       .AddValue(L"value", RawValue::Block("never saved"), 1, true);

@@ -87,7 +87,7 @@ TEST(BlockValue, IsHeldWhereItsSizeAndTheCopyFlagSay) {
     EXPECT_EQ(value.GetType(), 3U);
     EXPECT_EQ(value.GetSize(), 7U);
     EXPECT_TRUE(value.SetData(5, u"abc", 0, copy));
-    EXPECT_EQ(Held(value), std::string("a\0b\0c\0\0", 8));
+    EXPECT_EQ(Held(value), std::string("a\0b\0c\0\0\0", 8));
   }
 }
 

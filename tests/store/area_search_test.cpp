@@ -110,7 +110,7 @@ class RandomFile {
   void FillArea(double* area) {
     area[0] = std::uniform_real_distribution(-1.6, 1.6)(random_);
     area[2] = std::uniform_real_distribution(-3.2, 3.2)(random_);
-    if (IsOneIn(60)) area[Below(2) * 2] = IsOneIn(2) ? NAN : -INFINITY;
+    if (IsOneIn(60)) area[IsOneIn(2) ? 0 : 2] = IsOneIn(2) ? std::nan("") : -HUGE_VAL;
     area[1] = Extent();
     area[3] = Extent();
     for (const double edge : {area[0], area[0] + area[1]}) norths_.push_back(edge);

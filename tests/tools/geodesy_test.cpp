@@ -53,7 +53,9 @@ Definition Everywhere(const DatumShift& shift) {
 ResidualGrid GridOf(int method, double (*field)(double row, double column)) {
   ResidualGrid grid{"grid", "", {0, 3, 0, 3}, true, true, method, method, {}, {}, {}};
   for (std::size_t i = 0; i < grid.north.size(); ++i) {
-    const double value = field(static_cast<double>(i / 4), static_cast<double>(i % 4));
+    const std::size_t row = i / 4;
+    const std::size_t column = i % 4;
+    const double value = field(static_cast<double>(row), static_cast<double>(column));
     grid.north[i] = value;
     grid.east[i] = -value;
     grid.height[i] = 2 * value;
@@ -73,8 +75,10 @@ TEST(Interpolation, TakesTheFieldThatEachMethodCanFollow) {
     SCOPED_TRACE(method);
     const ResidualGrid flat = GridOf(method, plane);
     const ResidualGrid bent = GridOf(method, curved);
-    for (double row = 0; row <= 3; row += 0.25) {
-      for (double column = 0; column <= 3; column += 0.25) {
+    for (int i = 0; i <= 12; ++i) {
+      for (int j = 0; j <= 12; ++j) {
+        const double row = i / 4.0;
+        const double column = j / 4.0;
         EXPECT_NEAR(At(flat, row, column).north, plane(row, column), 1e-12);
         EXPECT_NEAR(At(flat, row, column).east, -plane(row, column), 1e-12);
         EXPECT_NEAR(At(flat, row, column).height, 2 * plane(row, column), 1e-12);

@@ -27,7 +27,6 @@ using orx::TGenericRegistryKey;
 using orx::cs::projmath::TRectRgn;
 using velta::DatumData;
 using velta::RTCMDataSupport;
-using velta::TableData;
 
 std::optional<Description> DescribeDatum(const TGenericRegistryKey& container,
                                          const TGenericRegistryKey& entry) {

@@ -66,7 +66,7 @@ void CheckUse(const Options& options) {
   }
   for (const std::string& grid : {horizontal, vertical}) {
     if (!isGrid && grid.find_first_of(",#\"") != grid.npos) {
-      throw CLI::ValidationError("--hgrid, --vgrid", "PROJ takes no \",\" nor \"#\" in a name");
+      throw CLI::ValidationError("--hgrid, --vgrid", R"(PROJ takes no "," nor "#" in a name)");
     }
   }
 }

@@ -321,9 +321,10 @@ class Ingestion {
       if (set.Find(projection)) parts.emplace_back().messages = Held(set, {1024, projection});
     }
     for (const auto& [file, received, wasThere] : places) {
-      IngestedPart& part = *std::find_if(parts.begin(), parts.end(), [&](const auto& candidate) {
-        return Contains(candidate.messages, received.message);
-      });
+      const auto hasMessage = [message = received.message](const IngestedPart& part) {
+        return Contains(part.messages, message);
+      };
+      IngestedPart& part = *std::find_if(parts.begin(), parts.end(), hasMessage);
       part.file = NameOf(PathOf(orx::ToUtf8(file)).filename());
       const std::optional<Entry> stored = FindEntry(file, received.name);
       part.isThere = stored.has_value();

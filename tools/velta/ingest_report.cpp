@@ -20,6 +20,7 @@ std::string Joined(const std::vector<std::string>& words, const char* separator)
 
 std::string Joined(const std::vector<unsigned>& numbers) {
   std::vector<std::string> words;
+  words.reserve(numbers.size());
   for (const unsigned number : numbers) words.push_back(std::to_string(number));
   return Joined(words, " + ");
 }

@@ -38,7 +38,7 @@ MergeCounts Count(const Entries& target, const Entries& source) {
   for (const Entry& entry : target.entries) names.insert(entry.name);
   MergeCounts counts;
   for (const Entry& entry : source.entries)
-    ++(names.count(entry.name) ? counts.replaced : counts.added);
+    ++(names.contains(entry.name) ? counts.replaced : counts.added);
   return counts;
 }
 

@@ -48,7 +48,7 @@ float Up(double value) { return -Down(-value); }
 /// False for edges that are no numbers, and for extents that hold nothing or may mean something
 /// else.
 bool IsArea(const double (&area)[4], bool isZeroUnknown) {
-  for (int axis = 0; axis < 2; ++axis) {
+  for (std::size_t axis = 0; axis < 2; ++axis) {
     const double extent = area[2 * axis + 1];
     if (!std::isfinite(area[2 * axis] + extent) || !std::isfinite(extent)) return false;
     if (extent < 0.0 || (extent == 0.0 && isZeroUnknown)) return false;
@@ -105,7 +105,7 @@ EntryBounds AreaPlaces::BoundsIn(record::Bytes data) const {
     double area[4];
     std::memcpy(area, data.data() + places_[i]->place, sizeof area);
     if (!IsArea(area, places_[i]->isZeroUnknown)) continue;
-    for (int axis = 0; axis < 2; ++axis) {
+    for (std::size_t axis = 0; axis < 2; ++axis) {
       const double edge = area[2 * axis];
       bounds[i].low[axis] = Down(edge);
       bounds[i].high[axis] = Up(edge + area[2 * axis + 1]);

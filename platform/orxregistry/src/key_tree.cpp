@@ -34,7 +34,7 @@ bool VisitedValues::Visit(const TGenericRegistryKeyImp& key, Part values) {
   while (!values.shapes.empty()) {
     const ValueRecord value = record::TakeValue(values);
     if (!value || count_ == kMost) return false;
-    const auto place = std::find_if(
+    auto* const place = std::find_if(
         values_, values_ + count_, [&](ValueRecord other) { return other.name() == value.name(); });
     *place = value;  // of several of one name the last counts
     if (place == values_ + count_) ++count_;
@@ -217,6 +217,7 @@ void KeyTree::DeepCopy(Key& to, Key& from) {
   }
   for (const ValueRecord value : source.Values(from)) SetValue(to, value.value());
   // By their places, as a target inside the source adds keys to it meanwhile.
+  // NOLINTNEXTLINE(modernize-loop-convert)
   for (std::size_t i = 0; i < source.Keys(from).size(); ++i) {
     Key* const key = source.Keys(from)[i];
     if (Key* const copy = OpenKey(to, key->name(), key->dimension())) DeepCopy(*copy, *key);

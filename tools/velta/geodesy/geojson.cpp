@@ -101,10 +101,11 @@ ordered_json GridFeature(const ResidualGrid& grid, const std::string& system) {
 }
 
 ordered_json PointFeature(const ResidualGrid& grid, std::size_t point, const std::string& system) {
-  const auto row = static_cast<double>(point / kGridPoints);
-  const auto column = static_cast<double>(point % kGridPoints);
-  const double latitude = grid.area.south + grid.area.northExtent - row * grid.NorthStep();
-  const double longitude = grid.area.west + column * grid.EastStep();
+  const std::size_t row = point / kGridPoints;
+  const std::size_t column = point % kGridPoints;
+  const double latitude =
+      grid.area.south + grid.area.northExtent - static_cast<double>(row) * grid.NorthStep();
+  const double longitude = grid.area.west + static_cast<double>(column) * grid.EastStep();
   ordered_json properties = {{"kind", "grid point"},
                              {"entry", grid.entry},
                              {"system", system},
@@ -143,7 +144,7 @@ std::string GeoJson(const Definition& definition, const TellLeftOut& tell) {
   // An empty name is one that the source did not give.
   const std::string system =
       definition.sourceName.empty() ? "source system" : definition.sourceName;
-  std::string text = "{\"type\": \"FeatureCollection\", \"features\": [";
+  std::string text = R"({"type": "FeatureCollection", "features": [)";
   const char* separator = "\n";
   const auto add = [&](const ordered_json& feature) {
     text += separator + feature.dump();

@@ -52,7 +52,7 @@ std::string DatumSteps(const DatumShift& shift) {
                                          {"da", target[0] - source[0]},
                                          {"df", Flattening(target) - Flattening(source)}});
   }
-  const auto similarity = [&](const char* operation) {
+  const auto similarity = [&parameters = parameters](const char* operation) {
     return Step(operation, {{"x", parameters[0]},
                             {"y", parameters[1]},
                             {"z", parameters[2]},
