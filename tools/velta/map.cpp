@@ -4,6 +4,7 @@
 #include <map>
 #include <memory>
 #include <nlohmann/json.hpp>
+#include <set>
 #include <stdexcept>
 #include <string>
 #include <utility>
@@ -40,7 +41,7 @@ struct Sheet {
   double factor;         ///< from what is stored to arc-seconds or metres
   double residualUnits;  ///< of north and east residuals
   json files = json::array();
-  json systems = json::array();  ///< of the files: [source, target], empty when not known
+  json systems = json::array();  ///< of the files: source, target, height indicators
   json areas = json::array();
   json fileOf = json::array();
   json entries = json::array();
@@ -116,6 +117,12 @@ void AddWindow(const ResidualGrid& grid, Sheet& sheet) {
   sheet.methods.push_back(grid.vertShift ? grid.vertInterpolation : -1);
 }
 
+std::set<std::uint32_t> HeightIndicators(const Definition& definition) {
+  std::set<std::uint32_t> indicators;
+  for (const DatumShift& shift : definition.shifts) indicators.insert(shift.heightIndicator);
+  return indicators;
+}
+
 void AddFile(const std::string& file, const Definition& definition,
              const std::vector<ResidualGrid>& windows, Sheet& sheet) {
   AddAreas(definition.areas, sheet);
@@ -132,7 +139,9 @@ void AddFile(const std::string& file, const Definition& definition,
                ": residual grids that lie nowhere and are not shown: " + std::to_string(unplaced));
   }
   sheet.files.push_back(Printable(NameOf(PathOf(file).filename())));
-  sheet.systems.push_back({Printable(definition.sourceName), Printable(definition.targetName)});
+  sheet.systems.push_back({{"source", Printable(definition.sourceName)},
+                           {"target", Printable(definition.targetName)},
+                           {"heightIndicators", HeightIndicators(definition)}});
 }
 
 json ToJson(Sheet sheet) {

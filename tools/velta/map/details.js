@@ -126,6 +126,18 @@ function stepButtons(sheet) {
                  button("›", "Next window", 1));
 }
 
+// What is done with a height residual.
+function heightText(sheet) {
+  const indicators = sheet.files.flatMap((file) => file.heightIndicators);
+  const areAll = (isMeant) => indicators.length > 0 && indicators.every(isMeant);
+  if (areAll((indicator) => indicator === 1 || indicator === 2)) {
+    return "Heights are physical here: it is how far their zero lies above the ellipsoid, and is taken off.";
+  }
+  if (areAll((indicator) => indicator === 0)) return "It is added to the ellipsoidal height.";
+  return "It is added to an ellipsoidal height; where heights are physical, it is how far their zero lies " +
+      "above the ellipsoid, and is taken off.";
+}
+
 // What the signs of the map say, for who sees such a map for the first time.
 function readingDetails(sheet) {
   const title = element("h2", {}, "How to read this map");
@@ -142,11 +154,10 @@ function readingDetails(sheet) {
         "the points they are interpolated."),
     paragraph("An ", term("arrow"), " points where a position is moved. Its length has a scale of its " +
         "own, in the legend, as the map's distances are much longer."),
-    paragraph("A ", term("colour"), " shows what is added to the height. Where the target has physical " +
-        "heights, it is how far their zero lies above the ellipsoid, and is taken off."),
+    paragraph("A ", term("colour"), ` shows the height residual. ${heightText(sheet)}`),
     paragraph("From afar a window has one arrow and one colour, its mean. Zoom in for those of its points, " +
         "and for numbers."),
-    paragraph("Point at a window for all its numbers."),
+    paragraph("Point at a window for all its numbers; ‹ and › go from one to the next."),
   ];
 }
 

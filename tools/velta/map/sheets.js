@@ -90,8 +90,9 @@ function toGround(columns, windows, isPlane) {
 function makeSheet(columns, isPlane) {
   const unitsPerDegree = isPlane ? 1 : kArcSecondsPerDegree;
   const files = columns.files.map((name, index) => {
-    const [source, target] = columns.systems[index];
-    return {name, systems: target ? `from ${source} to ${target}` : "", isShown: true};
+    const {source, target, heightIndicators} = columns.systems[index];
+    const systems = target ? `from ${source} to ${target}` : "";
+    return {name, systems, heightIndicators, isShown: true};
   });
   const areas = columns.areas.map((area) => ({
     ...toBox(area.place, 0, unitsPerDegree),
