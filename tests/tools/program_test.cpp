@@ -210,5 +210,20 @@ TEST_F(ProgramTest, TakesWhatAnOperatorSendsWhereverTheRecordingEnds) {
   }
 }
 
+#ifdef __linux__
+TEST_F(ProgramTest, NamesWhatCannotBeReadAndGoesOn) {
+  const std::string unreadable = "/proc/self/mem";  // opens, and has nothing at its start
+  const std::string error = "velta: /proc/self/mem: cannot be read: Input/output error\n";
+  const Outcome ingested =
+      Run("ingest --datum-dir @ --projection-dir @ " + unreadable + " %dhdn.rtcm3 " + unreadable);
+  EXPECT_EQ(ingested.status, 1);
+  EXPECT_EQ(ingested.err, error + error);
+  EXPECT_NE(ingested.out.find("sets: 1 ingested"), std::string::npos) << ingested.out;
+  const Outcome decoded = Run("decode " + unreadable);
+  EXPECT_EQ(decoded.status, 1);
+  EXPECT_EQ(decoded.err, error);
+}
+#endif
+
 }  // namespace
 }  // namespace velta_test

@@ -35,16 +35,19 @@ std::runtime_error FileError(const std::string& name, const std::string& what) {
 /// Passes on what a stream has, and lets the user end the program where the stream waits for more.
 class InterruptibleBuffer : public std::streambuf {
  public:
-  explicit InterruptibleBuffer(std::streambuf& source) : source_(source), memory_(kInputBuffer) {}
+  InterruptibleBuffer(std::string name, std::streambuf& source)
+      : name_(std::move(name)), source_(source), memory_(kInputBuffer) {}
 
  private:
-  int_type underflow() override {
+  int_type underflow() override try {
     if (IsInterrupted() || !Await()) return traits_type::eof();
     const auto room = static_cast<std::streamsize>(memory_.size());
     const std::streamsize there = std::clamp<std::streamsize>(source_.in_avail(), 1, room);
     const std::streamsize got = source_.sgetn(memory_.data(), there);
     setg(memory_.data(), memory_.data(), memory_.data() + got);
     return got > 0 ? traits_type::to_int_type(memory_.front()) : traits_type::eof();
+  } catch (const std::ios_base::failure& error) {
+    throw std::runtime_error(name_ + ": cannot be read: " + error.code().message());
   }
 
   /// \return false at the end
@@ -53,6 +56,7 @@ class InterruptibleBuffer : public std::streambuf {
     return source_.sgetc() != traits_type::eof();
   }
 
+  std::string name_;
   std::streambuf& source_;
   std::vector<char> memory_;
 };
@@ -151,7 +155,7 @@ const CLI::Validator kDatumOrProjectionFile =
 
 Input::Input(const std::string& name) : memory_(kInputBuffer) {
   if (name == kStandardStream) {
-    buffer_ = std::make_unique<InterruptibleBuffer>(*std::cin.rdbuf());
+    buffer_ = std::make_unique<InterruptibleBuffer>("standard input", *std::cin.rdbuf());
     return;
   }
   const fs::path path = PathOf(name);
@@ -162,7 +166,7 @@ Input::Input(const std::string& name) : memory_(kInputBuffer) {
   if (!file_.open(orx::ToSystemPath(path), std::ios::in | std::ios::binary)) {
     throw FileError(name, "cannot be read");
   }
-  buffer_ = std::make_unique<InterruptibleBuffer>(file_);
+  buffer_ = std::make_unique<InterruptibleBuffer>(name, file_);
 }
 
 Output::Output(const std::string& name, OutputKind kind, const std::vector<std::string>& inputs)

@@ -50,7 +50,7 @@ class Input {
   /// \throws std::runtime_error when the file cannot be opened
   explicit Input(const std::string& name);
 
-  /// Lives as long as the object; throws std::ios_base::failure when reading fails.
+  /// Lives as long as the object; throws std::runtime_error when reading fails.
   std::streambuf& buffer() { return *buffer_; }
 
  private:

@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <exception>
 #include <filesystem>
+#include <functional>
 #include <initializer_list>
 #include <iterator>
 #include <map>
@@ -97,21 +98,19 @@ class Ingestion {
         report_(options.json, out_) {}
 
   void Read(const std::string& file) {
-    Input in(file);
-    stream_.emplace(Stream{file, StreamNotes(file, totals_.stream), totals_.stream.frames.frames});
-    rtcm3::MessageReader messages(in.buffer(), totals_.stream, [this] {
-      out_.Flush();
-      stream_->notes.Tell();
-      progress_.Show(totals_.stream.frames.bytes);
-    });
-    stream_->messages = &messages;
-    TakeAll(messages);
-    EndStream();
-  }
-
-  void Fail(const std::string& what) {
-    ReportFailure(what);
-    status_ = kFailed;
+    try {
+      stream_.emplace(file, totals_.stream, [this] {
+        out_.Flush();
+        stream_->notes.Tell();
+        progress_.Show(totals_.stream.frames.bytes);
+      });
+      TakeAll(stream_->messages);
+      EndStream();
+    } catch (const std::exception& error) {
+      if (stream_) stream_->notes.Tell();
+      stream_.reset();
+      Fail(error.what());
+    }
   }
 
   int Finish() {
@@ -141,11 +140,24 @@ class Ingestion {
  private:
   /// The stream that is being read.
   struct Stream {
+    Stream(const std::string& file, rtcm3::StreamCounts& counts, std::function<void()> beforeRead)
+        : name(file),
+          in(file),
+          notes(file, counts),
+          framesBefore(counts.frames.frames),
+          messages(in.buffer(), counts, std::move(beforeRead)) {}
+
     std::string name;
+    Input in;
     StreamNotes notes;
     std::uint64_t framesBefore;
-    rtcm3::MessageReader* messages = nullptr;
+    rtcm3::MessageReader messages;
   };
+
+  void Fail(const std::string& what) {
+    ReportFailure(what);
+    status_ = kFailed;
+  }
 
   void TakeAll(rtcm3::MessageReader& messages) {
     while (const rtcm3::Message* message = messages.Next()) Take(*message);
@@ -154,7 +166,7 @@ class Ingestion {
   void EndStream() {
     if (!stream_) return;
     // The reader may hold back what looks like the begin of a longer frame.
-    if (IsInterrupted() && stream_->messages) TakeAll(*stream_->messages);
+    if (IsInterrupted()) TakeAll(stream_->messages);
     stream_->notes.Tell();
     if (totals_.stream.frames.frames == stream_->framesBefore) {
       Fail(stream_->name + ": no RTCM 3 frame in it");
@@ -393,24 +405,18 @@ class Ingestion {
   std::map<DatumArea, rtcm3::Message> datums_;          ///< as they came last
   std::map<std::uint32_t, ResultCode> results_;         ///< of each system's last set
   std::set<std::pair<std::uint32_t, unsigned>> named_;  ///< systems and messages that were named
-  std::optional<Stream> stream_;
   IngestTotals totals_;
   int status_ = kDone;
   Output out_;
   IngestReport report_;
   Progress progress_;
+  std::optional<Stream> stream_;
 };
 
 int Run(const Options& options) {
   Ingestion ingestion(options);
   FinishWhenInterrupted([&ingestion] { return ingestion.Finish(); });
-  for (const std::string& file : options.files) {
-    try {
-      ingestion.Read(file);
-    } catch (const std::exception& error) {
-      ingestion.Fail(error.what());
-    }
-  }
+  for (const std::string& file : options.files) ingestion.Read(file);
   return ingestion.Finish();
 }
 
