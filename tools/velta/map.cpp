@@ -1,12 +1,15 @@
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <cstdint>
+#include <filesystem>
 #include <map>
 #include <memory>
 #include <nlohmann/json.hpp>
 #include <set>
 #include <stdexcept>
 #include <string>
+#include <system_error>
 #include <utility>
 #include <vector>
 
@@ -17,6 +20,7 @@
 #include "geodesy/definition.h"
 #include "geodesy/stored_definition.h"
 #include "map_page.h"
+#include "orxutils/path.h"
 #include "terminal.h"
 
 namespace velta_tool {
@@ -123,7 +127,8 @@ std::set<std::uint32_t> HeightIndicators(const Definition& definition) {
   return indicators;
 }
 
-void AddFile(const std::string& file, const Definition& definition,
+/// \param name of the file on the page
+void AddFile(const std::string& file, const std::string& name, const Definition& definition,
              const std::vector<ResidualGrid>& windows, Sheet& sheet) {
   AddAreas(definition.areas, sheet);
   std::size_t unplaced = 0;
@@ -138,7 +143,10 @@ void AddFile(const std::string& file, const Definition& definition,
     ReportNote(file +
                ": residual grids that lie nowhere and are not shown: " + std::to_string(unplaced));
   }
-  sheet.files.push_back(Printable(NameOf(PathOf(file).filename())));
+  if (definition.areas.empty() && windows.empty()) {
+    ReportNote(file + ": nothing in it that a map could show");
+  }
+  sheet.files.push_back(Printable(name));
   sheet.systems.push_back({{"source", Printable(definition.sourceName)},
                            {"target", Printable(definition.targetName)},
                            {"heightIndicators", HeightIndicators(definition)}});
@@ -174,19 +182,46 @@ std::string Embedded(const json& data) {
   return embedded;
 }
 
+/// The files without those that stand before them under another name, too.
+std::vector<std::string> EachOnce(const std::vector<std::string>& files) {
+  std::vector<std::string> once;
+  for (const std::string& file : files) {
+    const bool isThere = std::any_of(once.begin(), once.end(), [&](const std::string& other) {
+      std::error_code error;  // what is not there is told when it is read
+      return std::filesystem::equivalent(orx::ToSystemPath(PathOf(file)),
+                                         orx::ToSystemPath(PathOf(other)), error);
+    });
+    if (isThere) {
+      ReportNote(file + ": is named twice and drawn once");
+    } else {
+      once.push_back(file);
+    }
+  }
+  return once;
+}
+
+/// A file's name without its directory, unless another has the same.
+std::string PageName(const std::string& file, const std::vector<std::string>& files) {
+  const auto nameOf = [](const std::string& path) { return NameOf(PathOf(path).filename()); };
+  const auto isSame = [&](const std::string& other) { return nameOf(other) == nameOf(file); };
+  return std::count_if(files.begin(), files.end(), isSame) > 1 ? file : nameOf(file);
+}
+
 int Run(const Options& options) {
   Output out(options.output, OutputKind::kText, options.files);
   const Busy busy("drawing", options.files);
   Sheet datums{kArcSecondsPerRadian, kAngleUnits};
   Sheet projections{1, kLengthUnits};
-  for (const std::string& file : options.files) {
+  const std::vector<std::string> files = EachOnce(options.files);
+  for (const std::string& file : files) {
+    const std::string name = PageName(file, files);
     if (KindOf(file) == FileKind::kDatum) {
       const Definition definition = ReadDatumFile(file);
-      AddFile(file, definition, definition.grids, datums);
+      AddFile(file, name, definition, definition.grids, datums);
     } else {
       Definition definition;
       AddProjectionFile(file, definition);
-      AddFile(file, definition, definition.planeGrids, projections);
+      AddFile(file, name, definition, definition.planeGrids, projections);
     }
   }
   const json data = {{"datums", ToJson(std::move(datums))},

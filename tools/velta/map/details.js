@@ -39,8 +39,7 @@ function pointTable(caption, values, decimals) {
 }
 
 function stepTexts(sheet, window) {
-  const north = (window.north - window.south) / (kGridPoints - 1);
-  const east = (window.east - window.west) / (kGridPoints - 1);
+  const {northStep: north, eastStep: east} = window;
   if (sheet.isPlane) return [`north ${numberText(north, 0)} m`, `east ${numberText(east, 0)} m`];
   const metres = kMetresPerArcSecond * kArcSecondsPerDegree;
   const alongParallel = metres * Math.cos(radians((window.south + window.north) / 2));
@@ -141,15 +140,16 @@ function heightText(sheet) {
 // What the signs of the map say, for who sees such a map for the first time.
 function readingDetails(sheet) {
   const title = element("h2", {}, "How to read this map");
-  if (sheet.windows.length === 0) {
-    return [title, element("p", {}, "There are no grid windows in these files.")];
-  }
   const paragraph = (...text) => element("p", {}, ...text);
   const term = (text) => element("b", {}, text);
   const areas = paragraph("An ", term("area of validity"), ", dashed, is where an entry of the file may be " +
       "used; entries often share one. Latitudes and longitudes are the source system's.");
+  const areaParagraphs = sheet.areas.length > 0 ? [areas] : [];
+  if (sheet.windows.length === 0) {
+    return [title, ...areaParagraphs, paragraph("There are no grid windows in these files.")];
+  }
   return [
-    title, ...(sheet.isPlane ? [] : [areas]),
+    title, ...areaParagraphs,
     paragraph("A ", term("grid window"), " has 4 × 4 points with residuals, from edge to edge. Between " +
         "the points they are interpolated."),
     paragraph("An ", term("arrow"), " points where a position is moved. Its length has a scale of its " +

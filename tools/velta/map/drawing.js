@@ -34,6 +34,27 @@ function toEarth(sheet, x, y) {
       (x - view.centreX) / view.scale + view.x, (y - view.centreY) / view.scale + view.y);
 }
 
+// A number that is at most so far from a middle.
+const within = (number, middle, most) =>
+    Math.min(Math.max(number, middle - Math.max(most, 0)), middle + Math.max(most, 0));
+
+// Turns to the picture that is true to shape where one looks, and ends the view where the globe ends.
+function keepOnEarth(sheet, plot) {
+  if (sheet.isPlane) return;
+  const {view, middle} = sheet;
+  view.scale = Math.max(view.scale, Math.min(plot.width / 360, plot.height / 180));
+  const {pole, aspect} = sheet.projection;
+  let [east, north] = sheet.projection.inverse(view.x, view.y);
+  if (pole) {
+    north = within(north, 0, 90);
+  } else {
+    east = within(east, middle, 180 - plot.width / 2 / view.scale / aspect);
+    north = within(north, 0, 90 - plot.height / 2 / view.scale);
+  }
+  if (!suits(sheet.projection, [east, north])) sheet.projection = globeView([east, north], middle);
+  [view.x, view.y] = sheet.projection.forward(east, north);
+}
+
 // The elements of the map, from back to front.
 const layers = (() => {
   const map = document.getElementById("map");
@@ -110,16 +131,15 @@ function windowPath(drawn) {
 
 // Where a point of a window is, with the part of the window that is nearest to it.
 function pointOf(window, point) {
-  const north = (window.north - window.south) / (kGridPoints - 1);
-  const east = (window.east - window.west) / (kGridPoints - 1);
-  const latitude = window.north - Math.floor(point / kGridPoints) * north;
-  const longitude = window.west + point % kGridPoints * east;
+  const {northStep, eastStep} = window;
+  const latitude = window.top - Math.floor(point / kGridPoints) * northStep;
+  const longitude = window.west + point % kGridPoints * eastStep;
   return {
     latitude, longitude,
-    south: Math.max(latitude - north / 2, window.south),
-    north: Math.min(latitude + north / 2, window.north),
-    west: Math.max(longitude - east / 2, window.west),
-    east: Math.min(longitude + east / 2, window.east)};
+    south: Math.max(latitude - northStep / 2, window.south),
+    north: Math.min(latitude + northStep / 2, window.north),
+    west: Math.max(longitude - eastStep / 2, window.west),
+    east: Math.min(longitude + eastStep / 2, window.east)};
 }
 
 // Keeps texts from lying over one another.
@@ -190,6 +210,7 @@ function drawPoints(sheet, window, drawn, paths, texts, hasRoom) {
   const hasNumbers = window.hasHeights && drawn.size >= kNumbersFrom;
   for (let point = 0; point < kPoints; ++point) {
     const place = pointOf(window, point);
+    if (!sheet.isPlane && Math.abs(place.latitude) > 90) continue;  // over the pole is nowhere
     const at = toScreen(sheet, place.longitude, place.latitude);
     const height = residualOf(sheet, window, kHeight, point);
     let vector = [0, 0];
@@ -218,7 +239,7 @@ function drawWindows(sheet, plot, texts, hasRoom) {
   }
   const paths = {cells: Array(kColours).fill(""), plain: "", silhouettes: "", outlines: "",
                  problems: "", points: "", arrows: ""};
-  const shown = {arrows: "none", heights: "none"};
+  const shown = {arrows: new Set(), heights: new Set()};
   for (const [window, drawn] of inView) {
     const path = windowPath(drawn);
     if (drawn.size >= kOutlineFrom) {
@@ -235,16 +256,15 @@ function drawWindows(sheet, plot, texts, hasRoom) {
     if (isNear) {
       if (!window.hasHeights) paths.plain += path;
       drawPoints(sheet, window, drawn, paths, texts, hasRoom);
-      if (window.hasVectors) shown.arrows = "points";
-      if (window.hasHeights && shown.heights !== "numbers") {
-        shown.heights = drawn.size >= kNumbersFrom ? "numbers" : "points";
-      }
+      if (window.hasVectors) shown.arrows.add("points");
+      if (window.hasHeights) shown.heights.add("points");
+      if (window.hasHeights && drawn.size >= kNumbersFrom) shown.heights.add("numbers");
       continue;
     }
     const [north, east, height] = window.middle;
     if (window.hasHeights) {
       paths.cells[colourOf(sheet.symbols, height)] += path;
-      if (shown.heights === "none") shown.heights = "windows";
+      shown.heights.add("windows");
     } else {
       paths.plain += path;
     }
@@ -254,7 +274,7 @@ function drawWindows(sheet, plot, texts, hasRoom) {
     const [x, y] = toScreen(sheet, longitude, (window.south + window.north) / 2);
     paths.points += `M${tenth(x)} ${tenth(y)}h0`;
     paths.arrows += arrowPath(x, y, ...vectorOnScreen(sheet, longitude, north, east));
-    if (shown.arrows === "none") shown.arrows = "windows";
+    shown.arrows.add("windows");
   }
   paths.cells.forEach((path, colour) => layers.cells[colour].setAttribute("d", path));
   layers.arrowHalo.setAttribute("d", paths.arrows);
@@ -289,8 +309,8 @@ function drawChosen(sheet) {
   }
 }
 
-// Draws everything. Returns what of the legend is on the map: hasAreaEdge; arrows, of "none",
-// "windows" or "points"; heights, likewise or "numbers" at points.
+// Draws everything. Returns what of the legend is on the map: hasAreaEdge; arrows and heights, sets of
+// what there are, for "windows" or "points", "numbers" at points.
 function draw(sheet) {
   const plot = plotOf();
   const {map, clip, paper, border, middle} = layers;
@@ -303,6 +323,7 @@ function draw(sheet) {
   sheet.view.centreX = x;
   sheet.view.centreY = y;
   middle.setAttribute("d", `M${x - 9} ${y}h18M${x} ${y - 9}v18`);
+  keepOnEarth(sheet, plot);
   const texts = [];
   const hasRoom = makeRoom();
   drawGraticule(sheet, plot);

@@ -31,6 +31,12 @@ function earthInView(sheet, points, plot) {
   const seen = hull(Object.values(points).flat()
       .map(({at: [east, north]}) => ({south: north, north, west: east, east})));
   const {pole} = sheet.projection;
+  seen.south = Math.max(seen.south, sheet.isPlane ? -Infinity : -90);
+  seen.north = Math.min(seen.north, sheet.isPlane ? Infinity : 90);
+  if (!pole && !sheet.isPlane) {
+    seen.west = Math.max(seen.west, sheet.middle - 180);
+    seen.east = Math.min(seen.east, sheet.middle + 180);
+  }
   if (!pole) return seen;
   const [x, y] = toScreen(sheet, 0, 90 * pole);
   const isPoleIn = x > plot.left && x < plot.right && y > plot.top && y < plot.bottom;
@@ -60,9 +66,10 @@ function coordinateText(value, step, isPlane, isNorth) {
 }
 
 // Labels where lines meet an edge.
-function edgeLabels(points, steps, isPlane) {
+function edgeLabels({projection, isPlane}, points, steps) {
   const labels = [];
   for (let i = 1; i < points.length; ++i) {
+    if (!projection.has(...points[i].at)) continue;
     for (const isNorth of [true, false]) {
       const step = isNorth ? steps.north : steps.east;
       const [from, to] = [points[i - 1], points[i]].map(({at}) => at[isNorth ? 1 : 0]);
@@ -115,8 +122,7 @@ function graticule(sheet, plot) {
     return path;
   };
   let path = "";
-  const [south, north] = isPlane ?
-      [seen.south, seen.north] : [Math.max(seen.south, -90), Math.min(seen.north, 90)];
+  const {south, north} = seen;
   for (const latitude of multiplesIn(south, north, steps.north)) {
     path += line([seen.west, latitude], [seen.east, latitude]);
   }
@@ -125,6 +131,6 @@ function graticule(sheet, plot) {
   }
   return {
     path,
-    bottom: withRoom(edgeLabels(points.bottom, steps, isPlane), "x", plot.left, plot.right),
-    left: withRoom(edgeLabels(points.left, steps, isPlane), "y", plot.top, plot.bottom)};
+    bottom: withRoom(edgeLabels(sheet, points.bottom, steps), "x", plot.left, plot.right),
+    left: withRoom(edgeLabels(sheet, points.left, steps), "y", plot.top, plot.bottom)};
 }

@@ -34,6 +34,9 @@ function fileRow(sheet, file, areas, windows) {
   check.checked = file.isShown;
   check.addEventListener("change", () => {
     file.isShown = check.checked;
+    if (sheet.selected?.file === file) sheet.selected = null;
+    sheet.hovered = null;
+    showDetails(sheet);
     requestDraw();
   });
   const systems = file.systems ? ` ${file.systems},` : "";
@@ -137,8 +140,10 @@ function updateLegend({hasAreaEdge, arrows, heights}) {
     if (hint) hint.textContent = text;
   };
   say("area", hasAreaEdge ? "" : "No edge of an area of validity is in this view.");
-  say("arrow", {none: "zoom in to see it", windows: "here the mean of a window",
-                points: "here that of each point"}[arrows]);
-  say("height", {windows: "here the mean of a window", points: "here that of each point",
-                 numbers: "here that of each point, and its number in mm"}[heights] ?? "");
+  const ofWhat = (shown) => !shown.has("points") ? "here the mean of a window" :
+      !shown.has("windows") ? "here that of each point" :
+      "here that of each point, of small windows the mean";
+  say("arrow", arrows.size === 0 ? "zoom in to see it" : ofWhat(arrows));
+  say("height", heights.size === 0 ? "" :
+      ofWhat(heights) + (heights.has("numbers") ? "; its number in mm" : ""));
 }

@@ -39,6 +39,7 @@ function pictureOf(sheet, boxes) {
 
 function fit(sheet, boxes) {
   const plot = plotOf();
+  sheet.projection = viewOf(sheet, boxes);
   const {south, north, west, east} = pictureOf(sheet, boxes);
   const size = Math.max(north - south, east - west) || 1;
   const scale = (1 - 2 * kFitMargin) * Math.min(
@@ -130,6 +131,10 @@ function followUser(map, current) {
     const sheet = current();
     const {x, y} = placeOf(event);
     const place = toEarth(sheet, x, y);
+    if (!sheet.projection.has(...place)) {
+      pointAtNothing();
+      return;
+    }
     sheet.hovered = windowAt(sheet, place);
     showDetails(sheet, place);
     drawChosen(sheet);
@@ -163,7 +168,8 @@ function followUser(map, current) {
     if (moved >= kClickMoves) return;
     const sheet = current();
     const {x, y} = placeOf(event);
-    select(sheet, windowAt(sheet, toEarth(sheet, x, y)));
+    const place = toEarth(sheet, x, y);
+    select(sheet, sheet.projection.has(...place) ? windowAt(sheet, place) : null);
     if (event.pointerType === "mouse") point(event);
   };
   map.addEventListener("pointerup", release);

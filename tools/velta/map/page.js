@@ -37,11 +37,15 @@ function drawForPrint() {
 function summaryOf(sheet) {
   const windows = countText(sheet.windows.length, "grid window", "grid windows");
   const [first] = sheet.files;
+  const systems = sheet.files.length === 1 && first.systems ? ` ${first.systems}` : "";
+  if (sheet.windows.length === 0) {
+    return sheet.isPlane ? "Map projections without residuals: there is nothing to draw." :
+        `Where the datum transformation${systems} is valid. There are no residuals.`;
+  }
   if (sheet.isPlane) {
     return `Residuals at the points of ${windows}: what is left to correct in northing, easting and height ` +
         "after the map projection.";
   }
-  const systems = sheet.files.length === 1 && first.systems ? ` ${first.systems}` : "";
   return `Residuals at the points of ${windows}: what is left to correct in latitude, longitude and height ` +
       `after the datum transformation${systems}.`;
 }

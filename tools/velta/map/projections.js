@@ -1,8 +1,10 @@
 // Projections: from degrees, or metres of a plane, to a flat picture and back. A picture has x to
 // the right and y down, one unit of it is a degree of latitude or a metre.
 
-const kPolarFrom = 80;  // degrees of latitude, from where parallels must be round
-const kArcStep = 2;     // degrees of longitude that may be a straight line where parallels are round
+const kPolarFrom = 75;       // degrees of latitude, from where parallels must be round
+const kPolarUntil = 65;      // and until where they stay so
+const kMostStretch = 1.02;   // of the picture's middle, to the east
+const kArcStep = 2;          // degrees of longitude that may be a straight line where parallels are round
 
 // Metres as they are.
 function planeView() {
@@ -12,18 +14,21 @@ function planeView() {
     inverse: (x, y) => [x, -y],
     northward: () => [0, -1],
     unitWidth: () => 1,
+    has: () => true,
   };
 }
 
-// Degrees as a plate, true to shape in the middle latitude.
-function plateView(latitude) {
+// Degrees as a plate, true to shape at a latitude; 180 degrees to each side of a longitude.
+function plateView(latitude, middle) {
   const aspect = Math.cos(radians(latitude));
   return {
     isStraight: true,
+    aspect,
     forward: (east, north) => [east * aspect, -north],
     inverse: (x, y) => [x / aspect, -y],
     northward: () => [0, -1],
     unitWidth: () => aspect,
+    has: (east, north) => Math.abs(north) <= 90 && Math.abs(east - middle) <= 180,
   };
 }
 
@@ -44,16 +49,32 @@ function polarView(pole, middle) {
     },
     northward: (east) => [-pole * Math.sin(angle(east)), -Math.cos(angle(east))],
     unitWidth: (north) => Math.max(radians(90 - pole * north), 1e-6),
+    has: (east, north) => Math.abs(north) <= 90,
   };
 }
 
-// The picture for what is looked at first, and all that is to be seen of it.
-function globeView(focus, all, middle) {
-  const north = Math.max(focus.north, all.north);
-  const south = Math.min(focus.south, all.south);
-  if (north > kPolarFrom && south > 0) return polarView(1, middle);
-  if (south < -kPolarFrom && north < 0) return polarView(-1, middle);
-  return plateView((focus.south + focus.north) / 2);
+// The picture that is true to shape around a place, with north up there.
+// middle: the longitude that a map of all longitudes has in its middle
+function globeView([east, north], middle) {
+  if (Math.abs(north) > kPolarFrom) return polarView(Math.sign(north), east);
+  return plateView(north, middle);
+}
+
+// The picture for all of some boxes: around the pole where they lie around it.
+function viewOf({isPlane, middle}, boxes) {
+  if (isPlane) return planeView();
+  const {south, north, west, east} = hull(boxes);
+  const isAround = east - west >= 180;
+  const pole = isAround && south > 0 && north > kPolarFrom ? 1 :
+      isAround && north < 0 && south < -kPolarFrom ? -1 : 0;
+  return globeView([(west + east) / 2, pole ? 90 * pole : (south + north) / 2], middle);
+}
+
+// Whether a picture is true enough to shape around a place.
+function suits(projection, [, north]) {
+  if (projection.pole) return projection.pole * north > kPolarUntil;
+  const stretch = Math.cos(radians(north)) / projection.aspect;
+  return Math.abs(north) <= kPolarFrom && stretch < kMostStretch && stretch > 1 / kMostStretch;
 }
 
 // The outline of a box in the picture: rings of points.

@@ -103,19 +103,19 @@ function makeSheet(columns, isPlane) {
     methods: columns.methods.slice(2 * index, 2 * index + 2),
     problem: columns.problems[index]}));
   for (const window of windows) {
+    window.northStep = (window.north - window.south) / (kGridPoints - 1);
+    window.eastStep = (window.east - window.west) / (kGridPoints - 1);
+    window.top = window.north;  // of its points, wherever the globe ends
     window.hasVectors = !window.problem && window.methods[0] >= 0;
     window.hasHeights = !window.problem && window.methods[1] >= 0;
   }
-  // The middle of an area that is everywhere says nothing.
   const boxes = [...areas, ...windows];
-  const telling = boxes.filter((box) => !isWholeLatitude(box));
   const middle = isPlane ? 0 : middleLongitude(boxes);
   if (!isPlane) boxes.forEach((box) => placeOnGlobe(box, middle));
-  const focus = windows.length > 0 ? windows : boxes;
-  const projection = isPlane ? planeView() : globeView(hull(focus), hull(telling), middle);
-  const sheet = {isPlane, files, areas, windows, projection, columns,
+  const sheet = {isPlane, files, areas, windows, middle, columns,
                  ...toGround(columns, windows, isPlane), withoutMeans: false,
-                 view: null, selected: null, hovered: null};
+                 projection: null, view: null, selected: null, hovered: null};
+  sheet.projection = viewOf(sheet, everything(sheet));
   sheet.limits = limitsOf(sheet);
   measure(sheet);
   return sheet;

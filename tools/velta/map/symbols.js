@@ -29,8 +29,8 @@ function numberText(number, decimals) {
 
 // A round length in millimetres.
 function lengthText(length) {
-  if (length >= kMillimetresPerMetre) return `${numberText(length / kMillimetresPerMetre, 0)} m`;
-  return `${numberText(length, Math.max(0, -Math.floor(Math.log10(length) + 1e-9)))} mm`;
+  if (length >= kMillimetresPerMetre) return `${numberText(length / kMillimetresPerMetre, 0)}\u00a0m`;
+  return `${numberText(length, Math.max(0, -Math.floor(Math.log10(length) + 1e-9)))}\u00a0mm`;
 }
 
 // The value that a share of them does not exceed.
