@@ -10,8 +10,8 @@ namespace velta_tool {
 class Busy {
  public:
   /// \param what is done, such as "reading"
-  /// \param files with which; those that are not there do not count
-  Busy(const std::string& what, const std::vector<std::string>& files);
+  /// \param files with which; an empty name is none
+  Busy(const std::string& what, std::vector<std::string> files);
   ~Busy();
   Busy(const Busy&) = delete;
   Busy& operator=(const Busy&) = delete;

@@ -31,7 +31,7 @@ struct Conversion {
 int DecodeStream(const Conversion& files) {
   Input in(files.from);
   Output out(files.to, OutputKind::kText, {files.from});
-  Progress progress;
+  Progress progress(SizeTogether({files.from}));
   rtcm3::StreamCounts counts;
   StreamNotes notes(files.from, counts);
   rtcm3::MessageReader messages(in.buffer(), counts, [&] {
@@ -68,7 +68,7 @@ int DecodeStream(const Conversion& files) {
 int EncodeLines(const Conversion& files) {
   Input in(files.from);
   Output out(files.to, OutputKind::kBinary, {files.from});
-  Progress progress;
+  Progress progress(SizeTogether({files.from}));
   std::uint64_t bytes = 0;
   int status = kDone;
   bool hasFrames = false;

@@ -38,7 +38,7 @@ Systems ReadSystems(const std::string& stream) {
     return true;
   });
   Input in(stream);
-  Progress progress;
+  Progress progress(SizeTogether({stream}));
   rtcm3::StreamCounts counts;
   StreamNotes notes(stream, counts);
   rtcm3::MessageReader messages(in.buffer(), counts, [&] {

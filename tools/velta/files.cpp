@@ -169,6 +169,19 @@ Input::Input(const std::string& name) : memory_(kInputBuffer) {
   buffer_ = std::make_unique<InterruptibleBuffer>(name, file_);
 }
 
+std::uint64_t SizeTogether(const std::vector<std::string>& files) {
+  std::uint64_t bytes = 0;
+  for (const std::string& file : files) {
+    std::error_code error;
+    const fs::path path = orx::ToSystemPath(PathOf(file));
+    if (!fs::is_regular_file(path, error)) return 0;
+    const std::uintmax_t size = fs::file_size(path, error);
+    if (error) return 0;
+    bytes += size;
+  }
+  return bytes;
+}
+
 Output::Output(const std::string& name, OutputKind kind, const std::vector<std::string>& inputs)
     : name_(name), kind_(kind), buffer_(std::cout.rdbuf()) {
   const bool isStandard = name == kStandardStream;

@@ -59,6 +59,9 @@ class Input {
   std::unique_ptr<std::streambuf> buffer_;
 };
 
+/// \return the bytes of files together; 0 when one of them has no size, as a pipe has none
+std::uint64_t SizeTogether(const std::vector<std::string>& files);
+
 /// What is written to an output.
 enum class OutputKind { kText, kBinary };
 

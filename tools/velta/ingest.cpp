@@ -95,7 +95,8 @@ class Ingestion {
         support_(MakeSupport(options)),
         sets_([this](const rtcm3::MessageSet& set) { return Ingest(set); }),
         out_(options.files),
-        report_(options.json, out_) {}
+        report_(options.json, out_),
+        progress_(SizeTogether(options.files)) {}
 
   void Read(const std::string& file) {
     try {

@@ -6,6 +6,7 @@
 
 #include "command.h"
 #include "stream_notes.h"
+#include "terminal.h"
 
 namespace velta_tool {
 namespace {
@@ -115,6 +116,7 @@ bool IngestedSet::HasNews() const {
 }
 
 void IngestReport::Add(const IngestedSet& set) {
+  if (IsQuiet() && !json_) return;
   out_.pending() += (json_ ? SetJson(set).dump() : SetText(set)) + '\n';
   out_.FlushIfLarge();
 }
@@ -125,7 +127,11 @@ void IngestReport::AddIncomplete(std::uint32_t systemId, const std::vector<std::
 }
 
 void IngestReport::Close(const IngestTotals& totals) {
-  out_.pending() += (json_ ? TotalsJson(totals).dump() : TotalsText(totals)) + '\n';
+  if (json_) {
+    out_.pending() += TotalsJson(totals).dump() + '\n';
+  } else if (!IsQuiet()) {
+    out_.pending() += TotalsText(totals) + '\n';
+  }
   out_.Flush();
 }
 

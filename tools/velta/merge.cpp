@@ -87,7 +87,7 @@ int Run(const Merge& merge) {
                                          {"added", counts.added},
                                          {"replaced", counts.replaced}};
     out.pending() = line.dump() + "\n";
-  } else if (isDone) {
+  } else if (isDone && !IsQuiet()) {
     out.pending() = merge.target + ": " + std::to_string(counts.added) + " entries added, " +
                     std::to_string(counts.replaced) + " replaced\n";
   }

@@ -59,7 +59,8 @@ std::unique_ptr<CLI::App> MakeProgram(Action& action) {
     add(*program, action);
   }
   for (CLI::App* const command : program->get_subcommands([](CLI::App*) { return true; })) {
-    command->add_flag_callback("--quiet", BeQuiet, "tell failures only: no notes, no progress");
+    command->add_flag_callback(
+        "--quiet", BeQuiet, "tell failures only: no notes, no progress, nothing of what was done");
   }
   return program;
 }

@@ -14,6 +14,8 @@ constexpr std::chrono::seconds kLongInput{1};
 constexpr std::chrono::milliseconds kBetweenUpdates{200};
 constexpr double kMegabyte = 1e6;
 
+constexpr std::size_t kLine = 79;  // bytes that a terminal's line has at least
+
 bool isQuiet = false;
 std::size_t shownBytes = 0;  ///< of the text on the terminal's last line
 
@@ -79,8 +81,11 @@ void ShowOnLine(const std::string& text) {
   static const bool isTerminal = orx::FileFuncs::isTerminal(stderr);
   if (!isTerminal || isQuiet) return;
   ClearLine();
-  std::fprintf(stderr, "%s\r", text.c_str());
-  shownBytes = text.size();
+  std::size_t bytes = std::min(text.size(), kLine);
+  const auto isInside = [&](std::size_t at) { return (text[at] & 0xC0) == 0x80; };
+  while (bytes < text.size() && bytes > 0 && isInside(bytes)) --bytes;  // of a character
+  std::fprintf(stderr, "%s\r", text.substr(0, bytes).c_str());
+  shownBytes = bytes;
 }
 
 void ClearLine() {
@@ -88,14 +93,17 @@ void ClearLine() {
   if (width > 0) std::fprintf(stderr, "%*s\r", width, "");
 }
 
-Progress::Progress() : next_(Clock::now() + kLongInput) {}
+Progress::Progress(std::uint64_t total) : total_(total), next_(Clock::now() + kLongInput) {}
 
 void Progress::Show(std::uint64_t bytes) {
   if (Clock::now() < next_) return;
   next_ = Clock::now() + kBetweenUpdates;
-  char text[32];
-  std::snprintf(text, sizeof text, "%10.1f MB read", static_cast<double>(bytes) / kMegabyte);
-  ShowOnLine(text);
+  const auto megabytes = [](std::uint64_t number) {
+    char text[32];
+    std::snprintf(text, sizeof text, "%.1f", static_cast<double>(number) / kMegabyte);
+    return std::string(text);
+  };
+  ShowOnLine(megabytes(bytes) + (total_ > 0 ? " of " + megabytes(total_) : "") + " MB read");
 }
 
 }  // namespace velta_tool

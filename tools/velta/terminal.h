@@ -13,12 +13,13 @@ std::string WithoutControls(std::string text);
 /// A name from a stream or a file as a terminal may get it: on one line, too.
 std::string Printable(const std::string& name);
 
-/// From now on the user is told of failures only: no notes, no progress.
+/// From now on the user is told of failures only: no notes, no progress, nothing of what was done.
+/// What he asks for, such as a list, he gets.
 void BeQuiet();
 bool IsQuiet();
 
 /// Shows a text on standard error, when that is a terminal, in place of the one shown before. The
-/// next line that is printed takes its place.
+/// next line that is printed takes its place. What is longer than a line is cut.
 void ShowOnLine(const std::string& text);
 
 /// Takes away what ShowOnLine shows.
@@ -27,7 +28,8 @@ void ClearLine();
 /// Shows on standard error, when that is a terminal, how much of a long input has been read.
 class Progress {
  public:
-  Progress();
+  /// \param total bytes that there are; 0 when that is not known
+  explicit Progress(std::uint64_t total);
   ~Progress() { ClearLine(); }
   Progress(const Progress&) = delete;
   Progress& operator=(const Progress&) = delete;
@@ -38,6 +40,7 @@ class Progress {
  private:
   using Clock = std::chrono::steady_clock;
 
+  std::uint64_t total_;
   Clock::time_point next_;
 };
 

@@ -61,7 +61,8 @@ class Work {
         transformation_(Read(options.source)),
         isPlane_(transformation_.definition().projection.has_value()),
         in_(options.file),
-        out_(options.output, OutputKind::kText, InputsOf(options)) {}
+        out_(options.output, OutputKind::kText, InputsOf(options)),
+        progress_(SizeTogether({options.file})) {}
 
   void DoAll() {
     std::string line;

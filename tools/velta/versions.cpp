@@ -9,17 +9,14 @@
 #include "velta/version.h"
 
 namespace velta_tool {
-namespace {
 
 std::string Numbers(int major, int minor, int patch) {
   return std::to_string(major) + '.' + std::to_string(minor) + '.' + std::to_string(patch);
 }
 
-}  // namespace
-
 std::string Versions() {
   return "velta " VELTA_VERSION "\nlibvelta " + std::string(orx::cs::velta::LibraryVersion()) +
-         ", velta-rtcm3 " + orx::cs::velta::rtcm3::CodecVersion() + '\n' + ProjVersion() +
+         ", velta-rtcm3 " + orx::cs::velta::rtcm3::CodecVersion() + '\n' + ProjVersions() +
          "\nbuilt with xxHash " +
          Numbers(XXH_VERSION_MAJOR, XXH_VERSION_MINOR, XXH_VERSION_RELEASE) + ", nlohmann-json " +
          Numbers(NLOHMANN_JSON_VERSION_MAJOR, NLOHMANN_JSON_VERSION_MINOR,

@@ -8,7 +8,11 @@ namespace velta_tool {
 /// name.
 std::string Versions();
 
-/// "PROJ" with its version, or that this build is without.
-std::string ProjVersion();
+/// PROJ and the libraries that write grids for it, with their versions, or that this build is
+/// without.
+std::string ProjVersions();
+
+/// A version with points between its numbers.
+std::string Numbers(int major, int minor, int patch);
 
 }  // namespace velta_tool

@@ -17,7 +17,7 @@ namespace {
 
 const bool kHasProj = false;
 
-std::string ProjVersion() { return "without PROJ"; }
+std::string ProjVersions() { return "without PROJ"; }
 
 std::string Wkt(const Definition&, std::size_t, const TellLeftOut&) { Refuse(); }
 
