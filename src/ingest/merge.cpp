@@ -29,7 +29,6 @@ ResultCode MergeFiles(const SharedFiles& kind, const COrxStringT<wchar_t>& targe
                       const COrxStringT<wchar_t>& sourcePath, MergeContainers* merge) {
   TCSInFileKey* target = nullptr;
   const ResultCode obtained = ObtainTree(kind, targetPath, &target);
-  const GiveBackLater giveBack(kind, targetPath);  // declared before the lock: runs after it
   if (obtained != kSuccess) return obtained;
   const boost::unique_lock<boost::recursive_mutex> lock(target->GetMutex());
   ReadIfLost(*target);
@@ -54,6 +53,7 @@ ResultCode MergeFiles(const SharedFiles& kind, const COrxStringT<wchar_t>& targe
 
 ResultCode RTCMDataSupport::MergeRTCMDatumfiles(const COrxStringT<wchar_t>& target,
                                                 const COrxStringT<wchar_t>& source) {
+  const GiveBackLater giveBack(kDatumFiles, target);
   return _MergeRTCMDatumfiles(target, source);
 }
 
@@ -69,6 +69,7 @@ ResultCode RTCMDataSupport::MergeRTCMDatumfiles(TGenericRegistryKey& target,
 
 ResultCode RTCMDataSupport::MergeRTCMProjectionfiles(const COrxStringT<wchar_t>& target,
                                                      const COrxStringT<wchar_t>& source) {
+  const GiveBackLater giveBack(kProjectionFiles, target);
   return _MergeRTCMProjectionfiles(target, source);
 }
 
