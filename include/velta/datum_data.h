@@ -33,9 +33,8 @@ struct DatumData {
   ~DatumData() = default;
 
   /// Copies every field but `ellipsoidName`, which the target keeps. Each ellipsoid is rebuilt
-  /// from its two defining values with kind 0.
+  /// from its two defining values with kind 0, of an assignment to itself, too.
   DatumData& operator=(const DatumData& other) {
-    if (this == &other) return *this;
     sourceEllipsoid = projmath::Ellipsoid::FromInverseFlattening(other.sourceEllipsoid.a,
                                                                  other.sourceEllipsoid.second);
     targetEllipsoid = projmath::Ellipsoid::FromInverseFlattening(other.targetEllipsoid.a,
