@@ -27,6 +27,7 @@ bool isTurkish = false;
 /// In the place of the C library's, for the libraries too.
 extern "C" __attribute__((visibility("default"))) std::wint_t towlower(std::wint_t c) noexcept {
   if (isTurkish && c == L'I') return 0x131;  // without its dot
+  if (c == 0x130) return L'i';               // with its dot
   return c >= L'A' && c <= L'Z' ? c - L'A' + L'a' : c;
 }
 #endif
@@ -60,11 +61,12 @@ TEST(OrxString, KnowsLettersAndDigitsAsWindowsDoes) {
 }
 
 #ifndef _WIN32
-TEST(OrxString, ComparesLettersOfAsciiAlikeInATurkishLocale) {
+TEST(OrxString, ComparesLettersOfAsciiAlikeInEveryLocale) {
   isTurkish = true;
   EXPECT_EQ(std::towlower(L'I'), 0x131U) << "what the libraries would get";
   EXPECT_TRUE(orx::EqualsIgnoringCase(L"CASSINI", L"cassini"));
   isTurkish = false;
+  EXPECT_FALSE(orx::EqualsIgnoringCase(L"CASS\u0130NI", L"cassini"));
 }
 #endif
 

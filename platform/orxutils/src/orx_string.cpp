@@ -17,11 +17,14 @@ constexpr bool IsLowSurrogate(char32_t unit) { return unit >= 0xDC00 && unit <= 
 
 constexpr bool IsIn(char32_t c, char32_t first, char32_t last) { return c >= first && c <= last; }
 
-/// In a Turkish locale the C library's small letter of "I" is another than "i".
+/// In a Turkish locale the C library's small letter of "I" is another than "i"; in others "i" is
+/// that of U+0130, too. So letters of ASCII have none but each other.
 wchar_t ToLower(wchar_t c) {
+  constexpr char32_t kFirstBeyondAscii = 0x80;
   if (IsIn(static_cast<char32_t>(c), U'A', U'Z')) return static_cast<wchar_t>(c - L'A' + L'a');
-  const bool isAscii = static_cast<char32_t>(c) < 0x80;
-  return isAscii ? c : static_cast<wchar_t>(std::towlower(static_cast<std::wint_t>(c)));
+  const auto lower = static_cast<char32_t>(std::towlower(static_cast<std::wint_t>(c)));
+  const bool areBeyond = std::min(static_cast<char32_t>(c), lower) >= kFirstBeyondAscii;
+  return areBeyond ? static_cast<wchar_t>(lower) : c;
 }
 
 }  // namespace
