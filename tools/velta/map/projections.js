@@ -1,10 +1,10 @@
 // Projections: from degrees, or metres of a plane, to a flat picture and back. A picture has x to
 // the right and y down, one unit of it is a degree of latitude or a metre.
 
-const kPolarFrom = 75;       // degrees of latitude, from where parallels must be round
-const kPolarUntil = 65;      // and until where they stay so
-const kMostStretch = 1.02;   // of the picture's middle, to the east
-const kArcStep = 2;          // degrees of longitude that may be a straight line where parallels are round
+const kPolarFrom = 75;      // degrees of latitude, from where parallels must be round
+const kPolarUntil = 65;     // and until where they stay so
+const kMostStretch = 1.02;  // of the picture's middle, to the east
+const kArcStep = 2;         // degrees of longitude that may be a straight line where parallels are round
 
 // Metres as they are.
 function planeView() {
